@@ -1,0 +1,29 @@
+/// The commands that the framework brings itself.
+#pragma once
+
+#include <Plinth/AutoCli.h>
+
+#include <boost/shared_ptr.hpp>
+#include <string>
+
+#include "plinth/Declarations.h"
+
+namespace Plinth {
+
+/// Shows every node under @p root, which holds the command and so outlives it.
+boost::shared_ptr<AutoCli::Command> NewCatalogue(AutoCli::Namespace& root);
+/// Writes completion scripts for the tree under @p root, which outlives the command.
+boost::shared_ptr<AutoCli::Command> NewCompletion(AutoCli::Namespace& root);
+
+/// Calls @p visit(path, node) for each node under @p node in order of registration, a namespace ahead of
+/// its children. @p path leads to @p node.
+template <class Visitor>
+void WalkTree(const AutoCli::NamespaceNode& node, const std::string& path, Visitor&& visit) {
+  for (const AutoCli::Child& child : AutoCli::NodeData::Of(node).children) {
+    const std::string childPath = path.empty() ? child.name : path + ' ' + child.name;
+    visit(childPath, *child.node);
+    WalkTree(*child.node, childPath, visit);
+  }
+}
+
+}  // namespace Plinth
