@@ -1,0 +1,18 @@
+#include "corectl/Operation.h"
+
+namespace corectl {
+
+void Throw(const host::Error& error, host::Call::Style style) {
+  using Thrown = host::Error::Thrown;
+  const bool lookup = style == host::Call::Style::Lookup && error.GetThrown() == Thrown::Usual;
+  if (lookup || error.GetThrown() == Thrown::CoreCtlException) {
+    throw CoreCtl::Lib::CoreCtlException(error.what(), "corectl/Operation.cpp", __LINE__, {});
+  }
+  throw NodeCtl::Lib::NodeCtlException(error.what(), {});
+}
+
+void Refuse(const std::string& text) { throw NodeCtl::Lib::NodeCtlException(text, {}); }
+
+void Deny(const std::string& text) { throw host::Error(host::Error::Kind::Refused, text); }
+
+}  // namespace corectl

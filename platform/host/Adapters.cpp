@@ -1,0 +1,23 @@
+#include "host/Adapters.h"
+
+namespace host {
+
+bool DoesSoftwareWork(const Record& root) {
+  return root.GetBool("softwareIscsi/enabled") || root.GetBool("softwareIscsi/rebootPending");
+}
+
+bool IsIscsi(const Object& adapter) { return adapter.record.GetString("kind") != "scsi"; }
+
+bool IsPresent(Tree& tree, const Object& adapter) {
+  return adapter.record.GetString("kind") != "software" ||
+         DoesSoftwareWork(tree.Get(kRoot, Kind::Host).record);
+}
+
+std::vector<Object> IscsiAdapters(Tree& tree) {
+  std::vector<Object> adapters = tree.Children(kRoot, Kind::Adapter);
+  std::erase_if(adapters,
+                [&](const Object& adapter) { return !IsIscsi(adapter) || !IsPresent(tree, adapter); });
+  return adapters;
+}
+
+}  // namespace host

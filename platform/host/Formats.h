@@ -1,0 +1,76 @@
+/// Text forms that the host and the libraries on it share: addresses, names, character sets.
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+
+#pragma GCC visibility push(default)
+
+namespace host {
+
+using Ipv4Bytes = std::array<std::uint8_t, 4>;
+using Ipv6Bytes = std::array<std::uint8_t, 16>;
+using MacBytes = std::array<std::uint8_t, 6>;
+
+/// Four decimal numbers without leading zeros.
+std::optional<Ipv4Bytes> ParseIpv4(std::string_view text);
+std::string FormatIpv4(const Ipv4Bytes& bytes);
+/// The forms of RFC 4291 section 2.2; no zone, no prefix length, no brackets.
+std::optional<Ipv6Bytes> ParseIpv6(std::string_view text);
+/// The canonical form of RFC 5952.
+std::string FormatIpv6(const Ipv6Bytes& bytes);
+/// Six groups of two hexadecimal digits, with colons or hyphens throughout.
+std::optional<MacBytes> ParseMac(std::string_view text);
+std::string FormatMac(const MacBytes& bytes);
+/// With small letters for the capital ones of ASCII, which are the same in the names of hosts.
+std::string LowerCase(std::string_view text);
+/// RFC 1123 section 2.1. A text of digits and dots alone is no name.
+bool IsHostName(std::string_view text);
+
+// Each says what is wrong with a text, and is empty for one that is right: the form of a key's check.
+std::string Ipv4Fault(std::string_view text);
+std::string Ipv6Fault(std::string_view text);
+std::string MacFault(std::string_view text);
+/// An address of either family or a name.
+std::string HostFault(std::string_view text);
+/// An iSCSI name (RFC 3720 section 3.2.6).
+std::string IscsiNameFault(std::string_view text);
+/// The same, where an empty text stands for no name.
+std::string IscsiNameOrNoneFault(std::string_view text);
+
+bool IsUtf8(std::string_view text);
+/// What keeps a text out of a record, as "is not UTF-8"; empty when nothing does.
+std::string StorableFault(std::string_view text);
+/// UTF-8 to UTF-32; nothing for malformed input (RFC 3629).
+std::optional<std::wstring> WideFromUtf8(std::string_view text);
+/// UTF-32 to UTF-8; nothing for surrogates and numbers above 0x10ffff.
+std::optional<std::string> Utf8FromWide(std::wstring_view text);
+
+/// The text in double quotes, what cannot be printed escaped: for messages and traces.
+std::string Quoted(std::string_view text);
+/// The candidate most like @p word where one is near enough to be meant, else an empty text.
+template <class Candidates>
+std::string Nearest(std::string_view word, const Candidates& candidates);
+/// How many letters must be inserted, removed or replaced to turn @p a into @p b.
+std::size_t EditDistance(std::string_view a, std::string_view b);
+
+template <class Candidates>
+std::string Nearest(std::string_view word, const Candidates& candidates) {
+  std::size_t best = word.size() / 3 + 2;
+  std::string nearest;
+  for (const auto& candidate : candidates) {
+    const std::size_t distance = EditDistance(word, candidate);
+    if (distance < best) {
+      best = distance;
+      nearest = candidate;
+    }
+  }
+  return nearest;
+}
+
+}  // namespace host
+
+#pragma GCC visibility pop

@@ -1,0 +1,59 @@
+#include "host/Sessions.h"
+
+#include "host/Initiator.h"
+
+namespace host {
+
+namespace {
+
+Initiator InitiatorOf(Tree& tree, const KnownTarget& target) {
+  return {tree, tree.Get(target.adapter, Kind::Adapter)};
+}
+
+void LogoutFrom(Tree& tree, const Object& adapter, const Object& target,
+                const std::vector<Object>& sessions) {
+  const std::unique_ptr<Network> network = NetworkOf(tree);
+  for (const Object& session : sessions) {
+    network->Logout({adapter.record.GetString("initiatorName"), target.name, session.record.GetString("isid"),
+                     session.record.GetInt("tsih")});
+    tree.Remove(session.id);
+  }
+  if (!sessions.empty()) ForgetTarget(tree, target);
+}
+
+}  // namespace
+
+bool Login(Tree& tree, KnownTarget& target) { return InitiatorOf(tree, target).LoginOnceMore(target); }
+
+bool LoginLike(Tree& tree, KnownTarget& target, const Object& session) {
+  return InitiatorOf(tree, target).LoginBeside(target, session);
+}
+
+bool LoginAdapter(Tree& tree, const Object& adapter) {
+  Initiator initiator(tree, adapter);
+  bool everywhere = true;
+  for (const std::int64_t id : TargetIds(tree, adapter.id)) {
+    KnownTarget target = GetTarget(tree, id);
+    if (!initiator.LoginWhereMissing(target)) everywhere = false;
+  }
+  return everywhere;
+}
+
+void LogoutSession(Tree& tree, const Object& session) {
+  const Object target = tree.Get(session.parent, Kind::Target);
+  LogoutFrom(tree, tree.Get(target.parent, Kind::Adapter), target, {session});
+}
+
+void Logout(Tree& tree, const KnownTarget& target) {
+  if (target.object.id == 0) return;
+  LogoutFrom(tree, tree.Get(target.adapter, Kind::Adapter), target.object,
+             tree.Children(target.object.id, Kind::Session));
+}
+
+void LogoutAdapter(Tree& tree, const Object& adapter) {
+  for (const Object& target : tree.Children(adapter.id, Kind::Target)) {
+    LogoutFrom(tree, adapter, target, tree.Children(target.id, Kind::Session));
+  }
+}
+
+}  // namespace host

@@ -1,0 +1,303 @@
+#include "host/Store.h"
+
+#include <sqlite3.h>
+#include <stdlib.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+#include <new>
+#include <span>
+
+#include "host/Error.h"
+#include "host/Files.h"
+#include "host/Formats.h"
+
+namespace host {
+
+namespace {
+
+constexpr int kFewPages = 64;
+constexpr int kApplicationId = 0x7465736f;  // marks a database as a host's
+constexpr int kVersion = 1;
+
+/// What brings a database of version @p from to the next one.
+struct Migration {
+  int from;
+  const char* sql;
+};
+constexpr std::span<const Migration> kMigrations{};
+
+constexpr const char* kTables =
+    "CREATE TABLE object(id INTEGER PRIMARY KEY AUTOINCREMENT, parent INTEGER NOT NULL, kind INTEGER NOT "
+    "NULL,"
+    " place INTEGER NOT NULL, name TEXT, record TEXT NOT NULL,"
+    " UNIQUE(parent, kind, place), UNIQUE(parent, kind, name));";
+
+/// Opens a connection. What SQLite sets aside for a long life, a process of one command would only pay for:
+/// each page that is touched for the first time is an interrupt.
+int Open(const char* path, sqlite3** database) {
+  static const int configured = [] {
+    sqlite3_config(SQLITE_CONFIG_PAGECACHE, nullptr, 0, 0);
+    return sqlite3_config(SQLITE_CONFIG_MEMSTATUS, 0);
+  }();
+  static_cast<void>(configured);  // without effect where SQLite works already
+  return sqlite3_open_v2(path, database, SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX | SQLITE_OPEN_NOFOLLOW,
+                         nullptr);
+}
+
+/// The same file by a path on which no folder is a link: SQLite would refuse those too.
+std::string WithoutLinks(const std::string& path) {
+  const std::size_t slash = path.rfind('/');
+  const std::unique_ptr<char, void (*)(void*)> folder(
+      realpath(slash == path.npos ? "." : path.substr(0, slash + 1).c_str(), nullptr), free);
+  return folder == nullptr ? path : std::string(folder.get()) + "/" + path.substr(slash + 1);
+}
+
+/// What SQLite says quotes the file, and can be anything where that is damaged: then its words for @p code
+/// alone.
+std::string Words(const std::string& message, int code) {
+  const bool printable = IsUtf8(message) && std::none_of(message.begin(), message.end(), [](char c) {
+                           return (c >= 0 && c < ' ') || c == 0x7f;
+                         });
+  return printable ? message : sqlite3_errstr(code);
+}
+
+std::string Reason(int code, int systemError, const std::string& message) {
+  switch (code & 0xff) {
+    case SQLITE_CORRUPT:
+    case SQLITE_NOTADB:
+      return std::string(" is damaged: ") + message + ".";
+    case SQLITE_BUSY:
+    case SQLITE_LOCKED:
+      return " is locked by another process.";
+    case SQLITE_READONLY:
+      return " cannot be written: it is read-only.";
+    case SQLITE_FULL:
+      return std::string(" cannot be written: ") + strerror(ENOSPC) + ".";
+    case SQLITE_CANTOPEN:
+    case SQLITE_PERM:
+    case SQLITE_AUTH:
+      return std::string(" cannot be opened: ") + (systemError != 0 ? strerror(systemError) : message) + ".";
+    case SQLITE_IOERR:
+      return std::string(" cannot be read or written: ") +
+             (systemError != 0 ? strerror(systemError) : message) + ".";
+    default:
+      return std::string(" cannot be used: ") + message + ".";
+  }
+}
+
+}  // namespace
+
+std::vector<std::string> JournalsOf(const std::string& path) {
+  return {path + "-journal", path + "-wal", path + "-shm"};
+}
+
+Store::Store() : path_("in memory"), checked_(true) {
+  if (Open(":memory:", &database_) != SQLITE_OK) {
+    sqlite3_close(database_);
+    throw std::bad_alloc();
+  }
+}
+
+Store::Store(const std::string& path) : path_(path) {
+  struct stat status;
+  const auto refuse = [&](const std::string& reason) {
+    throw Error(Error::Kind::Failed, "The host database " + path_ + reason);
+  };
+  if (!IsRegularFile("The host database", path, status)) {
+    refuse(std::string(" cannot be opened: ") + strerror(ENOENT) + ".");
+  }
+  if (status.st_size == 0) refuse(" is damaged: it is empty.");
+  for (const std::string& journal : JournalsOf(path)) {
+    IsRegularFile("The host database's journal", journal, status);
+  }
+  try {
+    const int code = Open(WithoutLinks(path).c_str(), &database_);
+    if (code != SQLITE_OK) Fail(code);
+    SetPatience(kPatienceMilliseconds);
+    CheckVersion();
+  } catch (...) {
+    Close();
+    throw;
+  }
+}
+
+Store::~Store() { Close(); }
+
+void Store::Close() {
+  for (const auto& [sql, statement] : statements_) sqlite3_finalize(statement);
+  sqlite3_close(database_);
+}
+
+void Store::CheckVersion() {
+  const auto refuse = [&](const std::string& reason) {
+    throw Error(Error::Kind::Failed, "The host database " + path_ + reason);
+  };
+  {
+    Transaction reading(*this, Transaction::Access::Read);  // one look at the file for both
+    if (Number("PRAGMA application_id") != kApplicationId) refuse(" is not a host database.");
+    const bool present = Number("PRAGMA user_version") == kVersion;
+    reading.Commit();
+    if (present) return;
+  }
+  Transaction transaction(*this, Transaction::Access::Change);
+  const std::int64_t version = Number("PRAGMA user_version");  // another process may have been first
+  if (version > kVersion) refuse(" belongs to a newer version of this program.");
+  if (version < 1) refuse(" is damaged: it has no schema version.");
+  for (const Migration& migration : kMigrations) {
+    if (migration.from >= version) Execute(migration.sql);
+  }
+  Execute(("PRAGMA user_version=" + std::to_string(kVersion)).c_str());
+  transaction.Commit();
+}
+
+void Store::CheckStructure() {
+  if (checked_) return;
+  Statement statement(*this, "PRAGMA integrity_check(1)");
+  const std::string found = statement.Step() ? statement.GetText(0) : "ok";
+  if (found != "ok") {
+    // A heading may stand on a line of its own in front.
+    throw Error(Error::Kind::Failed,
+                "The host database " + path_ +
+                    Reason(SQLITE_CORRUPT, 0, Words(found.substr(found.rfind('\n') + 1), SQLITE_CORRUPT)));
+  }
+  checked_ = true;
+}
+
+bool Store::IsSmall() { return Number("PRAGMA page_count") <= kFewPages; }
+
+void Store::Fail(int code) {
+  if ((code & 0xff) == SQLITE_NOMEM) throw std::bad_alloc();
+  const bool real = sqlite3_errcode(database_) == (code & 0xff);
+  throw Error(Error::Kind::Failed,
+              "The host database " + path_ +
+                  Reason(code, real ? sqlite3_system_errno(database_) : 0,
+                         Words(real ? sqlite3_errmsg(database_) : sqlite3_errstr(code), code)));
+}
+
+void Store::SetPatience(int milliseconds) { sqlite3_busy_timeout(database_, milliseconds); }
+
+void Store::FailStatement(int number, int code) { fault_ = {.countdown = number, .code = code}; }
+
+int Store::Step(sqlite3_stmt* statement) {
+  if (fault_.countdown > 0 && --fault_.countdown == 0) {
+    fault_.happened = true;
+    return fault_.code;
+  }
+  return sqlite3_step(statement);
+}
+
+sqlite3_stmt* Store::Prepared(const char* sql) {
+  for (const auto& [known, statement] : statements_) {
+    if (known == sql) return statement;
+  }
+  sqlite3_stmt* statement = nullptr;
+  const int code = sqlite3_prepare_v3(database_, sql, -1, 0, &statement, nullptr);
+  if (code != SQLITE_OK) Fail(code);
+  statements_.emplace_back(sql, statement);
+  return statement;
+}
+
+void Store::Execute(const char* sql) {
+  while (*sql != '\0') {
+    sqlite3_stmt* statement = nullptr;
+    int code = sqlite3_prepare_v3(database_, sql, -1, 0, &statement, &sql);
+    if (code != SQLITE_OK) Fail(code);
+    if (statement == nullptr) return;  // blanks at the end
+    while ((code = Step(statement)) == SQLITE_ROW) {
+    }
+    sqlite3_finalize(statement);
+    if (code != SQLITE_DONE) Fail(code);
+  }
+}
+
+std::int64_t Store::Number(const char* sql) {
+  Statement statement(*this, sql);
+  return statement.Step() ? statement.GetInt(0) : 0;
+}
+
+std::string Store::Serialize() {
+  sqlite3_int64 size = 0;
+  const std::unique_ptr<unsigned char, void (*)(void*)> bytes(sqlite3_serialize(database_, "main", &size, 0),
+                                                              sqlite3_free);
+  if (bytes == nullptr) throw std::bad_alloc();
+  return std::string(reinterpret_cast<const char*>(bytes.get()), static_cast<std::size_t>(size));
+}
+
+bool Store::IsInTransaction() const { return sqlite3_get_autocommit(database_) == 0; }
+
+std::int64_t Store::LastId() const { return sqlite3_last_insert_rowid(database_); }
+
+Statement::~Statement() {
+  sqlite3_reset(statement_);
+  sqlite3_clear_bindings(statement_);
+}
+
+Statement& Statement::Bind(std::int64_t value) {
+  sqlite3_bind_int64(statement_, ++bound_, value);
+  return *this;
+}
+
+Statement& Statement::Bind(std::string_view value) {
+  // An empty view may have no address, which would bind a null.
+  const char* data = value.data() == nullptr ? "" : value.data();
+  const int code =
+      sqlite3_bind_text(statement_, ++bound_, data, static_cast<int>(value.size()), SQLITE_STATIC);
+  if (code != SQLITE_OK) store_.Fail(code);
+  return *this;
+}
+
+Statement& Statement::BindNull() {
+  sqlite3_bind_null(statement_, ++bound_);
+  return *this;
+}
+
+bool Statement::Step() {
+  const int code = store_.Step(statement_);
+  if (code == SQLITE_ROW) return true;
+  if (code != SQLITE_DONE) store_.Fail(code);
+  return false;
+}
+
+std::int64_t Statement::GetInt(int column) const { return sqlite3_column_int64(statement_, column); }
+
+std::string Statement::GetText(int column) const {
+  const auto* text = reinterpret_cast<const char*>(sqlite3_column_text(statement_, column));
+  return text == nullptr
+             ? ""
+             : std::string(text, static_cast<std::size_t>(sqlite3_column_bytes(statement_, column)));
+}
+
+Transaction::Transaction(Store& store, Access access) : store_(store) {
+  if (access == Access::Read) {
+    Statement(store, "BEGIN").Step();
+  } else {
+    // Some damage shows as rows that are not there; what is written on top of it would be lost as well. In a
+    // large file the look would take many times what a change does.
+    if (store.IsSmall()) store.CheckStructure();
+    Statement(store, "BEGIN IMMEDIATE").Step();
+  }
+}
+
+Transaction::~Transaction() {
+  if (!open_) return;
+  try {
+    Statement(store_, "ROLLBACK").Step();
+  } catch (const std::exception&) {
+    // SQLite has rolled back by itself: after some failures there is no transaction left.
+  }
+}
+
+void Transaction::Commit() {
+  Statement(store_, "COMMIT").Step();
+  open_ = false;
+}
+
+void CreateTables(Store& store) {
+  store.Execute(kTables);
+  store.Execute(("PRAGMA application_id=" + std::to_string(kApplicationId)).c_str());
+  store.Execute(("PRAGMA user_version=" + std::to_string(kVersion)).c_str());
+}
+
+}  // namespace host

@@ -1,0 +1,113 @@
+#include "host/Targets.h"
+
+#include <algorithm>
+#include <set>
+
+#include "host/Description.h"
+#include "host/Error.h"
+#include "host/TargetSchema.h"
+
+namespace host {
+
+namespace {
+
+/// The portals of the adapter that lead to the target @p name: their names begin with it.
+std::vector<Record> PortalsTo(Tree& tree, std::int64_t adapter, const std::string& name) {
+  Statement statement(tree.GetStore(),
+                      "SELECT record FROM object WHERE parent = ? AND kind = ? AND name > ? AND name < ?"
+                      " ORDER BY place");
+  const std::string least = name + ' ';
+  const std::string most = name + '!';  // what follows a blank
+  statement.Bind(adapter).Bind(static_cast<std::int64_t>(Kind::StaticTarget)).Bind(least).Bind(most);
+  std::vector<Record> portals;
+  while (statement.Step()) portals.push_back(Record::Parse(statement.GetText(0)));
+  std::erase_if(portals, [&](const Record& portal) { return portal.GetString("name") != name; });
+  return portals;
+}
+
+Record NewTarget(const std::string& name) {
+  Record given;
+  given.Set("name", name);
+  return Complete(Kind::Target, given);
+}
+
+bool IsSamePlace(const Record& a, const Record& b) {
+  return a.GetString("address") == b.GetString("address") && a.GetInt("port") == b.GetInt("port");
+}
+
+}  // namespace
+
+KnownTarget GetTarget(Tree& tree, std::int64_t id) {
+  std::optional<Object> named = tree.Lookup(id);
+  if (!named || named->kind != Kind::StaticTarget) named = tree.Get(id, Kind::Target);
+  const std::string name = named->record.GetString("name");
+  KnownTarget target{.adapter = named->parent, .object = {}, .portals = PortalsTo(tree, named->parent, name)};
+  if (named->kind == Kind::StaticTarget) named = tree.Find(target.adapter, Kind::Target, name);
+  if (named) {
+    target.object = *std::move(named);
+  } else {
+    target.object.record = NewTarget(name);
+  }
+  return target;
+}
+
+std::vector<std::int64_t> TargetIds(Tree& tree, std::int64_t adapter) {
+  std::vector<std::int64_t> ids = tree.ChildIds(adapter, Kind::Target);
+  std::set<std::string> seen;
+  for (const Object& portal : tree.Children(adapter, Kind::StaticTarget)) {
+    const std::string& name = portal.record.GetString("name");
+    if (seen.insert(name).second && !tree.Find(adapter, Kind::Target, name)) ids.push_back(portal.id);
+  }
+  return ids;
+}
+
+std::vector<Record> AddressesOf(const KnownTarget& target) {
+  std::vector<Record> addresses;
+  const Record& own = target.object.record;
+  for (std::size_t i = 0; i < own.GetSize("addresses"); ++i) {
+    addresses.push_back(own.GetRecord("addresses/" + std::to_string(i)));
+  }
+  for (const Record& portal : target.portals) {
+    if (!IpFault(portal.GetString("host")).empty()) continue;
+    Record address;
+    address.Set("address", portal.GetString("host"));
+    address.Set("portAndTagPresent", portal.Has("portalGroup") ? 1 : 0);
+    address.Set("port", portal.GetInt("port"));
+    address.Set("tag", portal.Has("portalGroup") ? portal.GetInt("portalGroup") : 0);
+    const auto same = [&](const Record& other) { return IsSamePlace(other, address); };
+    if (std::none_of(addresses.begin(), addresses.end(), same)) addresses.push_back(std::move(address));
+  }
+  return addresses;
+}
+
+bool IsStatic(const Record& portal) {
+  return !portal.Has("sendTarget") || (portal.Has("static") && portal.GetBool("static"));
+}
+
+bool HasSession(Tree& tree, const Object& target) { return !tree.ChildIds(target.id, Kind::Session).empty(); }
+
+void ForgetTarget(Tree& tree, const Object& target) {
+  if (target.record.GetSize("addresses") != 0) return;
+  for (std::size_t i = 0; i < target.record.GetSize("discoveryMethods"); ++i) {
+    // A static target is a portal, and leads to its target as long as it is listed.
+    if (target.record.GetString("discoveryMethods/" + std::to_string(i)) != "static") return;
+  }
+  if (HasSession(tree, target) || !PortalsTo(tree, target.parent, target.name).empty()) return;
+  tree.Remove(target.id);
+}
+
+void SettleTargets(Tree& tree, std::int64_t adapter) {
+  for (const std::int64_t id : TargetIds(tree, adapter)) {
+    const KnownTarget target = GetTarget(tree, id);
+    if (target.object.id == 0) tree.Insert(adapter, Kind::Target, target.object.record);
+  }
+}
+
+Object& OwnObject(Tree& tree, KnownTarget& target) {
+  if (target.object.id != 0) return target.object;
+  SettleTargets(tree, target.adapter);
+  target.object = *tree.Find(target.adapter, Kind::Target, target.object.record.GetString("name"));
+  return target.object;
+}
+
+}  // namespace host

@@ -1,0 +1,69 @@
+/// The objects of a host, as one operation sees and changes them.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "host/Record.h"
+#include "host/Schema.h"
+#include "host/Status.h"
+#include "host/Store.h"
+
+#pragma GCC visibility push(default)
+
+namespace host {
+
+/// The host itself, the object above all others.
+inline constexpr std::int64_t kRoot = 1;
+
+/// A copy of one object.
+struct Object {
+  std::int64_t id = 0;  // never used again once the object is gone
+  std::int64_t parent = 0;
+  Kind kind = Kind::Host;
+  std::string name;  // unique among the siblings of its kind; empty for kinds without names
+  Record record;
+};
+
+class Tree {
+ public:
+  explicit Tree(Store& store) : store_(store) {}
+
+  /// The object @p id; an Error (NotFound) where there is none, (WrongObject) where it is of another kind.
+  Object Get(std::int64_t id, Kind kind);
+  std::optional<Object> Lookup(std::int64_t id);
+  /// The child of that name (see NameOf), if there is one.
+  std::optional<Object> Find(std::int64_t parent, Kind kind, std::string_view name);
+  /// In order of place.
+  std::vector<Object> Children(std::int64_t parent, Kind kind);
+  std::vector<std::int64_t> ChildIds(std::int64_t parent, Kind kind);
+  /// The closest object of @p kind at or above the object @p id, if there is one.
+  std::optional<Object> Above(std::int64_t id, Kind kind);
+
+  /// Adds an object behind its siblings. Its name follows from the record; one that is taken is an Error
+  /// (Exists).
+  Object Insert(std::int64_t parent, Kind kind, Record record);
+  /// Adds an object with every key at its default, except for those in @p given.
+  Object InsertNew(std::int64_t parent, Kind kind, const Record& given);
+  /// Writes the record of @p object, and its name with it.
+  void Update(const Object& object);
+  /// Removes the object and all that is below it.
+  void Remove(std::int64_t id);
+
+  Store& GetStore() { return store_; }
+
+  /// The status that the description has the operation answer, where it does.
+  const std::optional<Status>& Answer() const { return answer_; }
+  void SetAnswer(Status status) { answer_ = status; }
+
+ private:
+  Store& store_;
+  std::optional<Status> answer_;
+};
+
+}  // namespace host
+
+#pragma GCC visibility pop

@@ -1,0 +1,165 @@
+#include "simulator/Commands.h"
+
+#include <cstdio>
+#include <string>
+
+#include "host/Description.h"
+#include "host/Error.h"
+#include "host/Files.h"
+#include "host/Host.h"
+
+namespace simulator {
+
+namespace {
+
+namespace AutoCli = Plinth::AutoCli;
+namespace CallSpec = Plinth::CallSpec;
+namespace MetaObj = Plinth::MetaObj;
+using CallSpec::ParameterType;
+
+constexpr const char* kFile = "file";
+constexpr const char* kSecrets = "secrets";
+
+/// What the commands share: host failures are reported, results are posted.
+class SimulatorCommand : public AutoCli::Command {
+ protected:
+  SimulatorCommand(const std::string& description, const std::string& type) {
+    SetDescription(description);
+    SetMetaDataField("type", type);
+    SetDefaultOutputFormatter("simple");
+  }
+
+  /// Adds the parameters of the command.
+  virtual void Declare(CallSpec::InputSpec&) {}
+  virtual boost::shared_ptr<MetaObj::MetaObject> Prototype() { return MetaObj::MetaBool::New(); }
+  virtual boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input& input) = 0;
+
+  boost::shared_ptr<CallSpec::InputSpec> GetInputSpecInternal() override {
+    auto spec = CallSpec::InputSpec::New();
+    Declare(*spec);
+    return spec;
+  }
+
+  boost::shared_ptr<CallSpec::OutputSpec> GetOutputSpecInternal() override {
+    auto spec = CallSpec::OutputSpec::New();
+    spec->SetResultType(Prototype());
+    return spec;
+  }
+
+  void ExecuteInternal(boost::shared_ptr<CallSpec::Input> input,
+                       boost::shared_ptr<CallSpec::Output> output) override {
+    try {
+      output->SetResult(Run(*input));
+    } catch (const host::Error& error) {
+      output->ReportError(error.what());
+      return;
+    }
+    output->Close();
+  }
+
+  /// Makes @p description the host.
+  static boost::shared_ptr<MetaObj::MetaObject> Load(const std::string& description) {
+    host::Host::Current().Load(description);
+    return MetaObj::MetaBool::New(true);
+  }
+};
+
+class SimulatorLoad final : public SimulatorCommand {
+ public:
+  SimulatorLoad()
+      : SimulatorCommand("Replace the simulated host by the one that a file describes.", "operation") {}
+
+ private:
+  void Declare(CallSpec::InputSpec& spec) override {
+    auto parameter = CallSpec::ParameterSpec::New(kFile, ParameterType::String);
+    parameter->SetHelp("The host description, a JSON document; - reads standard input.");
+    parameter->SetRequired(true);
+    spec.AddParameter(parameter);
+  }
+
+  boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input& input) override {
+    const std::string file = input.GetString(kFile);
+    std::string description;
+    if (!host::ReadFile(file == "-" ? "/dev/stdin" : file, description)) {
+      throw host::Error(host::Error::Kind::Refused, "There is no file " + file + ".");
+    }
+    try {
+      return Load(description);
+    } catch (const host::Error& error) {
+      if (error.GetKind() != host::Error::Kind::Refused) throw;
+      throw host::Error(error.GetKind(), (file == "-" ? "standard input" : file) + ": " + error.what());
+    }
+  }
+};
+
+class SimulatorShow final : public SimulatorCommand {
+ public:
+  SimulatorShow()
+      : SimulatorCommand("Show the simulated host as a description that load reads.", "fetcher") {}
+
+ private:
+  void Declare(CallSpec::InputSpec& spec) override {
+    auto parameter = CallSpec::ParameterSpec::New(kSecrets, ParameterType::Flag);
+    parameter->SetHelp("Show secrets too, which are *** otherwise; load refuses those.");
+    spec.AddParameter(parameter);
+  }
+
+  boost::shared_ptr<MetaObj::MetaObject> Prototype() override { return MetaObj::MetaString::New("{}"); }
+
+  boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input& input) override {
+    return MetaObj::MetaString::New(host::Host::Current().Show(input.GetFlag(kSecrets)));
+  }
+};
+
+class SimulatorReset final : public SimulatorCommand {
+ public:
+  SimulatorReset() : SimulatorCommand("Replace the simulated host by the demo host.", "operation") {}
+
+ private:
+  boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input&) override {
+    return Load(std::string(host::DemoDescription()));
+  }
+};
+
+class SimulatorReboot final : public SimulatorCommand {
+ public:
+  SimulatorReboot()
+      : SimulatorCommand("Boot the simulated host again: changes that wait take effect, sessions start anew.",
+                         "operation") {}
+
+ private:
+  boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input&) override {
+    host::Host::Current().Reboot();
+    return MetaObj::MetaBool::New(true);
+  }
+};
+
+}  // namespace
+
+boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewLoad() {
+  return boost::shared_ptr<Plinth::AutoCli::NamespaceNode>(new SimulatorLoad);
+}
+
+boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewShow() {
+  return boost::shared_ptr<Plinth::AutoCli::NamespaceNode>(new SimulatorShow);
+}
+
+boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewReset() {
+  return boost::shared_ptr<Plinth::AutoCli::NamespaceNode>(new SimulatorReset);
+}
+
+boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewReboot() {
+  return boost::shared_ptr<Plinth::AutoCli::NamespaceNode>(new SimulatorReboot);
+}
+
+boost::shared_ptr<Plinth::AutoCli::Namespace> NewNamespace() {
+  auto simulator = Plinth::AutoCli::Namespace::New();
+  simulator->SetDescription("The simulated host behind the storage libraries.");
+  simulator->RegisterNamespaceNode(NewLoad(), "load");
+  simulator->RegisterNamespaceNode(NewShow(), "show");
+  simulator->RegisterNamespaceNode(NewReset(), "reset");
+  simulator->RegisterNamespaceNode(NewReboot(), "reboot");
+  return simulator;
+}
+
+}  // namespace simulator
