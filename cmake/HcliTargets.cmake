@@ -1,0 +1,63 @@
+# hcli_library(NAME SHARED|MODULE|OBJECT [SOURCES FILE...] [LINK TARGET...] [INCLUDE FOLDER...])
+#
+# Without SOURCES the target is made of every .cpp file in the folder and below it. A MODULE is a plug-in. INCLUDE
+# folders are the target's own: what links a library of the platform sees the contracts only, unless it says more.
+function(hcli_library name kind)
+  cmake_parse_arguments(PARSE_ARGV 2 arg "" "" "SOURCES;LINK;INCLUDE")
+  hcli_sources(sources "${arg_SOURCES}")
+  add_library(${name} ${kind} ${sources})
+  target_include_directories(${name} PRIVATE ${arg_INCLUDE})
+  # PUBLIC for objects: what they need is needed by the binary that takes them in.
+  if(kind STREQUAL "OBJECT")
+    target_link_libraries(${name} PUBLIC contracts ${arg_LINK})
+  else()
+    target_link_libraries(${name} PUBLIC contracts PRIVATE ${arg_LINK})
+  endif()
+  set_target_properties(${name} PROPERTIES DEFINE_SYMBOL "")
+  target_precompile_headers(${name} REUSE_FROM hcli-precompiled)
+  if(kind STREQUAL "MODULE")
+    set_target_properties(${name} PROPERTIES
+      PREFIX "" LIBRARY_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/${HCLI_PLUGIN_FOLDER}")
+    install(TARGETS ${name} LIBRARY DESTINATION ${HCLI_PLUGIN_FOLDER})
+  elseif(kind STREQUAL "SHARED")
+    install(TARGETS ${name} LIBRARY DESTINATION lib)
+  endif()
+endfunction()
+
+# hcli_program(NAME [SOURCES FILE...] [LINK TARGET...] [INCLUDE FOLDER...]): an executable in bin/. The caller installs it, or does not.
+function(hcli_program name)
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINK;INCLUDE")
+  hcli_sources(sources "${arg_SOURCES}")
+  add_executable(${name} ${sources})
+  target_include_directories(${name} PRIVATE ${arg_INCLUDE})
+  target_link_libraries(${name} PRIVATE ${arg_LINK})
+  # The one search path, which holds for what the libraries and plug-ins need as well: with one of its own for each of
+  # them, the dynamic linker would look into some eighty folders that do not exist.
+  set_target_properties(${name} PROPERTIES INSTALL_RPATH "$ORIGIN/../lib")
+  target_link_options(${name} PRIVATE LINKER:--disable-new-dtags)
+endfunction()
+
+# The given files, or else every .cpp file of the current folder and below.
+function(hcli_sources result given)
+  if(NOT given)
+    file(GLOB_RECURSE given CONFIGURE_DEPENDS "${CMAKE_CURRENT_SOURCE_DIR}/*.cpp")
+  endif()
+  set(${result} ${given} PARENT_SCOPE)
+endfunction()
+
+# One precompiled header serves all libraries: their flags are the same. To be called once, ahead of the targets.
+function(hcli_precompile)
+  file(CONFIGURE OUTPUT "${PROJECT_BINARY_DIR}/precompiled.cpp" CONTENT "")
+  add_library(hcli-precompiled OBJECT "${PROJECT_BINARY_DIR}/precompiled.cpp")
+  target_link_libraries(hcli-precompiled PRIVATE contracts)
+  target_precompile_headers(hcli-precompiled PRIVATE
+    <boost/enable_shared_from_this.hpp> <boost/shared_ptr.hpp> <algorithm> <cstdint> <functional> <map> <memory>
+    <optional> <set> <stdexcept> <string> <string_view> <utility> <vector>)
+endfunction()
+
+# hcli_share(FOLDER): data, in share/hcli of both trees. The build tree has a link, so that an edit needs no build.
+function(hcli_share folder)
+  install(DIRECTORY "${PROJECT_SOURCE_DIR}/${folder}" DESTINATION share/hcli OPTIONAL)
+  file(MAKE_DIRECTORY "${PROJECT_BINARY_DIR}/share/hcli")
+  file(CREATE_LINK "${PROJECT_SOURCE_DIR}/${folder}" "${PROJECT_BINARY_DIR}/share/hcli/${folder}" SYMBOLIC)
+endfunction()

@@ -1,0 +1,34 @@
+#include "CommandFrame.h"
+
+namespace TessaroCli::IscsiNamespace {
+
+using CoreCtl::Lib::CoreCtlException;
+using NodeCtl::Lib::NodeCtlException;
+
+void FailureReport::operator()(Plinth::CallSpec::Output& output, const NodeCtlException& failure) const {
+  if (reason == Reason::First) output.ReportError(failure.GetDescription(0));
+  output.ReportError(text);
+  if (reason == Reason::Last) output.ReportError(failure.GetDescription(0));
+}
+
+std::unique_ptr<iScsiInterface> FindAdapter(const InputPtr& input, const OutputPtr& output) {
+  try {
+    return IscsiTools::GetIscsiInterface(input->GetString("adapter"));
+  } catch (const CoreCtlException&) {
+    output->ReportError(InvalidAdapterMessage);
+    return nullptr;
+  }
+}
+
+void Post(const OutputPtr& output, const boost::shared_ptr<Plinth::MetaObj::MetaObject>& result) {
+  output->SetResult(result);
+  output->Close();
+}
+
+void PostSuccess(const OutputPtr& output) { Post(output, Plinth::MetaObj::MetaBool::New(true)); }
+
+void PostText(const OutputPtr& output, const std::string& text) {
+  Post(output, Plinth::MetaObj::MetaString::New(text));
+}
+
+}  // namespace TessaroCli::IscsiNamespace

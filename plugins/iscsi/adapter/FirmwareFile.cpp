@@ -1,0 +1,39 @@
+#include "adapter/FirmwareFile.h"
+
+namespace TessaroCli::IscsiNamespace {
+namespace {
+
+IMA_OID FindPhysicalAdapter(const std::string& name) {
+  for (const IMA_OID& physical : ImaList("Unable to get physical adapter list.", IMA_GetPhbaOidList)) {
+    static constexpr char kNoLogicalAdapters[] = "Unable to get logical adapter list.";
+    const ImaList logicals(kNoLogicalAdapters, IMA_TSR_GetLhbaOidList, physical);
+    const auto named = [&name](const IMA_LHBA_PROPERTIES& properties) {
+      return NarrowText(properties.osDeviceName, IscsiUtil::kDeviceNameSize) == name;
+    };
+    if (FindIma(logicals, IMA_GetLhbaProperties, kNoLogicalAdapters, named)) return physical;
+  }
+  throw IscsiUtil::ImaFailure{"Invalid adapter provided."};
+}
+
+}  // namespace
+
+IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES FirmwareFile::Image(const char* failure) const {
+  IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES image{};
+  CheckIma(IMA_IsPhbaDownloadFile(adapter, path.get(), &image), failure);
+  return image;
+}
+
+void WithFirmwareFile(const InputPtr& input, const OutputPtr& output,
+                      const std::function<void(const FirmwareFile&)>& steps) {
+  ReportingImaFailures(*output, [&] {
+    wchar_t* path = nullptr;
+    CheckIma(IscsiTools::GetWideCharStringFromUtf8String(&path, input->GetString("file").c_str()),
+             "Filename conversion failed.");
+    FirmwareFile file{{}, WideText(path, &std::free), {}};
+    file.adapter = FindPhysicalAdapter(input->GetString("adapter"));
+    file.download = ReadIma(IMA_GetPhbaDownloadProperties, file.adapter, "No download properties.");
+    steps(file);
+  });
+}
+
+}  // namespace TessaroCli::IscsiNamespace

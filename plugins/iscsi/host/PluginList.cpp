@@ -1,0 +1,112 @@
+#include "ImaWalk.h"
+
+namespace TessaroCli::IscsiNamespace {
+namespace {
+
+/// One byte for each character of @p wide, which is not converted: of a character above 255 the low byte
+/// stays, and ends the text where it is zero.
+std::string BytesOf(std::span<const IMA_WCHAR> wide) {
+  std::string bytes;
+  for (const IMA_WCHAR character : wide) {
+    const char byte = static_cast<char>(character);
+    if (byte == 0) break;
+    bytes += byte;
+  }
+  return bytes;
+}
+
+struct Listed {
+  const IMA_PLUGIN_PROPERTIES& properties;
+  const std::string& fileName;
+};
+
+constexpr Column<Listed> kColumns[] = {
+    {"Supported Ima Version",
+     [](const Listed& listed) { return static_cast<long long>(listed.properties.supportedImaVersion); }},
+    {"Vendor", [](const Listed& listed) { return BytesOf(listed.properties.vendor); }},
+    {"Implementation Version",
+     [](const Listed& listed) { return BytesOf(listed.properties.implementationVersion); }},
+    {"File Name", [](const Listed& listed) { return listed.fileName; }},
+    {"Build Time", [](const Listed&) { return "na"; }},
+    {"Auto Persistence Supported",
+     [](const Listed& listed) { return listed.properties.autoPersistenceSupported == 1; }},
+    {"Lhbas Can Be Created And Destroyed",
+     [](const Listed& listed) { return listed.properties.lhbasCanBeCreatedAndDestroyed == 1; }},
+};
+constexpr Structure kPlugin = StructureOf<kColumns>("iScsiPlugin");
+
+constexpr Parameter kParameters[] = {
+    String("plugin", 'p', "The IMA plugin file name."),
+    AdapterFilter(),
+};
+
+constexpr IscsiUtil::ImaFailure kNoMatch{"Unable to find matching plugin."};
+
+}  // namespace
+
+class PluginList : public CommandFrame<PluginList> {
+ public:
+  static constexpr Declaration kDeclaration{
+      .description = "List IMA plugins.",
+      .type = kFetcher,
+      .formatter = "table",
+      .formatterParameters = {Setting(
+          "fields:iScsiPlugin", "File Name,Vendor,Supported Ima Version,Implementation Version,Build Time")},
+      .parameters = kParameters,
+      .result = ListOf(kPlugin),
+  };
+
+  StructPtr GetListType() const { return NewPrototype(kPlugin); }
+
+ private:
+  using List = Plinth::MetaObj::MetaList;
+
+  /// Posts what was found even where a failure ended the search.
+  void ExecuteInternal(InputPtr input, OutputPtr output) override {
+    const bool ofAdapter = input->HasParameter("adapter");
+    if (ofAdapter && input->HasParameter("plugin")) {
+      return output->ReportError("adapter and plugin options are mutually exclusive.");
+    }
+    const ListPtr list = NewList(kPlugin);
+    ReportingImaFailures(*output, [&] {
+      ofAdapter ? ExecuteInternalAdapter(*input, *list) : ExecuteInternalPlugin(*input, *list);
+    });
+    Post(output, list);
+  }
+
+  static void ExecuteInternalPlugin(const Plinth::CallSpec::Input& input, List& list) {
+    const Filter filter(input, "plugin");
+    bool found = false;
+    for (const IMA_OID& oid : ImaList("Unable to get plugin list.", IMA_GetPluginOidList)) {
+      if (!ExecuteInternalAdd(list, oid, filter)) continue;
+      found = true;
+      if (input.HasParameter("plugin")) break;
+    }
+    if (!found) throw kNoMatch;
+  }
+
+  static void ExecuteInternalAdapter(const Plinth::CallSpec::Input& input, List& list) {
+    const ImaList adapters("Unable to get logical adapter list.", IMA_GetLhbaOidList);
+    const auto adapter = FindIma(adapters, IMA_GetLhbaProperties, "Unable to get logical adapter properties.",
+                                 [name = input.GetString("adapter")](const IMA_LHBA_PROPERTIES& properties) {
+                                   return BytesOf(properties.osDeviceName) == name;
+                                 });
+    if (!adapter) throw kNoMatch;
+    ExecuteInternalAdd(list,
+                       ReadIma(IMA_GetAssociatedPluginOid, *adapter, "Unable to get plugin identifier."),
+                       Filter(input, "plugin"));
+  }
+
+  /// Appends the row of the plug-in if it passes.
+  static bool ExecuteInternalAdd(List& list, const IMA_OID& oid, const Filter& filter) {
+    const auto properties = ReadIma(IMA_GetPluginProperties, oid, "Unable to get plugin properties.");
+    const std::string fileName = BytesOf(properties.fileName);
+    if (!filter.Passes(fileName)) return false;
+    list.Append(NewRow(kPlugin, kColumns, {properties, fileName}));
+    return true;
+  }
+};
+
+template NodePtr Make<PluginList>();
+
+}  // namespace TessaroCli::IscsiNamespace

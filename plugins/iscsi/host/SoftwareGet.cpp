@@ -1,0 +1,24 @@
+#include "CommandFrame.h"
+
+namespace TessaroCli::IscsiNamespace {
+
+class SoftwareGet : public CommandFrame<SoftwareGet> {
+ public:
+  static constexpr Declaration kDeclaration{
+      .description = "Software iSCSI information.",
+      .type = kFetcher,
+      .formatter = "simple",
+      .result = Success(),
+  };
+
+ private:
+  void ExecuteInternal(InputPtr, OutputPtr output) override {
+    CoreCtl::Storage::StorageInfoImpl storage;
+    Guarded(output, {"Unable to get Software iSCSI information."},
+            [&] { Post(output, Plinth::MetaObj::MetaBool::New(storage.HasSoftwareiScsiEnabled())); });
+  }
+};
+
+template NodePtr Make<SoftwareGet>();
+
+}  // namespace TessaroCli::IscsiNamespace

@@ -1,0 +1,62 @@
+#include "CommandFrame.h"
+
+namespace TessaroCli::IscsiNamespace {
+namespace {
+
+using NodeCtl::Network::Ipv6AddressType;
+using NodeCtl::Network::Ipv6Network;
+
+std::string TypeText(Ipv6AddressType type) {
+  switch (type) {
+    case Ipv6AddressType::Static:
+      return "STATIC";
+    case Ipv6AddressType::Dhcp:
+      return "DHCP";
+    case Ipv6AddressType::AutoConf:
+      return "AUTOCONF";
+  }
+  return "UNKNOWN";
+}
+
+constexpr Column<Ipv6Network> kColumns[] = {
+    {"Address", [](const Ipv6Network& network) { return network.GetAddress().GetStringAddress(); }},
+    {"IPv6PrefixLength", [](const Ipv6Network& network) { return network.GetNetmask(); }},
+    {"Type", [](const Ipv6Network& network) { return TypeText(network.GetIpv6AddressType()); }},
+};
+constexpr Structure kAddress = StructureOf<kColumns>("IPv6Address");
+
+constexpr Parameter kParameters[] = {Adapter()};
+
+}  // namespace
+
+class NetworkPortalIpv6configAddressList : public CommandFrame<NetworkPortalIpv6configAddressList> {
+ public:
+  static constexpr Declaration kDeclaration{
+      .description = "List the IPv6 addresses assigned to the iSCSI network portal.",
+      .type = kFetcher,
+      .formatter = "table",
+      .formatterParameters = {FieldsFrom(0, "fields:IPv6Address")},
+      .parameters = kParameters,
+      .result = ListOf(kAddress),
+  };
+
+  /// Virtual in this class alone: it has a place in the class's binary interface.
+  virtual StructPtr GetOutputStructure() { return NewPrototype(kAddress); }
+
+ private:
+  void ExecuteInternal(InputPtr input, OutputPtr output) override {
+    WithAdapter(input, output, {"Unable to list IPv6 Addresses.", FailureReport::Reason::Last},
+                [&](iScsiInterface& adapter) {
+                  const ListPtr list = NewList(kAddress);
+                  const auto properties = adapter.GetNetworkProperties();
+                  for (const Ipv6Network& network : properties.ipConfig.GetIpv6Network()) {
+                    list->Append(NewRow(kAddress, kColumns, network));
+                  }
+                  Post(output, list);
+                });
+  }
+};
+
+template NodePtr Make<NetworkPortalIpv6configAddressList>();
+
+}  // namespace TessaroCli::IscsiNamespace

@@ -1,0 +1,32 @@
+#include "session/SessionChange.h"
+
+namespace TessaroCli::IscsiNamespace {
+namespace {
+
+constexpr Parameter kParameters[] = {
+    Adapter(),
+    String("name", 'n', "The iSCSI target name."),
+    SessionToDuplicate(),
+};
+
+}  // namespace
+
+class SessionAdd : public CommandFrame<SessionAdd> {
+ public:
+  static constexpr Declaration kDeclaration{
+      .description = "Login sessions on current iSCSI configuration.",
+      .type = kOperation,
+      .parameters = kParameters,
+      .result = Success(),
+  };
+
+ private:
+  void ExecuteInternal(InputPtr input, OutputPtr output) override {
+    ChangeSessions(input, output, "Failed to add session.",
+                   [](const IMA_OID& oid) { return IMA_TSR_AddSession(oid, 0, 0, 0); });
+  }
+};
+
+template NodePtr Make<SessionAdd>();
+
+}  // namespace TessaroCli::IscsiNamespace

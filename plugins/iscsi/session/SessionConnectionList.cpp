@@ -1,0 +1,156 @@
+#include <CoreCtl/Exception.h>
+
+#include <cstdlib>
+#include <ctime>
+#include <iterator>
+
+#include "ImaWalk.h"
+
+namespace TessaroCli::IscsiNamespace {
+namespace {
+
+using Properties = IMA_CONNECTION_PROPERTIES;
+using Status = IMA_TSR_CONNECTION_STATUS;
+
+struct Listed {
+  const ImaWalk::Session& session;
+  Properties properties;
+  Status status;
+};
+
+constexpr char kNotAvailable[] = "Not Available";
+
+constexpr const char* kStates[] = {"free",      "xpt_wait",  "xpt_up",           "in_login",
+                                   "logged_in", "in_logout", "logout_requested", "cleanup_wait"};
+
+bool IsWithin(int value, int least, int most) { return value >= least && value <= most; }
+
+std::string TimeText(const IMA_DATETIME& time) {
+  // strftime takes no time that does not exist.
+  const bool exists = IsWithin(time.tm_mon, 0, 11) && IsWithin(time.tm_mday, 1, 31) &&
+                      IsWithin(time.tm_hour, 0, 23) && IsWithin(time.tm_min, 0, 59) &&
+                      IsWithin(time.tm_sec, 0, 60);
+  if (!exists) return kNotAvailable;
+  std::tm shown{};
+  shown.tm_year = time.tm_year;
+  shown.tm_mon = time.tm_mon;
+  shown.tm_mday = time.tm_mday;
+  shown.tm_hour = time.tm_hour;
+  shown.tm_min = time.tm_min;
+  shown.tm_sec = time.tm_sec;
+  char text[64];
+  return std::strftime(text, sizeof text, "%D %T", &shown) == 0 ? kNotAvailable : text;
+}
+
+template <auto member>
+constexpr auto Number =
+    [](const Listed& listed) { return static_cast<long long>(listed.properties.*member); };
+template <auto member>
+constexpr auto Is = [](const Listed& listed) { return listed.properties.*member != 0; };
+template <auto present, auto address>
+constexpr auto Address = [](const Listed& listed) -> std::string {
+  return listed.status.*present == 1 ? AddressText(listed.status.*address) : kNotAvailable;
+};
+template <auto present, auto time>
+constexpr auto Time = [](const Listed& listed) -> std::string {
+  return listed.status.*present == 1 ? TimeText(listed.status.*time) : kNotAvailable;
+};
+
+}  // namespace
+
+class SessionConnectionList : public CommandFrame<SessionConnectionList> {
+  /// In upper case, unlike the shared conversion.
+  static const char* GetStringFromImaDigest(IMA_DIGEST_TYPE digest) {
+    if (digest == IMA_DIGEST_NONE) return "NONE";
+    if (digest == IMA_DIGEST_CRC32C) return "CRC32C";
+    throw CoreCtl::Lib::CoreCtlException("Invalid digest value",
+                                         "plugins/iscsi/session/SessionConnectionList", __LINE__,
+                                         NodeCtl::Lib::NoticeMessage());
+  }
+
+  static constexpr Column<Listed> kColumns[] = {
+      {"ID",
+       [](const Listed& listed) {
+         return CutText(listed.session.Id() + ',' + std::to_string(listed.properties.connectionId),
+                        kTextSize);
+       }},
+      {"Adapter", [](const Listed& listed) { return listed.session.target.adapter.name; }},
+      {"Target", [](const Listed& listed) { return listed.session.target.name; }},
+      {"ISID", [](const Listed& listed) { return listed.session.isid; }},
+      {"CID", Number<&Properties::connectionId>},
+      {"DataDigest",
+       [](const Listed& listed) { return GetStringFromImaDigest(listed.properties.dataDigest); }},
+      {"HeaderDigest",
+       [](const Listed& listed) { return GetStringFromImaDigest(listed.properties.headerDigest); }},
+      {"IFMarker", Is<&Properties::ifMarker>},
+      {"IFMarkerInterval", Number<&Properties::ifMarkerInterval>},
+      {"MaxRecvDataSegmentLength", Number<&Properties::maxRecvDataSegmentLength>},
+      {"MaxTransmitDataSegmentLength", Number<&Properties::maxTransmitDataSegmentLength>},
+      {"OFMarker", Is<&Properties::ofMarker>},
+      {"OFMarkerInterval", Number<&Properties::ofMarkerInterval>},
+      {"ConnectionAddress", Address<&Status::connectionAddressPresent, &Status::connectionAddress>},
+      {"RemoteAddress", Address<&Status::remoteAddressPresent, &Status::remoteAddress>},
+      {"LocalAddress", Address<&Status::localAddressPresent, &Status::localAddress>},
+      {"SessionCreateTime", Time<&Status::sessionCreateTimePresent, &Status::sessionCreateTime>},
+      {"ConnectionCreateTime", Time<&Status::connectionCreateTimePresent, &Status::connectionCreateTime>},
+      {"ConnectionStartTime", Time<&Status::connectionStartTimePresent, &Status::connectionStartTime>},
+      {"State",
+       [](const Listed& listed) {
+         return listed.status.state < std::size(kStates) ? kStates[listed.status.state] : "unknown";
+       }},
+  };
+  static constexpr Structure kConnection = StructureOf<kColumns>("Connection");
+
+  static constexpr Parameter kParameters[] = {
+      AdapterFilter(),
+      String("name", 'n', "The iSCSI target name."),
+      String("isid", 's', "The iSCSI session identifier(ISID)."),
+      String("cid", 'c', "The iSCSI connection identifier(CID)."),
+  };
+
+  static constexpr WalkTexts kTexts{
+      .sessionList = "Unable to get session list.",
+      .sessionProperties = "Unable to get logical adapter properties.",
+  };
+
+ public:
+  static constexpr Declaration kDeclaration{
+      .description = "List iSCSI connections.",
+      .type = kFetcher,
+      .formatter = "simple",
+      .formatterParameters =
+          {Setting("header:Connection", "%ID%"),
+           Setting("fields:Connection",
+                   "Adapter,Target,ISID,CID,DataDigest,HeaderDigest,IFMarker,IFMarkerInterval,"
+                   "MaxRecvDataSegmentLength,MaxTransmitDataSegmentLength,OFMarker,OFMarkerInterval,"
+                   "ConnectionAddress,RemoteAddress,LocalAddress,SessionCreateTime,ConnectionCreateTime,"
+                   "ConnectionStartTime,State")},
+      .parameters = kParameters,
+      .result = ListOf(kConnection),
+  };
+
+  StructPtr GetListType() const { return NewPrototype(kConnection); }
+
+ private:
+  void ExecuteInternal(InputPtr input, OutputPtr output) override {
+    const bool limited = input->HasParameter("cid");
+    // A text without a number in it stands for 0.
+    const long cid = limited ? std::strtol(input->GetString("cid").c_str(), nullptr, 10) : 0;
+    PostImaList(output, kConnection, [&](auto& list) {
+      ImaWalk(input, kTexts).Sessions([&](const ImaWalk::Session& session) {
+        for (const IMA_OID& oid :
+             ImaList("Unable to get connection list.", IMA_GetConnectionOidList, session.oid)) {
+          const auto properties =
+              ReadIma(IMA_GetConnectionProperties, oid, "Unable to get connection properties.");
+          if (limited && properties.connectionId != cid) continue;
+          const auto status = ReadIma(IMA_TSR_GetConnectionStatus, oid, "Unable to get connection status.");
+          list.Append(NewRow(kConnection, kColumns, {session, properties, status}));
+        }
+      });
+    });
+  }
+};
+
+template NodePtr Make<SessionConnectionList>();
+
+}  // namespace TessaroCli::IscsiNamespace

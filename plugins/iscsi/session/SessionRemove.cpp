@@ -1,0 +1,31 @@
+#include "session/SessionChange.h"
+
+namespace TessaroCli::IscsiNamespace {
+namespace {
+
+constexpr Parameter kParameters[] = {
+    Adapter(),
+    String("name", 'n', "The name of the target to login to."),
+    SessionToDuplicate(),
+};
+
+}  // namespace
+
+class SessionRemove : public CommandFrame<SessionRemove> {
+ public:
+  static constexpr Declaration kDeclaration{
+      .description = "Logout sessions on current iSCSI configuration.",
+      .type = kOperation,
+      .parameters = kParameters,
+      .result = Success(),
+  };
+
+ private:
+  void ExecuteInternal(InputPtr input, OutputPtr output) override {
+    ChangeSessions(input, output, "Failed to remove session.", IMA_TSR_RemoveSession);
+  }
+};
+
+template NodePtr Make<SessionRemove>();
+
+}  // namespace TessaroCli::IscsiNamespace
