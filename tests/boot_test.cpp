@@ -1,0 +1,135 @@
+// iscsi ibftboot get|import.
+#include "support/Harness.h"
+
+namespace {
+
+using nlohmann::json;
+using testing::ElementsAre;
+
+constexpr char kHost[] = R"({
+  "bootTables": [
+    {"table": "secondary", "enabled": 1, "targetName": "iqn.2026-11.org.example:second"},
+    {"table": "primary", "enabled": 2, "nicFlags": 3, "macAddress": "02:00:00:00:00:01", "nicIP": "192.0.2.2",
+     "nicSubnetMask": "255.255.255.0", "nicGateway": "192.0.2.1", "nicDhcp": -1, "nicVlan": 7, "targetBootFlags": 5,
+     "targetIP": "192.0.2.80", "targetPort": 860, "lun": "4611686018427387904",
+     "targetName": "iqn.2026-11.org.example:boot", "chapType": 2, "chapName": "one", "chapPwd": "secret-one-0123",
+     "reverseChapName": "two", "reverseChapPwd": "secret-two-0123", "initiatorBootFlags": 9, "slpIP": "192.0.2.3",
+     "initiatorName": "iqn.2026-11.org.example:me", "initiatorAlias": "me"}],
+  "adapters": [
+    {"name": "dep", "kind": "dependent",
+     "capabilities": {"Static Discovery Settable": true, "CHAP Authorization Supported": true,
+                      "Mutual Authentication Supported": true, "Target Level Authentication Supported": true,
+                      "Target Level Mutual Authentication Supported": true},
+     "physicalPortals": [{"name": "phy0", "mac": "02:00:00:00:00:01"}]},
+    {"name": "plain", "kind": "dependent", "physicalPortals": [{"name": "phy0", "mac": "02:00:00:00:00:01"}]},
+    {"name": "ind", "kind": "independent", "capabilities": {"Static Discovery Settable": true}}]})";
+
+TEST(IbftBoot, GetShowsThePrimaryTableWithoutSecrets) {
+  const Outcome run = Harness(kHost)("iscsi ibftboot get --output json");
+  EXPECT_EQ(run.result, json::array({json::parse(R"({
+      "Target Name": "iqn.2026-11.org.example:boot", "Target IP": "192.0.2.80", "Target Port": 860,
+      "Target Boot Flags": 5, "Lun": 4611686018427387904, "MAC Address": "02:00:00:00:00:01",
+      "IP Address": "192.0.2.2", "Subnet Mask": "255.255.255.0", "Gateway": "192.0.2.1", "Dhcp": true, "Vlan": 7,
+      "NIC Flags": 3, "Chap Type": 2, "Chap Name": "one", "Mutual Chap Name": "two",
+      "SLP Server IP": "192.0.2.3", "Initiator Name": "iqn.2026-11.org.example:me", "Initiator Alias": "me",
+      "Initiator Boot Flags": 9, "Enabled": true})")}));
+  EXPECT_THAT(run.Calls(), ElementsAre("GetiScsiBootTables"));
+  EXPECT_EQ(run.out.find("secret"), run.out.npos);
+
+  const json empty = Harness("{}")("iscsi ibftboot get").result;
+  ASSERT_EQ(empty.size(), 1u);
+  EXPECT_EQ(empty[0]["Target Name"], "");
+  EXPECT_EQ(empty[0]["Lun"], 0);
+  EXPECT_EQ(empty[0]["Enabled"], false);
+}
+
+TEST(IbftBoot, ImportMarksTheTargetOnEveryEligibleAdapter) {
+  Harness host(kHost);
+  for (int time = 0; time < 2; ++time) {  // the second finds all in place
+    const Outcome run = host("iscsi ibftboot import");
+    EXPECT_EQ(run.result, true);
+    EXPECT_THAT(run.trace, ElementsAre("MountiScsiBootLun(true, true) = ok"));
+    EXPECT_EQ(host.Show("/adapters/0/staticTargets").size(), 1u);
+    EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/name"), "iqn.2026-11.org.example:boot");
+    EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/host"), "192.0.2.80");
+    EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/port"), 860);
+    EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/boot"), true);
+    EXPECT_TRUE(host.Show("/adapters/1/staticTargets").empty());
+    EXPECT_TRUE(host.Show("/adapters/2/staticTargets").empty());
+  }
+}
+
+TEST(IbftBoot, ImportTakesChapFromTheTableAndTheAdapterByItsMac) {
+  // What an import of mutual CHAP left behind.
+  constexpr char kImported[] =
+      R"({"staticTargets": [{"name": "iqn.2026-11.org.example:boot", "host": "192.0.2.80",
+      "port": 860, "chap": {"uni": {"name": "one", "secret": "x"}, "mutual": {"name": "two", "secret": "y"}}}]})";
+  const struct {
+    const char* table;    // what is different in it
+    const char* adapter;  // and in the first adapter
+    json chap;            // of the static target; null where there is none
+  } kCases[] = {
+      {R"({"chapType": 0})", "{}", json::object()},
+      {R"({"chapType": 1})", "{}",
+       json::parse(
+           R"({"uni": {"inherited": false, "name": "one", "secret": "secret-one-0123", "level": "required"}})")},
+      {R"({"chapType": 0})", kImported, json::object()},
+      {R"({"chapType": 1, "chapName": "once", "chapPwd": "secret-once-0123"})", kImported,
+       json::parse(
+           R"({"uni": {"inherited": false, "name": "once", "secret": "secret-once-0123", "level": "required"}})")},
+      {R"({"chapType": 1, "chapPwd": ""})", "{}", nullptr},
+      {R"({"chapType": 2, "reverseChapName": ""})", "{}", nullptr},
+      {R"({"chapType": 3})", "{}", nullptr},
+      {R"({"chapType": 1})", R"({"capabilities": {"Target Level Authentication Supported": false}})",
+       nullptr},
+      {R"({"chapType": 2})", R"({"capabilities": {"Target Level Mutual Authentication Supported": false}})",
+       nullptr},
+      {R"({"chapType": 0})", R"({"state": 1})", nullptr},
+      {R"({"chapType": 0})", R"({"capabilities": {"Static Discovery Settable": false}})", nullptr},
+      {R"({"chapType": 0, "targetIP": "2001:db8::80"})", "{}", nullptr},
+      {R"({"chapType": 0, "targetIP": "2001:db8::80"})", R"({"capabilities": {"IPv6 Supported": true}})",
+       json::object()},
+      {R"({"chapType": 0, "macAddress": "02-00-00-00-00-01"})", "{}", json::object()},
+      {R"({"chapType": 0, "macAddress": "02:00:00:00:00:02"})", "{}", nullptr},
+      {R"({"chapType": 0, "macAddress": "02:00:00:00:00:02"})", R"({"networkPortals": [{"nic": "nic2"}]})",
+       json::object()},
+      {R"({"chapType": 0, "macAddress": "nonsense"})", "{}", nullptr},
+      {R"({"chapType": 0, "macAddress": ""})", R"({"physicalPortals": []})", json::object()},
+  };
+  for (const auto& [table, adapter, chap] : kCases) {
+    json description = json::parse(kHost);
+    description["nics"] = json::parse(R"([{"name": "nic2", "mac": "02:00:00:00:00:02"}])");
+    description["bootTables"][1].update(json::parse(table));
+    description["adapters"].erase(1);  // "plain", which cannot take CHAP, and nothing else
+    description["adapters"][0].update(json::parse(adapter), true);
+    SCOPED_TRACE(std::string(table) + adapter);
+    Harness host(description.dump());
+    const Outcome run = host("iscsi ibftboot import");
+    EXPECT_EQ(run.result, chap.is_null() ? json() : json(true));
+    const json targets = host.Show("/adapters/0/staticTargets");
+    ASSERT_EQ(targets.size(), chap.is_null() ? 0u : 1u);
+    if (!chap.is_null()) {
+      EXPECT_EQ(targets[0]["chap"], chap);
+    }
+    EXPECT_EQ(run.trace[0].find("secret-"), std::string::npos);
+  }
+}
+
+TEST(IbftBoot, FailuresHaveOneTextAndNoSecret) {
+  EXPECT_THAT(
+      Harness(WithAnswers(kHost, R"({"operation": "GetiScsiBootTables", "throw": "NodeCtlException"})"))(
+          "iscsi ibftboot get")
+          .messages,
+      ElementsAre("Unable to get boot tables."));
+  // No table, one that is off, and one without a usable target.
+  for (const char* table : {"[]", R"([{"table": "primary", "targetName": "iqn.2026-11.org.example:boot"}])",
+                            R"([{"table": "primary", "enabled": 1, "chapPwd": "secret-one-0123"}])"}) {
+    json host = json::parse(kHost);
+    host["bootTables"] = json::parse(table);
+    const Outcome run = Harness(host.dump())("iscsi ibftboot import");
+    EXPECT_THAT(run.messages, ElementsAre("Unable to import IBFT Boot table."));
+    EXPECT_EQ(run.trace[0].find("secret-"), std::string::npos);
+  }
+}
+
+}  // namespace

@@ -1,0 +1,145 @@
+#include <CoreCtl/Util.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+
+#include "support/Harness.h"
+
+using CoreCtl::Util::EnvironmentVarFile;
+using NodeCtl::Lib::NodeCtlException;
+using testing::HasSubstr;
+
+namespace {
+
+constexpr const char* kPath = "/etc/tessaro/names";
+
+/// A host with one file in it.
+class EnvironmentFile : public testing::Test {
+ protected:
+  std::string File() const { return root_.Path() + kPath; }
+
+  void Write(const std::string& contents) {
+    std::filesystem::create_directories(root_.Path() + "/etc/tessaro");
+    std::ofstream(File()) << contents;
+  }
+
+  std::string Contents() const { return root_.Read(kPath); }
+
+  static void Store(const std::string& name, const std::string& value) {
+    EnvironmentVarFile file(kPath);
+    file.Parse();
+    file.Set(name, value);
+    file.Save();
+  }
+
+  TemporaryRoot root_;
+  Harness host_{"{}"};
+};
+
+TEST_F(EnvironmentFile, SetKeepsEverythingElse) {
+  const struct {
+    const char* name;
+    std::string before, after;
+  } cases[] = {
+      {"no file", "", "A='x y'\n"},
+      {"another variable", "# why\n\nB=1\n", "# why\n\nB=1\nA='x y'\n"},
+      {"in its place", "B=1\nA=2\nC=3\n", "B=1\nA='x y'\nC=3\n"},
+      {"every assignment", "A=1\nB=2\nA=3\n", "A='x y'\nB=2\nA='x y'\n"},
+      {"a comment behind", "A=\"old value\"  # why\n", "A='x y'  # why\n"},
+      {"a mark that is no comment", "A=a#b\n", "A='x y'\n"},
+      {"more words", "A=1 2\n", "A='x y'\n"},
+      {"indented and exported", "  export\tA=1\r\n", "  export\tA='x y'\r\n"},
+      {"quotes with escapes", "A=\"a\\\"b\"'c'\\ d\nB=2\n", "A='x y'\nB=2\n"},
+      {"commented out", "#A=1\n", "#A=1\nA='x y'\n"},
+      {"a longer name", "AA=1\n", "AA=1\nA='x y'\n"},
+      {"no last line break", "B=1", "B=1\nA='x y'\n"},
+      {"its own last line", "A=1", "A='x y'"},
+  };
+  for (const auto& [name, before, after] : cases) {
+    Write(before);
+    Store("A", "x y");
+    EXPECT_EQ(Contents(), after) << name;
+  }
+}
+
+TEST_F(EnvironmentFile, AShellReadsWhatWasSet) {
+  for (const std::string& value :
+       std::vector<std::string>{"iqn.2001-04.com.example:host1", "", "it's", "$HOME `x` \\", "a\"b;c&d|e>f*",
+                                "~", "#x", "\t \x01\xc3\xbc", "a=b"}) {
+    Store("InitiatorName", value);
+    std::string read;
+    FILE* shell = popen((". " + File() + " && printf %s \"$InitiatorName\"").c_str(), "r");
+    for (int c; (c = std::fgetc(shell)) != EOF;) read += static_cast<char>(c);
+    EXPECT_EQ(pclose(shell), 0);
+    EXPECT_EQ(read, value);
+  }
+}
+
+TEST_F(EnvironmentFile, RefusesWhatItCannotKeep) {
+  for (const std::string line : {"B", "1B=2", "B =2", "=2", "B='2", "B=\"2\\\"", "B=2\\", "export"}) {
+    Write("A=1\n" + line + "\nC=3\n");
+    EnvironmentVarFile file(kPath);
+    try {
+      file.Parse();
+      ADD_FAILURE() << line;
+    } catch (const NodeCtlException& error) {
+      EXPECT_THAT(error.GetDescription(0), testing::AllOf(HasSubstr(File()), HasSubstr("line 2"))) << line;
+    }
+  }
+  // It still holds what was read before.
+  Write("A=1\n");
+  EnvironmentVarFile file(kPath);
+  file.Parse();
+  Write("nonsense\n");
+  EXPECT_THROW(file.Parse(), NodeCtlException);
+  file.Save();
+  EXPECT_EQ(Contents(), "A=1\n");
+  for (const char* name : {"", "1A", "A B", "A=", "\u00e4"}) {
+    EXPECT_THROW(file.Set(name, "x"), NodeCtlException) << name;
+  }
+  EXPECT_THROW(file.Set("A", "x\ny"), NodeCtlException);
+  EXPECT_THROW(file.Set("A", std::string(1, '\0')), NodeCtlException);
+}
+
+TEST_F(EnvironmentFile, OwnerAndModeStay) {
+  const auto owned = [this] {
+    struct stat status {};
+    EXPECT_EQ(stat(File().c_str(), &status), 0);
+    return std::pair(status.st_mode & 07777, status.st_uid);
+  };
+  umask(0);
+  Store("A", "1");
+  umask(022);
+  EXPECT_EQ(owned(), std::pair(0600u, geteuid()));
+  const uid_t owner = geteuid() == 0 ? 4321 : geteuid();
+  ASSERT_EQ(chmod(File().c_str(), 0646) + chown(File().c_str(), owner, static_cast<gid_t>(-1)), 0);
+  Store("A", "2");
+  EXPECT_EQ(owned(), std::pair(0646u, owner));
+}
+
+TEST_F(EnvironmentFile, NothingIsLostWhereItCannotBeSaved) {
+  std::filesystem::create_directories(root_.Path() + "/etc/tessaro");
+  const std::string elsewhere = root_.Path() + "/elsewhere";
+  std::ofstream(elsewhere) << "A=1\n";
+  std::filesystem::create_symlink(elsewhere, File());
+  EXPECT_THROW(Store("A", "2"), NodeCtlException);
+  EXPECT_TRUE(std::filesystem::is_symlink(File()));
+  EXPECT_EQ(Contents(), "A=1\n");
+  std::filesystem::remove(File());
+  std::filesystem::create_directory(File());
+  EXPECT_THROW(Store("A", "2"), NodeCtlException);
+  std::filesystem::remove_all(root_.Path() + "/etc");
+  std::ofstream(root_.Path() + "/etc") << "a file where a folder must be";
+  EXPECT_THROW(Store("A", "2"), NodeCtlException);
+  // Nothing that was begun stays behind.
+  for (const auto& entry : std::filesystem::recursive_directory_iterator(root_.Path())) {
+    EXPECT_NE(entry.path().filename().string().front(), '.') << entry.path();
+  }
+}
+
+}  // namespace

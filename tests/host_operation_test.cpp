@@ -1,0 +1,223 @@
+// Operations at the choke point: trace, answers, adapters, and the memory and texts of the management API.
+#include <CoreCtl/Storage.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <text/text.h>
+
+#include <cstring>
+#include <fstream>
+#include <memory>
+#include <new>
+
+#include "host/Host.h"
+#include "ima/Memory.h"
+#include "ima/Operation.h"
+#include "support/Harness.h"
+
+using CoreCtl::Lib::CoreCtlException;
+using CoreCtl::Storage::iScsiInterfaceImpl;
+using CoreCtl::Storage::StorageInfoImpl;
+using NodeCtl::Lib::NodeCtlException;
+using NodeCtl::Storage::iScsiInterface;
+using NodeCtl::Storage::ScsiInterface;
+using testing::ElementsAre;
+
+namespace {
+
+constexpr const char* kAdapters = R"("adapters": [
+    {"name": "hba0", "kind": "dependent", "state": 7, "capabilities": {"Name And Alias Settable": true}},
+    {"name": "hba1", "capabilities": {"IPv6 Supported": true}},
+    {"name": "disk0", "kind": "scsi", "uid": "u", "driver": "d"}])";
+
+std::string With(const std::string& more) { return "{" + std::string(kAdapters) + ", " + more + "}"; }
+
+std::unique_ptr<iScsiInterface> Adapter(const std::string& name) {
+  return std::unique_ptr<iScsiInterface>(
+      dynamic_cast<iScsiInterfaceImpl*>(StorageInfoImpl().GetScsiInterface(name)));
+}
+
+/// The host, and the trace of what is called on it.
+struct Traced {
+  explicit Traced(const std::string& description) : harness(description) {
+    host::SetTraceSink([this](const std::string& line) { trace.push_back(line); });
+  }
+  std::vector<std::string> trace;
+  Harness harness;  // ends the trace when it goes
+};
+
+TEST(HostOperation, TheTraceTellsEachCallAndItsOutcome) {
+  const Traced host(With(
+      R"("answers": [{"operation": "GetCapabilities", "throw": "NodeCtlException", "text": "no\nway"}])"));
+  const auto adapter = Adapter("hba0");
+  adapter->SetInitiatorAlias("a \"b\"\x01");
+  adapter->GetInitiatorAlias();
+  adapter->IsSoftwareOrDependent();
+  adapter->GetPhysicalHbaProperties();
+  EXPECT_THROW(adapter->GetCapabilities(), NodeCtlException);
+  StorageInfoImpl().GetScsiInterface("none");
+  StorageInfoImpl().EnableSoftwareiScsi(false);
+  EXPECT_EQ(host::Host::Current().Change(
+                host::Call::OnAdapter("SetMtu", "hba0", {host::Argument::Secret(), 9000, true}),
+                [](host::Tree&) { return host::Status::ResetRequired; }),
+            host::Status::ResetRequired);
+  EXPECT_THAT(
+      host.trace,
+      ElementsAre("GetScsiInterface(\"hba0\") = ok", R"(SetInitiatorAlias(hba0, "a \"b\"\x01") = 0)",
+                  R"(GetInitiatorAlias(hba0) = "a \"b\"\x01")", "IsSoftwareOrDependent(hba0) = true",
+                  "GetPhysicalHbaProperties(hba0) = ok", "GetCapabilities(hba0) ! NodeCtlException: no\nway",
+                  "GetScsiInterface(\"none\") = null", "EnableSoftwareiScsi(false) = ok",
+                  "SetMtu(hba0, ***, 9000, true) = 2"));
+}
+
+TEST(HostOperation, AnswersAreForTheirOperationAdapterAndCall) {
+  const Traced host(With(R"("answers": [
+      {"operation": "GetAdapterState", "adapter": "hba0", "call": 2, "throw": "NodeCtlException", "text": "second"},
+      {"operation": "GetInitiatorName", "call": 3, "throw": "bad_alloc"},
+      {"operation": "GetScsiInterface", "adapter": "hba1", "call": 2, "throw": "NodeCtlException", "text": "x"},
+      {"operation": "GetName", "throw": "CoreCtlException", "text": "first"},
+      {"operation": "GetName", "throw": "NodeCtlException", "text": "never"}])"));
+  const auto hba0 = Adapter("hba0");
+  const auto hba1 = Adapter("hba1");
+  hba1->GetAdapterState();
+  EXPECT_EQ(static_cast<int>(hba0->GetAdapterState()), 7);
+  EXPECT_THROW(hba0->GetAdapterState(), NodeCtlException);
+  hba0->GetAdapterState();
+  hba0->GetInitiatorName();
+  hba1->GetInitiatorName();
+  EXPECT_THROW(hba0->GetInitiatorName(), std::bad_alloc);
+  EXPECT_THROW(hba0->GetName(), CoreCtlException);
+  EXPECT_THROW(Adapter("hba1"), NodeCtlException);
+  EXPECT_EQ(host.trace.back(), "GetScsiInterface(\"hba1\") ! NodeCtlException: x");
+}
+
+TEST(HostOperation, AnsweredStatus) {
+  Traced host(With(R"("answers": [{"operation": "SetInitiatorAlias", "call": 1, "status": 1},
+                                 {"operation": "SetInitiatorAlias", "call": 2, "status": 4},
+                                 {"operation": "SetInitiatorAlias", "call": 3, "status": 9}])"));
+  const auto adapter = Adapter("hba0");
+  const auto set = [&](const char* alias) { return static_cast<int>(adapter->SetInitiatorAlias(alias)); };
+  EXPECT_EQ(set("one"), 1);
+  EXPECT_EQ(set("two"), 4);
+  EXPECT_EQ(host.harness.Show("/adapters/0/pending/reboot/alias"), "one");
+  EXPECT_EQ(set("three"), 9);
+  EXPECT_EQ(set("four"), 0);
+  EXPECT_EQ(host.harness.Show("/adapters/0/alias"), "four");
+}
+
+TEST(HostOperation, Adapters) {
+  Traced host(With(R"("softwareIscsi": {"enabled": true})"));
+  const std::unique_ptr<ScsiInterface> disk(StorageInfoImpl().GetScsiInterface("disk0"));
+  EXPECT_EQ(dynamic_cast<iScsiInterfaceImpl*>(disk.get()), nullptr);
+  EXPECT_EQ(disk->GetName() + disk->GetAdapterUid() + disk->GetDriverName(), "disk0ud");
+  EXPECT_EQ(StorageInfoImpl().GetScsiInterface("HBA0"), nullptr);
+  EXPECT_TRUE(Adapter("hba1")->GetCapabilities().ipv6Supported);
+  EXPECT_FALSE(Adapter("hba1")->GetCapabilities().dnsBasedAddressSupported);
+  EXPECT_THROW(Adapter("hba1")->SetInitiatorAlias("x"), NodeCtlException);  // not settable there
+  const auto adapter = Adapter("hba0");
+  EXPECT_THROW(adapter->SetInitiatorName("x"), NodeCtlException);
+  EXPECT_THROW(adapter->SetInitiatorAlias(std::string(256, 'x')), NodeCtlException);
+  EXPECT_THROW(adapter->SetInitiatorAlias("\xff"), NodeCtlException);
+  EXPECT_NO_THROW(adapter->SetInitiatorAlias(std::string(255, 'x')));
+  host::Host::Current().Load("{}");
+  EXPECT_THROW(adapter->GetName(), NodeCtlException);  // gone since
+}
+
+TEST(HostOperation, TheSoftwareAdapterComesAndGoesWithTheInitiator) {
+  const TemporaryRoot root;
+  std::filesystem::create_directories(root.Path() + "/etc/tessaro/coreiscsid");
+  std::ofstream(root.Path() + "/etc/tessaro/coreiscsid/initiatorname.iscsi")
+      << "InitiatorName='iqn.2001-04.com.example:it'\n";
+  Traced host(With(R"("softwareIscsi": {"enabled": false})"));
+  StorageInfoImpl info;
+  EXPECT_FALSE(info.HasSoftwareiScsiEnabled());
+  info.EnableSoftwareiScsi(false);
+  EXPECT_TRUE(info.HasSoftwareiScsiEnabled());
+  EXPECT_EQ(Adapter("hba2")->GetInitiatorName(), "iqn.2001-04.com.example:it");
+  Adapter("hba2")->SetInitiatorName("iqn.2001-04.com.example:other");
+  info.DisableSoftwareiScsi();
+  EXPECT_FALSE(info.HasSoftwareiScsiEnabled());
+  EXPECT_NE(Adapter("hba2"), nullptr);  // until the next reboot
+  info.EnableSoftwareiScsi(false);
+  EXPECT_EQ(Adapter("hba2")->GetInitiatorName(), "iqn.2001-04.com.example:other");
+  auto description = host.harness.Show();
+  EXPECT_EQ(description["adapters"].size(), 4u);
+  description["softwareIscsi"] = {{"enabled", false}};
+  host::Host::Current().Load(description.dump());
+  EXPECT_EQ(Adapter("hba2"), nullptr);
+}
+
+TEST(Ima, CallsGiveTheirFailuresAsStatus) {
+  Traced host(With(R"("answers": [
+      {"operation": "IMA_GetLhbaProperties", "adapter": "hba1", "call": 1, "imaStatus": 2147483649}])"));
+  const auto call = [](std::int64_t id) {
+    return ima::Read(host::Call::Ima("IMA_GetLhbaProperties", id, {id}),
+                     [&](host::Tree& tree) { tree.Get(id, host::Kind::Adapter); });
+  };
+  const auto ids = host::Host::Current().Read(host::Call::OnHost("GetiScsiInterfaces"), [](host::Tree& tree) {
+    return tree.ChildIds(host::kRoot, host::Kind::Adapter);
+  });
+  EXPECT_EQ(call(ids[0]), IMA_STATUS_SUCCESS);
+  EXPECT_EQ(call(ids[1]), IMA_ERROR_NOT_SUPPORTED);
+  EXPECT_EQ(call(ids[1]), IMA_STATUS_SUCCESS);
+  EXPECT_EQ(call(host::kRoot), IMA_ERROR_INCORRECT_OBJECT_TYPE);
+  EXPECT_EQ(
+      ima::Read(host::Call::Ima("IMA_GetLhbaProperties", 0), [](host::Tree&) { throw std::bad_alloc(); }),
+      IMA_ERROR_INSUFFICIENT_MEMORY);
+  EXPECT_EQ(call(999), IMA_ERROR_OBJECT_NOT_FOUND);
+  EXPECT_EQ(host.trace.back(), "IMA_GetLhbaProperties(999) = 0x80000007");
+}
+
+TEST(Ima, MemoryIsTakenBackOnce) {
+  const std::size_t before = ima::OutstandingAllocations();
+  auto owned = ima::OidList(IMA_OBJECT_TYPE_TARGET, {5, 6, 7});
+  EXPECT_EQ(owned->oidCount, 3u);
+  EXPECT_EQ(ima::Id(owned->oids[2]), 7);
+  EXPECT_EQ(ima::OutstandingAllocations(), before + 1);
+  IMA_OID_LIST* list = owned.release();
+  EXPECT_EQ(IMA_FreeMemory(&list->oids[1]), IMA_ERROR_INVALID_PARAMETER);
+  EXPECT_EQ(IMA_FreeMemory(list), IMA_STATUS_SUCCESS);
+  EXPECT_EQ(IMA_FreeMemory(list), IMA_ERROR_INVALID_PARAMETER);
+  EXPECT_EQ(IMA_FreeMemory(nullptr), IMA_ERROR_INVALID_PARAMETER);
+  EXPECT_EQ(ima::OutstandingAllocations(), before);
+}
+
+TEST(TextHelpers, CharacterSets) {
+  for (const auto& [narrow, wide] : std::initializer_list<std::pair<const char*, const wchar_t*>>{
+           {"", L""},
+           {"a\x7f", L"a\x7f"},
+           {"\xc2\x80", L"\x80"},
+           {"\xdf\xbf\xe0\xa0\x80", L"\x7ff\x800"},
+           {"\xed\x9f\xbf\xee\x80\x80\xef\xbf\xbf", L"\xd7ff\xe000\xffff"},
+           {"\xf0\x90\x80\x80\xf4\x8f\xbf\xbf", L"\x10000\x10ffff"}}) {
+    wchar_t* toWide = nullptr;
+    char* toNarrow = nullptr;
+    ASSERT_TRUE(CodeSet_UTF8ToUTF32(narrow, &toWide)) << narrow;
+    ASSERT_TRUE(CodeSet_UTF32ToUTF8(wide, &toNarrow)) << narrow;
+    EXPECT_STREQ(toWide, wide);
+    EXPECT_STREQ(toNarrow, narrow);
+    std::free(toWide);
+    std::free(toNarrow);
+  }
+  wchar_t* toWide = nullptr;
+  for (const char* malformed : {"\x80", "\xc0\x80", "\xc3", "\xc3(", "\xe0\x9f\xbf", "\xed\xa0\x80",
+                                "\xf0\x8f\xbf\xbf", "\xf4\x90\x80\x80", "\xf5\x80\x80\x80", "ok\xff"}) {
+    EXPECT_FALSE(CodeSet_UTF8ToUTF32(malformed, &toWide)) << malformed;
+  }
+  char* toNarrow = nullptr;
+  for (const int malformed : {0xd800, 0xdfff, 0x110000, -1}) {
+    const wchar_t wide[] = {L'a', static_cast<wchar_t>(malformed), 0};
+    EXPECT_FALSE(CodeSet_UTF32ToUTF8(wide, &toNarrow)) << malformed;
+  }
+  EXPECT_TRUE(toWide == nullptr && toNarrow == nullptr);
+}
+
+TEST(TextHelpers, Append) {
+  char buffer[8] = "abc";
+  EXPECT_EQ(Str_Strcat(buffer, "de", sizeof buffer), buffer);
+  EXPECT_STREQ(buffer, "abcde");
+  EXPECT_STREQ(Str_Strcat(buffer, "fghij", sizeof buffer), "abcdefg");
+  EXPECT_STREQ(Str_Strcat(buffer, "x", sizeof buffer), "abcdefg");
+  EXPECT_STREQ(Str_Strcat(buffer, "x", 4), "abcdefg");  // full without a terminator: left alone
+}
+
+}  // namespace

@@ -1,0 +1,80 @@
+// iscsi plugin list: all plug-ins, one of a name, or the one behind an adapter; and what stays of a failure.
+#include "support/Harness.h"
+
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+constexpr char kNoMatch[] = "Unable to find matching plugin.";
+
+constexpr char kHost[] = R"({
+  "plugins": [
+    {"fileName": "liba.so", "vendor": "Zoë \u20ac", "implementationVersion": "1.2", "supportedImaVersion": 4294967295,
+     "buildTime": "2026-01-02 03:04:05", "lhbasCanBeCreatedAndDestroyed": 1, "autoPersistenceSupported": 2},
+    {"fileName": "libb.so", "vendor": "first"},
+    {"fileName": "libb.so", "vendor": "second"}],
+  "adapters": [{"name": "hba0"}, {"name": "hba1", "plugin": "libb.so"}, {"name": "hba2", "plugin": "libc.so"}]})";
+
+std::vector<std::string> Vendors(const nlohmann::json& list) {
+  std::vector<std::string> vendors;
+  for (const auto& row : list) vendors.push_back(row["Vendor"].get<std::string>());
+  return vendors;
+}
+
+TEST(PluginList, SelectsAndNeverPostsNothing) {
+  const std::string vendor = "Zo\xeb \xac";  // one byte for each character
+  const struct {
+    const char* options;
+    std::vector<std::string> vendors;
+    std::vector<std::string> messages;
+  } cases[] = {
+      {"", {vendor, "first", "second"}, {}},
+      {"-p libb.so", {"first"}, {}},
+      {"-p LIBB.SO", {}, {kNoMatch}},
+      {"-p ''", {}, {kNoMatch}},
+      {"-A hba0", {vendor}, {}},
+      {"-A hba1", {"first"}, {}},
+      {"-A hba2", {}, {"Unable to get plugin identifier."}},
+  };
+  Harness host(kHost);
+  for (const auto& one : cases) {
+    const Outcome run = host(std::string("iscsi plugin list ") + one.options);
+    EXPECT_EQ(Vendors(run.result), one.vendors) << one.options;
+    EXPECT_EQ(run.messages, one.messages) << one.options;
+    EXPECT_TRUE(run.closed) << one.options;
+    EXPECT_EQ(run.status, one.messages.empty() ? 0 : 3) << one.options;
+  }
+  EXPECT_EQ(
+      host("iscsi plugin list").result[1],
+      nlohmann::json::parse(R"({"Supported Ima Version": 1, "Vendor": "first", "Implementation Version": "",
+                                      "File Name": "libb.so", "Build Time": "na",
+                                      "Auto Persistence Supported": false,
+                                      "Lhbas Can Be Created And Destroyed": false})"));
+  const nlohmann::json first = host("iscsi plugin list").result[0];
+  EXPECT_EQ(first["Supported Ima Version"], 4294967295);
+  EXPECT_EQ(first["Build Time"], "na");
+  EXPECT_EQ(first["Lhbas Can Be Created And Destroyed"], true);
+  EXPECT_EQ(first["Auto Persistence Supported"], false);  // only 1 is true
+  EXPECT_THAT(host("iscsi plugin list -p libb.so").Calls(),
+              ElementsAre("IMA_GetPluginOidList", "IMA_GetPluginProperties", "IMA_GetPluginProperties"));
+
+  const Outcome both = host("iscsi plugin list -p liba.so -A hba0");
+  EXPECT_THAT(both.messages, ElementsAre("adapter and plugin options are mutually exclusive."));
+  EXPECT_TRUE(both.result.is_null());
+  EXPECT_THAT(both.trace, IsEmpty());
+
+  const Outcome none = Harness("{}")("iscsi plugin list");
+  EXPECT_THAT(none.messages, ElementsAre(kNoMatch));
+  EXPECT_THAT(none.result, IsEmpty());
+}
+
+TEST(PluginList, FailureLeavesTheRowsBeforeIt) {
+  Harness host(WithAnswers(kHost, R"({"operation": "IMA_GetPluginProperties", "call": 3, "imaStatus": 1})"));
+  const Outcome run = host("iscsi plugin list");
+  EXPECT_THAT(run.messages, ElementsAre("Unable to get plugin properties."));
+  EXPECT_EQ(run.result.size(), 2u);
+  EXPECT_TRUE(run.closed);
+}
+
+}  // namespace

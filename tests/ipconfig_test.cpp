@@ -1,0 +1,441 @@
+// iscsi networkportal ipconfig get|set, ipv6config get|set and ipv6config address add|list|remove.
+#include "support/Harness.h"
+
+namespace {
+
+using nlohmann::json;
+using testing::IsEmpty;
+
+/// An adapter "a0" that can set everything, with @p network changed in its network configuration.
+json HostWith(const json& network = json::object()) {
+  json host = json::parse(R"({"adapters": [{"name": "a0", "capabilities": {
+      "IPv6 Supported": true, "IPv4 Enable Settable": true, "IP Configuration Method Settable": true,
+      "Subnet Mask Setttable": true, "Default Gateway Settable": true, "IPv6 Enable Settable": true,
+      "IPv6 DHCP Configuration Method Settable": true, "IPv6 Linklocal Auto Configuration Method Settable": true,
+      "IPv6 Router Advertisement Configuration Method Settable": true, "IPv6 Default Gateway Settable": true,
+      "Primary DNS Settable": true, "Secondary DNS Settable": true},
+      "logicalPortals": [{"name": "p0"}, {"name": "p1"}],
+      "network": {"ipv4Address": "192.0.2.9", "ipv4Netmask": "255.255.255.0", "gateway": "192.0.2.1",
+                  "ipv6Enabled": true, "primaryDns": "192.0.2.53",
+                  "ipv6Addresses": [{"address": "fe80::9", "type": 7}, {"address": "2001:db8::1"},
+                                    {"address": "2001:db8::2", "type": 9}, {"address": "2001:db8::3", "type": 7}]}}]})");
+  host["adapters"][0]["network"].update(network);
+  return host;
+}
+
+json Without(const std::string& capability) {
+  json host = HostWith();
+  host["adapters"][0]["capabilities"].erase(capability);
+  return host;
+}
+
+std::string Joined(const std::vector<std::string>& texts) {
+  std::string joined;
+  for (const std::string& text : texts) joined += (joined.empty() ? "" : "; ") + text;
+  return joined;
+}
+
+/// The trace behind the lookup of the adapter, without the adapter's name and the outcomes of what succeeded.
+std::string Steps(const Outcome& run) {
+  std::vector<std::string> steps;
+  for (std::string line : run.trace) {
+    if (line.starts_with("GetScsiInterface")) continue;
+    const std::size_t name = line.find("(a0");
+    line.erase(name + 1, line[name + 3] == ',' ? 4 : 2);
+    for (const char* outcome : {" = ok", " = 0"}) {
+      if (line.ends_with(outcome)) line.resize(line.rfind(outcome));
+    }
+    steps.push_back(line);
+  }
+  return Joined(steps);
+}
+
+// What becomes of the statuses of changes.
+
+const struct {
+  const char* line;
+  const char* setters;  ///< operations that give a status, in order
+  const char* reboots;  ///< the sentences of all
+} kRows[] = {
+    {"ipconfig set -A a0 -e true -d false -i 192.0.2.7 -s 255.255.255.128 -g 192.0.2.2 -x 192.0.2.3 -y "
+     "192.0.2.4",
+     "SetIpVersionEnabled; SetUseDhcpv4; SetIpv4Address; SetIpv4SubnetMask; SetIpv4Gateway; SetDnsServers",
+     "Reboot required for operation 'enable'. Reboot required for operation 'enable-dhcpv4'. "
+     "Reboot required for operation 'ip'. Reboot required for operation 'subnet'. "
+     "Reboot required for operation 'gateway'. Reboot required for operation 'dns'. "},
+    {"ipv6config set -A a0 -g 2001:db8::99 -r true -l false -d true -e no",
+     "SetIpVersionEnabled; SetIpv6ConfigMethod; SetIpv6ConfigMethod; SetIpv6ConfigMethod; SetIpv6Gateway",
+     "Reboot required for operation 'enable'. Reboot required for operation 'enable-dhcpv6'. "
+     "Reboot required for operation 'enable-linklocal-autoconfiguration'. "
+     "Reboot required for operation 'enable-router-advertisement'. "
+     "Reboot required for operation 'set-gateway6'. "},
+    {"ipv6config address add -A a0 -r -a 2001:db8::5/64",
+     "SetIpv6Address; SetIpv6Address; SetIpv6Address; SetIpv6Address",
+     "Reboot required. Reboot required. Reboot required. Reboot required. "},
+    {"ipv6config address remove -A a0 -a 2001:db8::1/64 -a fe80::9/64", "SetIpv6Address; SetIpv6Address",
+     "Reboot required. Reboot required. "},
+};
+
+TEST(ChangeRows, StatusesBecomeSentencesAndOneReset) {
+  for (const auto& row : kRows) {
+    for (const int status : {1, 2, 3, 4}) {
+      json description = HostWith();
+      for (const char* setter :
+           {"SetIpVersionEnabled", "SetUseDhcpv4", "SetIpv4Address", "SetIpv4SubnetMask", "SetIpv4Gateway",
+            "SetDnsServers", "SetIpv6ConfigMethod", "SetIpv6Gateway", "SetIpv6Address"}) {
+        description["answers"].push_back({{"operation", setter}, {"status", status}});
+      }
+      const Outcome run = Harness(description.dump())(std::string("iscsi networkportal ") + row.line);
+      SCOPED_TRACE(row.line + std::to_string(status));
+      EXPECT_EQ(run.result, status == 1 ? row.reboots : "");
+      EXPECT_THAT(run.messages, IsEmpty());
+      std::vector<std::string> changes = run.Calls();
+      std::erase_if(changes, [](const std::string& call) { return call.starts_with("Get"); });
+      EXPECT_EQ(Joined(changes), row.setters + std::string(status == 2 ? "; ResetAdapter" : ""));
+    }
+  }
+}
+
+TEST(RemovalWalk, NotesNothingOnceAResetIsToBeDone) {
+  json description = HostWith();
+  const int statuses[] = {1, 2, 1, 1};
+  for (int call = 1; call <= 4; ++call) {
+    description["answers"].push_back(
+        {{"operation", "SetIpv6Address"}, {"call", call}, {"status", statuses[call - 1]}});
+  }
+  const auto run = [&](const std::string& line) {
+    return Harness(description.dump())("iscsi networkportal ipv6config address " + line).result;
+  };
+  // The adding walk looks at every status.
+  EXPECT_EQ(run("add -A a0 -r -a 2001:db8::5/64"), "Reboot required. Reboot required. ");
+  EXPECT_EQ(run("remove -A a0 -a 2001:db8::1/64 -a 2001:db8::2/64 -a 2001:db8::3/64"), "Reboot required. ");
+}
+
+// One command at a time: what is called, what is said, what is stored.
+
+struct Case {
+  json host;
+  const char* line;
+  std::string steps;
+  std::string messages;
+  const char* stored = "{}";  ///< changed keys of the network configuration
+};
+
+/// A case in which the library refuses the last of the steps.
+Case Refused(const json& host, const char* line, const std::string& steps, const std::string& reason,
+             const char* failure, const char* stored = "{}") {
+  return {host, line, steps + " ! NodeCtlException: " + reason, failure + ("; " + reason), stored};
+}
+
+template <std::size_t count>
+void Check(const std::string& command, const Case (&cases)[count]) {
+  for (const Case& c : cases) {
+    SCOPED_TRACE(command + " " + c.line);
+    Harness host(c.host.dump());
+    json expected = host.Show("/adapters/0/network");
+    expected.update(json::parse(c.stored));
+    const Outcome run = host("iscsi networkportal " + command + " -A a0 " + c.line);
+    EXPECT_EQ(Steps(run), c.steps);
+    EXPECT_EQ(Joined(run.messages), c.messages);
+    EXPECT_EQ(run.result, c.messages.empty() ? json("") : json());
+    EXPECT_EQ(host.Show("/adapters/0/network"), expected);
+  }
+}
+
+TEST(IpconfigSet, StepsMessagesAndStore) {
+  constexpr char kDhcp[] =
+      "Cannot set static IPv4 configuration, as DHCPv4 is enabled for adapter a0. You need to first disable "
+      "DHCPv4.";
+  const json dhcp = HostWith({{"useDhcpv4", true}});
+  const auto refused = [](const json& host, const char* line, const std::string& call, const char* reason) {
+    return Refused(host, line, "GetNetworkProperties(); " + call, reason,
+                   "Failed to set IP configuration on network portal.");
+  };
+  Check(
+      "ipconfig set",
+      {
+          {HostWith(), "", "", ""},
+          {HostWith(), "-n nosuch", "", ""},
+          {HostWith(), "-e false -i 1 -d true", "SetIpVersionEnabled(4, false)", "",
+           R"({"ipv4Enabled": false})"},
+          {dhcp, "-e true -d false -i 192.0.2.7",
+           R"(SetIpVersionEnabled(4, true); SetUseDhcpv4(false); SetIpv4Address("192.0.2.7"))", "",
+           R"({"useDhcpv4": false, "ipv4Address": "192.0.2.7"})"},
+          {HostWith(), "-d true -g x", "SetUseDhcpv4(true)", "", R"({"useDhcpv4": true})"},
+          {dhcp, "-i 192.0.2.7", "GetNetworkProperties()", kDhcp},
+          {HostWith(), "-y 2001:db8::53", R"(GetNetworkProperties(); SetDnsServers("", "2001:db8::53"))", "",
+           R"({"primaryDns": "", "secondaryDns": "2001:db8::53"})"},
+          {HostWith(), "-i 198.51.100.7 -s 255.255.254.0 -g 198.51.101.1",
+           R"(GetNetworkProperties(); SetIpv4Address("198.51.100.7"); SetIpv4SubnetMask("255.255.254.0"); )"
+           R"(SetIpv4Gateway("198.51.101.1"))",
+           "",
+           R"({"ipv4Address": "198.51.100.7", "ipv4Netmask": "255.255.254.0", "gateway": "198.51.101.1"})"},
+          {HostWith(), "-g 0.0.0.0", R"(GetNetworkProperties(); SetIpv4Gateway("0.0.0.0"))", "",
+           R"({"gateway": "0.0.0.0"})"},
+          {HostWith(), "-g 1.2.3", "GetNetworkProperties()",
+           R"(Failed to set IP configuration on network portal.; "1.2.3" is not an IPv4 address.)"},
+          refused(
+              HostWith(), "-g 192.0.3.1", R"(SetIpv4Gateway("192.0.3.1"))",
+              R"(The gateway "192.0.3.1" is not in the subnet of the address "192.0.2.9" with the mask "255.255.255.0".)"),
+          refused(HostWith(), "-i 192.0.2.256", R"(SetIpv4Address("192.0.2.256"))",
+                  R"("192.0.2.256" is not an IPv4 address.)"),
+          refused(HostWith(), "-i 224.0.0.1", R"(SetIpv4Address("224.0.0.1"))",
+                  R"("224.0.0.1" is not a unicast address.)"),
+          refused(
+              HostWith(), "-s 255.0.255.0", R"(SetIpv4SubnetMask("255.0.255.0"))",
+              R"("255.0.255.0" is not a subnet mask: its one bits must stand in front of its zero bits.)"),
+          refused(HostWith(), "-s 0.0.0.0", R"(SetIpv4SubnetMask("0.0.0.0"))",
+                  R"("0.0.0.0" is not a subnet mask: its one bits must stand in front of its zero bits.)"),
+          refused(HostWith(), "-x dns.example", R"(SetDnsServers("dns.example", ""))",
+                  R"("dns.example" is not an IP address.)"),
+          refused(Without("Subnet Mask Setttable"), "-s 255.0.0.0", R"(SetIpv4SubnetMask("255.0.0.0"))",
+                  R"(The subnet mask of the adapter "a0" is not settable.)"),
+          refused(Without("Default Gateway Settable"), "-g 192.0.2.2", R"(SetIpv4Gateway("192.0.2.2"))",
+                  R"(The default gateway of the adapter "a0" is not settable.)"),
+          refused(Without("Primary DNS Settable"), "-y 192.0.2.4", R"(SetDnsServers("", "192.0.2.4"))",
+                  R"(The primary DNS server of the adapter "a0" is not settable.)"),
+      });
+  // A change that went through before the test of DHCP takes effect.
+  const std::string answer = R"({"operation": "SetIpVersionEnabled", "status": 2})";
+  Harness changed(WithAnswers(dhcp.dump(), answer));
+  const Outcome refusal = changed("iscsi networkportal ipconfig set -A a0 -e true -i 192.0.2.7");
+  EXPECT_TRUE(refusal.result.is_null());
+  EXPECT_EQ(refusal.Calls().back(), "ResetAdapter");
+}
+
+TEST(IpconfigGet, SettlesTheName) {
+  const json host = HostWith({{"useDhcpv4", true}, {"secondaryDns", "2001:db8::53"}});
+  EXPECT_EQ(Harness(host.dump())("iscsi networkportal ipconfig get -A a0").result[0], json::parse(R"({
+      "IscsiAdapter": "a0", "Hostnic": "p0", "IPv4Enabled": true, "IPv4": "192.0.2.9",
+      "IPv4SubnetMask": "255.255.255.0",
+      "IPv6": "fe80::9/64 2001:db8::1/64 2001:db8::2/64 2001:db8::3/64 ", "UseDhcpv4": true,
+      "Gateway": "192.0.2.1", "PrimaryDNS": "192.0.2.53", "SecondaryDNS": "2001:db8::53"})"));
+
+  // What GetLogicalNetworkPortals throws decides with the kind of the adapter.
+  const std::string notSupported =
+      "iScsiLibException: status(80000001): Not supported; Message= IMA_TSR_GetLnpOidList";
+  const struct {
+    const char* options;
+    const char* kind;
+    std::string thrown;  // empty for nothing
+    const char* name;    // null where the command fails
+  } kCases[] = {
+      {"", "independent", "", "p0"},
+      {"-n p1", "independent", "", "p1"},
+      {"-n nosuch", "independent", "", "nosuch"},
+      {"-n ''", "independent", "", ""},
+      {"", "dependent", "", ""},
+      {"-n p1", "independent", notSupported, "N/A"},
+      {"", "independent", notSupported + "!", nullptr},
+      {"", "dependent", notSupported, nullptr},
+  };
+  for (const auto& [options, kind, thrown, name] : kCases) {
+    SCOPED_TRACE(std::string(options) + " " + kind + " " + thrown);
+    json other = host;
+    other["adapters"][0]["kind"] = kind;
+    if (std::string(kind) == "dependent") other["adapters"][0].erase("logicalPortals");
+    if (!thrown.empty()) {
+      other["answers"] = {
+          {{"operation", "GetLogicalNetworkPortals"}, {"throw", "NodeCtlException"}, {"text", thrown}}};
+    }
+    const Outcome run =
+        Harness(other.dump())(std::string("iscsi networkportal ipconfig get -A a0 ") + options);
+    EXPECT_EQ(run.messages.empty(), name != nullptr);
+    if (name != nullptr) {
+      EXPECT_EQ(run.result[0]["Hostnic"], name);
+    }
+  }
+}
+
+TEST(Ipv6configSet, StepsMessagesAndStore) {
+  constexpr char kFailed[] = "Failed to set IPv6 configuration on network portal.";
+  const auto unsettable = [](const std::string& capability, const char* line, const char* message) {
+    return Case{Without(capability + " Settable"), line, "GetCapabilities()", message};
+  };
+  Check(
+      "ipv6config set",
+      {
+          {Without("IPv6 Supported"), "", "", ""},
+          {Without("IPv6 Supported"), "-g x", "GetCapabilities()", "IPv6 is not supported by adapter a0."},
+          unsettable(
+              "IPv6 Enable", "-e true -g ::1",
+              "Enabling/Disabling IPv6 is not supported by adapter a0. This parameter is not settable."),
+          unsettable("IPv6 DHCP Configuration Method", "-d no",
+                     "DHCPv6 configuration mode is not settable for adapter a0."),
+          unsettable("IPv6 Linklocal Auto Configuration Method", "-l no",
+                     "Link local auto configuration mode is not settable for adapter a0."),
+          unsettable("IPv6 Router Advertisement Configuration Method", "-r no",
+                     "Router Advertisemnet configuration mode is not supported by adapter a0."),
+          unsettable("IPv6 Default Gateway", "-g ''", "IPv6 default gateway is not settable for adapter a0."),
+          {Without("IPv6 Default Gateway Settable"), "-g ::1 -e false",
+           "GetCapabilities(); SetIpVersionEnabled(6, false)",
+           "IPv6 default gateway is not settable for adapter a0.", R"({"ipv6Enabled": false})"},
+          {HostWith(), "-e false -d true -l true -r true -g 2001:DB8:0:0::1",
+           "GetCapabilities(); SetIpVersionEnabled(6, false); SetIpv6ConfigMethod(2, true); "
+           "SetIpv6ConfigMethod(1, true); "
+           "SetIpv6ConfigMethod(3, true); SetIpv6Gateway(\"2001:DB8:0:0::1\")",
+           "",
+           R"({"ipv6Enabled": false, "useDhcpv6": true, "useLinkLocalAutoConfiguration": true,
+           "useRouterAdvertisement": true, "gateway6": "2001:db8::1"})"},
+          {HostWith({{"gateway6", "2001:db8::9"}}), "-g ''", R"(GetCapabilities(); SetIpv6Gateway(""))", "",
+           R"({"gateway6": "::"})"},
+          Refused(HostWith(), "-g 192.0.2.1", R"(GetCapabilities(); SetIpv6Gateway("192.0.2.1"))",
+                  R"("192.0.2.1" is not an IPv6 address.)", kFailed),
+          Refused(HostWith(), "-g ff02::1", R"(GetCapabilities(); SetIpv6Gateway("ff02::1"))",
+                  R"("ff02::1" is not a unicast address.)", kFailed),
+      });
+}
+
+TEST(Ipv6configGet, ShowsWhatIsStated) {
+  const char* line = "iscsi networkportal ipv6config get -A a0";
+  EXPECT_EQ(
+      Harness(HostWith({{"gateway6", "2001:db8::9"}, {"ipv6MaxStaticAddresses", 0}}).dump())(line).result,
+      json::parse(R"({"IscsiAdapter": "a0", "IPv6 Supported": true, "IPv6 Enabled": true,
+                "Gateway6": "2001:db8::9", "Use IPv6 Router Advertisement": false,
+                "Use Link Local Auto Configuration": false, "Use Dhcpv6": false, "IPv6 Prefix Length Valid": false,
+                "IPv6 Prefix Length": -1, "IPv6 Max Static Address Supported Valid": true,
+                "IPv6 Max Static Address Supported": 0})"));
+  EXPECT_EQ(Harness(Without("IPv6 Supported").dump())(line).result["IPv6 Supported"], false);
+}
+
+// Addresses
+
+constexpr char kGet[] = "GetNetworkProperties()";
+
+TEST(AddressCheck, RefusesBeforeAnythingChanges) {
+  const auto format = [](const std::string& entry) {
+    return "Address (" + entry +
+           ") is not in valid format. Address must be in the format <ipv6-address>/<prefix-length>. Example: "
+           "1:2:3:4::/64.";
+  };
+  const json two = {{"ipv6MaxStaticAddresses", 2}};
+  const json fixed = {{"ipv6PrefixLength", 64}};
+  const std::string autoConfigured =
+      " link-local address as auto configuration of link-local address is enabled for adapter a0. You need "
+      "to first "
+      "disable link-local autoconfiguration.";
+  const std::string advertised =
+      " as router advertisement is enabled for adapter a0. You need to first disable router advertisement.";
+  const std::string disabled =
+      " IPv6 address as IPv6 is disabled for adapter a0. You need to first enable IPv6.";
+  const struct {
+    json network;
+    const char* list;
+    std::string add;
+    std::string remove = {};  // where it is another text
+  } kCases[] = {
+      {json::object(), "-a 2001:db8::7", format("2001:db8::7")},
+      {json::object(), "-a 2001:db8::7/64 -a 2001:db8::8/129", format("2001:db8::8/129")},
+      {json::object(), "-a ''", format("")},
+      {json::object(), "-a 192.0.2.1/24", format("192.0.2.1/24")},
+      {fixed, "-a fe80::1/10", "Invalid prefix length (10). The adapter supports fixed prefix length (64)."},
+      {{{"useLinkLocalAutoConfiguration", true}},
+       "-a 2001:db8::7/64 -a fe80::1/64",
+       "Cannot add" + autoConfigured,
+       "Cannot remove" + autoConfigured},
+      {json::object(), "-a fe80::1/64 -a 2001:db8::7/64 -a FEBF::1/64",
+       "Multiple link-local addresses found. You should specify only one link-local address."},
+      {{{"useRouterAdvertisement", true}},
+       "-a fe80::1/64 -a fec0::1/64",
+       "Cannot add IPv6 address" + advertised,
+       "Cannot remove IPv6 address" + advertised},
+      {two, "-a 2001:db8::7/64 -a fe80::1/64 -a 2001:db8::8/64 -a 2001:db8::8/64",
+       "Trying to add more routable addresses than supported (2).",
+       "Number of routable addresses (3)exceed maximum supported (2)"},
+      {{{"ipv6MaxStaticAddresses", 0}},
+       "-a 2001:db8::7/64",
+       "Trying to add more routable addresses than supported (0).",
+       "Number of routable addresses (1)exceed maximum supported (0)"},
+      {{{"ipv6Enabled", false}}, "-a x", "Cannot add/remove" + disabled, "Cannot remove" + disabled},
+  };
+  for (const auto& [network, list, add, remove] : kCases) {
+    Check("ipv6config address add", {{HostWith(network), list, kGet, add}});
+    Check("ipv6config address remove", {{HostWith(network), list, kGet, remove.empty() ? add : remove}});
+  }
+  const json none = Without("IPv6 Supported");
+  Check("ipv6config address remove", {{none, "-a x", kGet, "IPv6 not supported by adapter a0."}});
+  Check(
+      "ipv6config address add",
+      {
+          {none, "-a x", kGet, "IPv6 not supported by adapter a0."},
+          {none, "", "",
+           "No command option specified. Either --address-list or --remove-all-existing must be specified."},
+          {HostWith({{"useRouterAdvertisement", true}}), "-r -a fe80::1/64", kGet,
+           "Cannot remove existing IPv6 addresses" + advertised},
+      });
+}
+
+TEST(AddressAdd, WalksAndStores) {
+  constexpr char kFailed[] = "Error adding IPv6 address list on network portal";
+  const json empty = HostWith({{"ipv6Addresses", json::array()}});
+  const std::string removed =
+      R"(GetNetworkProperties(); SetIpv6Address("2001:db8::1", 64, false); SetIpv6Address("2001:db8::2", 64, false); )"
+      R"(SetIpv6Address("2001:db8::3", 64, false))";
+  const auto adding = [](const std::string& address) {
+    return "GetNetworkProperties(); SetIpv6Address(" + address + ", true)";
+  };
+  Check("ipv6config address add",
+        {
+            {HostWith(), "-r", removed, "",
+             R"({"ipv6Addresses": [{"address": "fe80::9", "prefixLength": 64, "type": 7}]})"},
+            {HostWith({{"ipv6MaxStaticAddresses", 1}}), "-r=false -a 2001:DB8::5/48",
+             removed + R"(; SetIpv6Address("2001:db8::5", 48, true))", "",
+             R"({"ipv6Addresses": [{"address": "fe80::9", "prefixLength": 64, "type": 7},
+                             {"address": "2001:db8::5", "prefixLength": 48, "type": 0}]})"},
+            {empty, "-a fe80::5/64 -a 2001:db8::5/64",
+             adding(R"("fe80::5", 64)") + R"(; SetIpv6Address("2001:db8::5", 64, true))", "",
+             R"({"ipv6Addresses": [{"address": "fe80::5", "prefixLength": 64, "type": 0},
+                             {"address": "2001:db8::5", "prefixLength": 64, "type": 0}]})"},
+            {HostWith({{"useRouterAdvertisement", true}, {"ipv6Addresses", json::array()}}), "-a fe80::5/64",
+             adding(R"("fe80::5", 64)"), "",
+             R"({"ipv6Addresses": [{"address": "fe80::5", "prefixLength": 64, "type": 0}]})"},
+            // Refused by the adapter, with what was done by then kept.
+            Refused(empty, "-a 2001:db8::5/64 -a 2001:db8::5/48 -a 2001:db8::6/64",
+                    adding(R"("2001:db8::5", 64)") + R"(; SetIpv6Address("2001:db8::5", 48, true))",
+                    R"(The adapter has the address "2001:db8::5" already.)", kFailed,
+                    R"({"ipv6Addresses": [{"address": "2001:db8::5", "prefixLength": 64, "type": 0}]})"),
+            Refused(HostWith({{"ipv6MaxStaticAddresses", 1}}), "-a 2001:db8::5/64",
+                    adding(R"("2001:db8::5", 64)"), "The adapter takes at most 1 static routable addresses.",
+                    kFailed),
+            Refused(HostWith(), "-a fe80::5/64", adding(R"("fe80::5", 64)"),
+                    R"(The adapter has the link-local address "fe80::9" already, and takes only one.)",
+                    kFailed),
+            Refused(HostWith(), "-a ff02::1/64", adding(R"("ff02::1", 64)"),
+                    R"("ff02::1" is not a unicast address.)", kFailed),
+        });
+}
+
+TEST(AddressRemove, WalksAndStores) {
+  constexpr char kKept[] = R"({"ipv6Addresses": [{"address": "fe80::9", "prefixLength": 64, "type": 7},
+      {"address": "2001:db8::2", "prefixLength": 64, "type": 9},
+      {"address": "2001:db8::3", "prefixLength": 64, "type": 7}]})";
+  const std::string first = R"(GetNetworkProperties(); SetIpv6Address("2001:db8::1", 64, false))";
+  const auto refused = [&](const char* line, const std::string& call, const char* reason) {
+    return Refused(HostWith(), line, first + "; " + call, reason,
+                   "Error removing IPv6 address on network portal.", kKept);
+  };
+  Check("ipv6config address remove",
+        {
+            {HostWith(), "-a 2001:db8::1/64", first, "", kKept},
+            refused("-a 2001:db8::1/64 -a 2001:db8::7/64 -a 2001:db8::2/64",
+                    R"(SetIpv6Address("2001:db8::7", 64, false))",
+                    R"(The adapter does not have the address "2001:db8::7".)"),
+            refused("-a 2001:db8::1/64 -a 2001:db8::2/48", R"(SetIpv6Address("2001:db8::2", 48, false))",
+                    R"(The prefix of the address "2001:db8::2" has 64 bits, not 48.)"),
+        });
+}
+
+TEST(AddressList, ShowsEachWithItsType) {
+  const char* line = "iscsi networkportal ipv6config address list -A a0";
+  json host = HostWith({{"ipv6Enabled", false}});
+  host["adapters"][0]["network"]["ipv6Addresses"].push_back(
+      {{"address", "2001:DB8:0:0::4"}, {"prefixLength", 0}, {"type", 3}});
+  const json rows = Harness(host.dump())(line).result;
+  const char* types[] = {"AUTOCONF", "STATIC", "DHCP", "AUTOCONF", "UNKNOWN"};
+  ASSERT_EQ(rows.size(), 5u);
+  for (std::size_t i = 0; i < 5; ++i) EXPECT_EQ(rows[i]["Type"], types[i]);
+  EXPECT_EQ(rows[4], json::parse(R"({"Address": "2001:db8::4", "IPv6PrefixLength": 0, "Type": "UNKNOWN"})"));
+  EXPECT_THAT(Harness(HostWith({{"ipv6Addresses", json::array()}}).dump())(line).result, IsEmpty());
+}
+
+}  // namespace

@@ -1,0 +1,432 @@
+// Session parameters and CHAP entries at the three levels: adapter, sendtarget and target portal.
+#include "support/Harness.h"
+
+namespace {
+
+using nlohmann::json;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using Texts = std::vector<std::string>;
+
+constexpr char kHost[] = R"({"adapters": [
+  {"name": "hba0",
+   "capabilities": {"CHAP Authorization Supported": true, "Mutual Authentication Supported": true,
+                    "Target Level Authentication Supported": true,
+                    "Target Level Mutual Authentication Supported": true,
+                    "Adapter Header Digest Supported": true, "Adapter Data Digest Supported": true,
+                    "Target Level Header Digest Supported": true, "Target Level Data Digest Supported": true,
+                    "Delayed Ack Settable": true},
+   "sendTargets": [{"host": "192.0.2.1"}],
+   "staticTargets": [{"name": "iqn.2026-11.org.example:t", "host": "2001:db8::1", "port": 3261},
+                     {"name": "iqn.2026-11.org.example:found", "host": "192.0.2.9",
+                      "sendTarget": {"host": "192.0.2.1"}}]},
+  {"name": "bare", "sendTargets": [{"host": "192.0.2.1"}],
+   "staticTargets": [{"name": "iqn.2026-11.org.example:t", "host": "2001:db8::1", "port": 3261}]}]})";
+
+constexpr char kFalseDefault[] = "Invalid default option use, it does not take false/no/n/0 value.";
+constexpr char kParmFailure[] =
+    "Unable to set parameters. Please make sure parameter input is settable and within MAX/MIN range "
+    "(integer "
+    "takes numbers, bool takes [true/false,yes/no,y/n]). Digests will take {prohibited, discouraged, "
+    "preferred, "
+    "required} only.";
+constexpr char kBadLevel[] =
+    "Invalid authentication level. Mutual CHAP can only be [prohibited] or [required].";
+constexpr char kBadCombination[] =
+    "Invalid CHAP and Mutual CHAP combination. If setting mutual CHAP, make sure CHAP is on [required] "
+    "level.";
+
+struct LevelCase {
+  const char* path;
+  const char* key;    ///< the options that name the place, the adapter aside
+  const char* infix;  ///< in the names of its operations
+  const char* id;
+  const char* parent;
+  const char* record;  ///< where the host keeps it
+  const char* chapSetFailure;
+
+  bool Inherits() const { return *parent != '\0'; }
+  std::string Command(const std::string& words, const std::string& adapter = "hba0") const {
+    return std::string("iscsi adapter ") + path + words + " -A " + adapter + key;
+  }
+  std::string Operation(const std::string& verb, const std::string& what) const {
+    const bool bare = *infix == '\0' && what == "Parms";
+    return verb + (bare ? "Adapter" : infix) + what;
+  }
+  /// The calls of a setting command behind the lookup of the adapter.
+  Texts ParmCalls(const Texts& stores) const {
+    Texts calls = {"GetScsiInterface", "GetCapabilities", Operation("Get", "Parms")};
+    for (const std::string& store : stores) calls.push_back(Operation("Set", store));
+    return calls;
+  }
+};
+
+const LevelCase kLevels[] = {
+    {"", "", "", "hba0", "", "/adapters/0", "Failed to set iSCSI CHAP authentication configuration."},
+    {"discovery sendtarget ", " -a 192.0.2.1", "SendTarget", "192.0.2.1:3260", "hba0",
+     "/adapters/0/sendTargets/0", "Failed to set CHAP authentication configuration."},
+    {"target portal ", " -n iqn.2026-11.org.example:t -a [2001:db8::1]:3261", "Target",
+     "iqn.2026-11.org.example:t,[2001:db8::1]:3261", "hba0", "/adapters/0/staticTargets/0",
+     "Unable to set CHAP authentication."},
+};
+
+json RowOf(const Outcome& run, const std::string& key) {
+  for (const json& row : run.result) {
+    if (row["Name"] == key) return row;
+  }
+  return {};
+}
+
+TEST(ParamGet, ShowsTheWholeTableInOrder) {
+  for (const LevelCase& level : kLevels) {
+    Harness host(kHost);
+    const Outcome run = host(level.Command("param get"));
+    std::string names;
+    for (const json& row : run.result) {
+      names += row["Name"].get<std::string>() + " ";
+      EXPECT_EQ(row["ID"], level.id);
+      EXPECT_EQ(row["Settable"], true) << row;
+      EXPECT_EQ(row["Inherit"], level.Inherits()) << row;
+      EXPECT_EQ(row["Current"], row["Default"]) << row;
+    }
+    EXPECT_EQ(names,
+              "ErrorRecoveryLevel InitialLoginRetryMax InitialR2T FirstBurstLength MaxBurstLength "
+              "MaxRecvDataSegment MaxOutstandingR2T MaxCmds ImmediateData DefaultTime2Retain "
+              "DefaultTime2Wait LoginTimeout LogoutTimeout NoopOutInterval NoopOutTimeout RecoveryTimeout "
+              "DelayedAck HeaderDigest DataDigest ");
+    Texts calls = {"GetScsiInterface", "GetCapabilities", level.Operation("Get", "Parms"),
+                   level.Operation("Get", "HeaderDigest"), level.Operation("Get", "DataDigest")};
+    if (!level.Inherits()) calls.push_back("GetName");
+    EXPECT_EQ(run.Calls(), calls);
+  }
+}
+
+TEST(ParamGet, AllMeansAllTargetsOnlyInBothPlaces) {
+  Harness host(kHost);
+  const Outcome all = host("iscsi adapter target portal param get -A hba0 -n all -a all");
+  ASSERT_EQ(all.result.size(), 38u);
+  EXPECT_EQ(all.result[0]["ID"], "iqn.2026-11.org.example:t,[2001:db8::1]:3261");
+  EXPECT_EQ(all.result[37]["ID"], "iqn.2026-11.org.example:found,192.0.2.9:3260");
+  EXPECT_EQ(all.Calls()[1], "GetStaticTargets");
+  for (const char* options : {" -n all -a 192.0.2.9", " -n iqn.2026-11.org.example:t -a all"}) {
+    for (const char* command : {"param get", "auth chap get"}) {
+      const Outcome run = host(std::string("iscsi adapter target portal ") + command + " -A hba0" + options);
+      EXPECT_EQ(run.status, 1) << run.out;
+      EXPECT_THAT(run.Calls(), testing::Not(testing::Contains("GetStaticTargets")));
+    }
+  }
+  Harness none(R"({"adapters": [{"name": "hba0"}]})");
+  for (const char* command : {"param get", "auth chap get"}) {
+    const Outcome run =
+        none(std::string("iscsi adapter target portal ") + command + " -A hba0 -n all -a all");
+    EXPECT_EQ(run.result, json::array()) << command;
+  }
+}
+
+TEST(ParamSet, EachKeyByValueByDefaultAndByInheritance) {
+  for (const LevelCase& level : kLevels) {
+    Harness host(kHost);
+    const json rows = host(level.Command("param get")).result;
+    ASSERT_EQ(rows.size(), 19u);
+    for (const json& row : rows) {
+      const std::string key = row["Name"];
+      SCOPED_TRACE(level.Command(key));
+      const bool isDigest = key.ends_with("Digest");
+      const std::string value = isDigest                   ? "preferred"
+                                : row["Min"] != "na"       ? row["Min"].get<std::string>()
+                                : row["Current"] == "true" ? "no"
+                                                           : "y";
+      const std::string shown = value == "no" ? "false" : value;
+      // A digest is stored by an operation of its own: first at the adapter, last below it.
+      const Texts stores = !isDigest          ? Texts{"Parms"}
+                           : level.Inherits() ? Texts{"Parms", key}
+                                              : Texts{key, "Parms"};
+      const Outcome set = host(level.Command("param set -k " + key + " -v " + value));
+      EXPECT_EQ(set.result, true);
+      EXPECT_EQ(set.Calls(), level.ParmCalls(stores));
+      const json changed = RowOf(host(level.Command("param get")), key);
+      EXPECT_EQ(changed["Current"], shown);
+      EXPECT_EQ(changed["Inherit"], false);
+
+      if (level.Inherits()) {
+        const Outcome inherit = host(level.Command("param set --inherit -k " + key));
+        EXPECT_EQ(inherit.result, true);
+        EXPECT_EQ(inherit.Calls(), level.ParmCalls({"Parms"}));
+        EXPECT_EQ(RowOf(host(level.Command("param get")), key), row);
+      }
+
+      const Outcome reset = host(level.Command("param set --default -k " + key));
+      EXPECT_EQ(reset.result, true);
+      EXPECT_EQ(reset.Calls(), level.ParmCalls(stores));
+      json standard = row;
+      standard["Inherit"] = false;
+      EXPECT_EQ(RowOf(host(level.Command("param get")), key), standard);
+    }
+  }
+}
+
+TEST(ParamSet, WhatIsNotOverriddenFollowsTheParent) {
+  Harness host(kHost);
+  const std::string found =
+      "iscsi adapter target portal param get -A hba0 -n iqn.2026-11.org.example:found "
+      "-a 192.0.2.9";
+  const auto current = [&](const std::string& command) {
+    return RowOf(host(command), "LoginTimeout")["Current"].get<std::string>();
+  };
+  EXPECT_EQ(host(kLevels[0].Command("param set -k LoginTimeout -v 21")).result, true);
+  EXPECT_EQ(current(kLevels[1].Command("param get")), "21");
+  EXPECT_EQ(current(found), "21");
+  EXPECT_EQ(host(kLevels[1].Command("param set -k LoginTimeout -v 22")).result, true);
+  EXPECT_EQ(current(found), "22");  // by way of the sendtarget through which it was found
+  EXPECT_EQ(current(kLevels[2].Command("param get")), "21");
+  EXPECT_EQ(RowOf(host(found), "LoginTimeout")["Inherit"], true);
+  host("iscsi adapter discovery sendtarget remove -A hba0 -a 192.0.2.1");
+  EXPECT_EQ(current(found), "21");
+}
+
+TEST(ParamSet, OptionsAreTestedInOrder) {
+  for (const LevelCase& level : kLevels) {
+    const char* options = level.Inherits() ? "Only one options value, inherit, default can be used at once."
+                                           : "The value and default options cannot be used together.";
+    const struct {
+      const char* options;
+      std::string message;
+      bool before;  ///< the adapter is not looked up
+    } cases[] = {
+        {" -k LoginTimeout", options, true},
+        {" -k '' -v '' --default=false", options, true},
+        {" -k '' -v ''", "Invalid iscsi key input.", true},
+        {" -k LoginTimeout -v ''", "Invalid iscsi value input.", true},
+        {" -k LoginTimeout --default=false", kFalseDefault, false},
+        {" -k logintimeout -v 1", kParmFailure, false},
+        {" -k LoginTimeout -v 0", kParmFailure, false},
+        {" -k HeaderDigest -v Required", kParmFailure, false},
+    };
+    for (const auto& c : cases) {
+      Harness host(kHost);
+      const json before = host.Show(level.record);
+      const Outcome run = host(level.Command("param set") + c.options);
+      EXPECT_THAT(run.messages, ElementsAre(c.message)) << level.path << c.options;
+      EXPECT_EQ(run.status, 1);
+      EXPECT_FALSE(run.closed);
+      EXPECT_EQ(run.trace.empty(), c.before) << c.options;
+      // Below the adapter a word that is no digest is found out when the record has been stored.
+      const bool stored = level.Inherits() && std::string(c.options).find("Digest") != std::string::npos;
+      EXPECT_EQ(host.Show(level.record) == before, !stored) << c.options;
+      EXPECT_EQ(run.Calls().empty() || run.Calls().back() != level.Operation("Set", "HeaderDigest"), true);
+    }
+    EXPECT_THAT(Harness(kHost)(level.Command("param set -k LoginTimeout -v 61")).trace.back(),
+                HasSubstr("LoginTimeout cannot be set to 61: its range is from 1 to 60."));
+  }
+  Harness host(kHost);
+  for (const char* pair : {" -v 1 -I", " -v 1 -D", " -I -D"}) {
+    EXPECT_THAT(host(kLevels[1].Command("param set -k LoginTimeout") + pair).messages,
+                ElementsAre("Only one options value, inherit, default can be used at once."));
+  }
+  const Outcome nothing = host(kLevels[2].Command("param set -k LoginTimeout --inherit=no"));
+  EXPECT_EQ(nothing.result, true);
+  EXPECT_EQ(nothing.Calls(), kLevels[2].ParmCalls({}));
+  EXPECT_THAT(
+      host("iscsi adapter discovery sendtarget param set -A hba0 -a [::1 -k LoginTimeout -v 1").messages,
+      ElementsAre(kParmFailure));
+}
+
+TEST(ParamSet, NotSettableSaysSoWithItsNewline) {
+  Harness host(R"({"adapters": [{"name": "hba0", "sendTargets": [{"host": "192.0.2.1"}],
+      "capabilities": {"Adapter Header Digest Supported": true, "Target Level Data Digest Supported": true},
+      "parameters": {"LoginTimeout": {"settable": false}, "MaxCmds": {"supported": false, "settable": false}}}]})");
+  const struct {
+    int level;
+    const char* key;
+    bool settable;
+  } cases[] = {{0, "HeaderDigest", true}, {0, "DataDigest", false},   {1, "HeaderDigest", false},
+               {1, "DataDigest", true},   {0, "LoginTimeout", false}, {1, "LoginTimeout", false},
+               {0, "MaxCmds", false},     {0, "DelayedAck", false},   {0, "NoopOutTimeout", true}};
+  for (const auto& c : cases) {
+    const LevelCase& level = kLevels[c.level];
+    const Outcome run = host(level.Command(std::string("param set --default -k ") + c.key));
+    const Texts refused = {std::string("Parameter ") + c.key + " is not settable.\n"};
+    EXPECT_EQ(run.messages, c.settable ? Texts() : refused) << level.path << c.key;
+    EXPECT_EQ(run.Calls().size(), c.settable ? run.Calls().size() : 3u);
+    EXPECT_EQ(RowOf(host(level.Command("param get")), c.key)["Settable"], c.settable) << level.path << c.key;
+  }
+  const json unsupported = RowOf(host(kLevels[0].Command("param get")), "MaxCmds");
+  for (const char* field : {"Current", "Default", "Min", "Max"}) EXPECT_EQ(unsupported[field], "na");
+}
+
+// CHAP
+
+json ChapRow(Harness& host, const LevelCase& level, const std::string& direction) {
+  return host(level.Command("auth chap get -d " + direction)).result.at(0);
+}
+
+TEST(ChapGet, ShowsOneDirection) {
+  for (const LevelCase& level : kLevels) {
+    Harness host(kHost);
+    const Outcome set = host(level.Command("auth chap set -N alice -S hush-hush-hush -l required"));
+    EXPECT_EQ(set.result, true);
+    EXPECT_THAT(set.trace.back(), HasSubstr("secret=***"));
+    EXPECT_EQ(host.Show(std::string(level.record) + "/chap/uni/secret"), "hush-hush-hush");
+
+    const json row = ChapRow(host, level, "uni");
+    EXPECT_EQ(row["Direction"], "uni");
+    EXPECT_EQ(row["Name"], "alice");
+    EXPECT_EQ(row["Level"], "required");
+    const json mutual = ChapRow(host, level, "mutual");
+    EXPECT_EQ(mutual["Name"], "none");
+    EXPECT_EQ(mutual["Level"], "prohibited");
+    if (level.Inherits()) {
+      EXPECT_EQ(row["Inheritance"], false);
+      EXPECT_EQ(mutual["Inheritance"], true);
+      EXPECT_EQ(row["Parent"], level.parent);
+    }
+  }
+  Harness host(kHost);
+  EXPECT_EQ(ChapRow(host, kLevels[0], "uni")["Adapter"], "hba0");
+  EXPECT_EQ(ChapRow(host, kLevels[1], "uni")["Sendtarget"], "192.0.2.1:3260");
+  const Outcome all =
+      host("iscsi adapter target portal auth chap get -A hba0 -n all -a all -d mutual -m chap");
+  ASSERT_EQ(all.result.size(), 2u);
+  EXPECT_EQ(all.result[1], json::parse(R"({"TargetName": "iqn.2026-11.org.example:found",
+      "Address": "192.0.2.9:3260", "Method": "chap", "Direction": "mutual", "Name": "none",
+      "Level": "prohibited", "Inheritance": true, "Parent": "192.0.2.1:3260"})"));
+}
+
+/// kHost with these levels of the entries of @p level, named "u" and "m".
+std::string HostWithChap(const LevelCase& level, const std::string& uni, const std::string& mutual) {
+  json host = json::parse(kHost);
+  host[json::json_pointer(std::string(level.record) + "/chap")] = {
+      {"uni", {{"name", "u"}, {"secret", "secret-u"}, {"level", uni}}},
+      {"mutual", {{"name", "m"}, {"secret", "secret-m"}, {"level", mutual}}}};
+  return host.dump();
+}
+
+TEST(ChapSet, DirectionLevelAndTheCurrentUniLevel) {
+  const std::vector<std::string> levels = {"prohibited", "discouraged", "preferred", "required"};
+  const json cleared = {"none", "none", "prohibited"};
+  for (const LevelCase& level : kLevels) {
+    const auto checkOne = [&](const std::string& uni, bool mutual, const std::string& wanted) {
+      Harness host(HostWithChap(level, uni, "required"));
+      const Outcome run = host(level.Command(std::string("auth chap set") + (mutual ? " -d mutual" : "") +
+                                             (wanted.empty() ? " -D" : " -N n -S secret-n -l " + wanted)));
+      SCOPED_TRACE(level.path + uni + (mutual ? " mutual " : " uni ") + wanted);
+
+      const bool off = wanted.empty() || wanted == "prohibited";
+      const char* refusal = !mutual || off         ? nullptr
+                            : wanted != "required" ? kBadLevel
+                            : uni != "required"    ? kBadCombination
+                                                   : nullptr;
+      Texts calls = {"GetScsiInterface"};
+      const auto expect = [&](const char* verb, const char* what) {
+        calls.push_back(level.Operation(verb, what));
+      };
+      if (level.Inherits()) expect("Get", "Parms");
+      if (mutual && refusal != kBadLevel) expect("Get", "ChapParameters");
+      if (refusal == nullptr && level.Inherits()) expect("Set", "Parms");
+      if (refusal == nullptr) expect("Set", "ChapParameters");
+      if (!mutual && off) expect("Set", "ChapParameters");
+      EXPECT_EQ(run.Calls(), calls);
+      EXPECT_EQ(run.messages, refusal == nullptr ? Texts() : Texts{refusal});
+      EXPECT_EQ(run.result, refusal == nullptr ? json(true) : json());
+
+      const json now = off ? cleared : json{"n", "secret-n", wanted};
+      const json uniBefore = {"u", "secret-u", uni};
+      const json mutualBefore = {"m", "secret-m", "required"};
+      const auto entry = [&](const char* direction) {
+        const json stored = host.Show(std::string(level.record) + "/chap/" + direction);
+        return json{stored["name"], stored["secret"], stored["level"]};
+      };
+      EXPECT_EQ(entry("uni"), mutual ? uniBefore : now);
+      EXPECT_EQ(entry("mutual"), refusal != nullptr ? mutualBefore
+                                 : mutual           ? now
+                                 : off              ? cleared
+                                                    : mutualBefore);
+    };
+    for (const std::string& uni : levels) {
+      for (const std::string& wanted : levels) {
+        checkOne(uni, false, wanted);
+        checkOne(uni, true, wanted);
+      }
+      checkOne(uni, false, "");
+      checkOne(uni, true, "");
+    }
+  }
+}
+
+TEST(ChapSet, InputIsTestedBehindTheAdapterAndAheadOfAnyStore) {
+  constexpr char kInput[] =
+      "Invalid CHAP authentication input. Make sure [--default] or [--authname --secret --level] is given.";
+  const struct {
+    const char* options;
+    const char* message;
+  } cases[] = {
+      {"", kInput},
+      {" -N a -S b", kInput},
+      {" -l preferred", kInput},
+      {" -N a -l required", kInput},
+      {" --default=false -N a -S b -l required", kFalseDefault},
+      {" -d mutual", kInput},
+  };
+  for (const LevelCase& level : kLevels) {
+    for (const auto& c : cases) {
+      Harness host(kHost);
+      const Outcome run = host(level.Command("auth chap set") + c.options);
+      EXPECT_THAT(run.messages, ElementsAre(c.message)) << level.path << c.options;
+      EXPECT_EQ(run.Calls().size(), level.Inherits() ? 2u : 1u) << c.options;
+    }
+  }
+}
+
+TEST(ChapSet, InheritSetsTheMarkOfTheDirectionAlone) {
+  for (const LevelCase& level : kLevels) {
+    if (!level.Inherits()) continue;
+    Harness host(kHost);
+    host(kLevels[0].Command("auth chap set -N top -S secret-top -l required"));
+    host(kLevels[0].Command("auth chap set -d mutual -N top-m -S secret-m -l required"));
+    EXPECT_EQ(ChapRow(host, level, "uni")["Name"], "top");
+    host(level.Command("auth chap set -l prohibited"));
+    EXPECT_EQ(ChapRow(host, level, "uni")["Inheritance"], false);
+    EXPECT_EQ(ChapRow(host, level, "mutual")["Inheritance"],
+              true);  // its own entry is cleared, its mark stays
+    EXPECT_EQ(ChapRow(host, level, "mutual")["Name"], "top-m");
+    host(level.Command("auth chap set -d mutual -l prohibited"));
+    EXPECT_EQ(ChapRow(host, level, "mutual")["Inheritance"], false);
+
+    const Outcome uni = host(level.Command("auth chap set --inherit --default=false -N a -S b -l preferred"));
+    EXPECT_EQ(uni.result, true);
+    EXPECT_THAT(uni.Calls(), ElementsAre("GetScsiInterface", level.Operation("Get", "Parms"),
+                                         level.Operation("Set", "Parms")));
+    EXPECT_EQ(ChapRow(host, level, "uni")["Name"], "top");
+    EXPECT_EQ(ChapRow(host, level, "mutual")["Inheritance"], false);
+    EXPECT_EQ(host(level.Command("auth chap set --inherit -d mutual")).result, true);
+    EXPECT_EQ(ChapRow(host, level, "mutual")["Name"], "top-m");
+    EXPECT_EQ(host(level.Command("auth chap set --inherit=no")).messages.size(), 1u);
+  }
+}
+
+TEST(ChapSet, WhatTheAdapterLacksIsRefusedWithoutTheSecret) {
+  for (const LevelCase& level : kLevels) {
+    Harness host(kHost);
+    const Outcome run = host(level.Command("auth chap set -N a -S hush-hush-hush -l required", "bare"));
+    EXPECT_THAT(run.messages, ElementsAre(level.chapSetFailure));
+    EXPECT_THAT(run.trace.back(), HasSubstr("CHAP cannot be required: the adapter lacks"));
+    EXPECT_THAT(run.trace.back() + run.err, testing::Not(HasSubstr("hush")));
+    const std::pair<std::string, const char*> secrets[] = {
+        {"hush\xff", "The CHAP secret is not UTF-8."},
+        {std::string("hush\0", 5), "The CHAP secret has a zero byte."},
+        {std::string(252, ' ') + "hush", "The CHAP secret has 256 bytes, and from 1 to 255 are allowed."},
+        {"***", "The CHAP secret is ***, which stands for a secret that is not shown."}};
+    for (const auto& [secret, reason] : secrets) {
+      host.input = secret;
+      const Outcome unfit = host(level.Command("auth chap set -N a -S - -l required"));
+      EXPECT_THAT(unfit.messages, ElementsAre(level.chapSetFailure));
+      EXPECT_THAT(unfit.trace.back(), testing::EndsWith(reason));
+      EXPECT_THAT(unfit.trace.back() + unfit.err, testing::Not(HasSubstr("hush")));
+    }
+    EXPECT_EQ(host(level.Command("auth chap set -l prohibited", "bare")).result, true);
+    EXPECT_THAT(host(level.Command("auth chap set --authname= -S s -l required")).messages,
+                ElementsAre(level.chapSetFailure));
+  }
+}
+
+}  // namespace

@@ -1,0 +1,194 @@
+#include <gtest/gtest.h>
+
+#include <sstream>
+
+#include "support/ProbeCommand.h"
+
+namespace Plinth::Test {
+namespace {
+
+using CallSpec::ParameterType;
+using Arguments = std::vector<std::string>;
+
+/// A command with a parameter of each kind that writes down what it was given.
+boost::shared_ptr<ProbeCommand> NewEcho() {
+  auto echo = NewProbe(MetaObj::MetaString::New("Echo"));
+  const std::vector<AllowedValue> ways = {{"uni", "one way"}, {"mutual", ""}};
+  echo->parameters = {
+      {"name", ParameterType::String, "n", "The name.", false, false, {}},
+      {"count", ParameterType::Int, "c", "", false, false, {}},
+      {"force", ParameterType::Bool, "f", "", false, false, {}},
+      {"default", ParameterType::Flag, "d", "", false, false, {}},
+      {"inherit", ParameterType::Flag, "i", "", false, false, {}},
+      {"list", ParameterType::StringList, "l", "", false, false, {}},
+      {"way", ParameterType::String, "w", "Which way. %ENUM%", false, false, ways},
+      {"secret", ParameterType::String, "s", "", false, true, {}},
+      {"key", ParameterType::String, "k", "", false, true, ways},
+  };
+  echo->body = [](const CallSpec::Input& input, CallSpec::Output& output) {
+    std::ostringstream text;
+    for (const char* key : {"name", "way", "secret", "key"}) {
+      if (input.HasParameter(key)) text << key << '=' << input.GetString(key) << ';';
+    }
+    if (input.HasParameter("count")) text << "count=" << input.GetInt("count") << ';';
+    if (input.HasParameter("force")) text << "force=" << input.GetBool("force") << ';';
+    for (const char* key : {"default", "inherit"}) {
+      if (input.HasParameter(key)) text << key << '=' << input.GetFlag(key) << ';';
+    }
+    std::vector<std::string> values = {"stale"};
+    input.GetStringList("list", values);
+    for (const std::string& value : values) text << "list=" << value << ';';
+    Post(output, MetaObj::MetaString::New(text.str()));
+  };
+  return echo;
+}
+
+TEST(PlinthOptions, AreReadAsGnuProgramsDo) {
+  ExpectLines(*NewEcho(),
+              {
+                  {{}, "\n"},
+                  {{"--name", "x"}, "name=x;\n"},
+                  {{"--name=x=y"}, "name=x=y;\n"},
+                  {{"-n", "x"}, "name=x;\n"},
+                  {{"-nx"}, "name=x;\n"},
+                  {{"-n=x"}, "name==x;\n"},
+                  {{"--name="}, "name=;\n"},
+                  {{"--name", ""}, "name=;\n"},
+                  {{"--name", "--count"}, "name=--count;\n"},
+                  {{"--name", "--"}, "name=--;\n"},
+                  {{"-n", "-"}, "name=-;\n"},
+                  {{"-din", "x"}, "name=x;default=1;inherit=1;\n"},
+                  {{"-dinx"}, "name=x;default=1;inherit=1;\n"},
+                  {{"-id=no"}, "default=0;inherit=1;\n"},
+                  {{"--default"}, "default=1;\n"},
+                  {{"--default=n"}, "default=0;\n"},
+                  {{"--default=yes", "--"}, "default=1;\n"},
+                  {{"--force", "0"}, "force=0;\n"},
+                  {{"--force=y"}, "force=1;\n"},
+                  {{"--count", "-2147483648"}, "count=-2147483648;\n"},
+                  {{"-c+2147483647"}, "count=2147483647;\n"},
+                  {{"-l", "a", "--list=b", "-lc", "--list="}, "list=a;list=b;list=c;list=;\n"},
+                  {{"--way", "mutual", "--name", "x"}, "name=x;way=mutual;\n"},
+                  {{"--secret", "-", "--key=-"}, "secret=hidden;key=uni;\n"},
+              },
+              "hidden\nuni\nrest\n");
+}
+
+TEST(PlinthOptions, AreRefusedInOneLineThatTellsWhatIsRight) {
+  const std::vector<std::pair<Arguments, std::string>> cases = {
+      {{"--nam", "x"}, "unknown option \"--nam\"; did you mean \"--name\"?"},
+      {{"--zzzzzz=hidden"}, "unknown option \"--zzzzzz\"; --help lists the options"},
+      {{"-dx"}, "unknown option \"-x\"; --help lists the options"},
+      {{"--name\n=x"}, "unknown option \"--name\\n\"; did you mean \"--name\"?"},
+      {{"--name"}, "option --name (-n) needs a value"},
+      {{"--name", "x", "-ny"}, "option --name (-n) is given more than once"},
+      {{"-dd"}, "option --default (-d) is given more than once"},
+      {{"--count", "12x"},
+       "option --count (-c): \"12x\" is not a whole number from -2147483648 to 2147483647"},
+      {{"-c", "2147483648"},
+       "option --count (-c): \"2147483648\" is not a whole number from -2147483648 to 2147483647"},
+      {{"--count="}, "option --count (-c): \"\" is not a whole number from -2147483648 to 2147483647"},
+      {{"-c+-1"}, "option --count (-c): \"+-1\" is not a whole number from -2147483648 to 2147483647"},
+      {{"--force", "--default"},
+       "option --force (-f): \"--default\" is not a truth word: true, yes, y, 1, false, no, n or 0"},
+      {{"--default=True"},
+       "option --default (-d): \"True\" is not a truth word: true, yes, y, 1, false, no, n or 0"},
+      {{"--default", "true"}, "unexpected argument \"true\"; give values behind their options"},
+      {{"--", "--default"}, "unexpected argument \"--default\"; give values behind their options"},
+      {{"--way", "un"}, "option --way (-w): \"un\" is not one of: uni, mutual"},
+      {{"--key", "hidden"}, "option --key (-k): the value is not one of: uni, mutual"},
+      {{"--key", "-"}, "option --key (-k): the value is not one of: uni, mutual"},
+      {{"--key=-", "--secret=-"}, "option --key (-k): standard input ended before the value"},
+      {{"--output", "xml"}, "option --output: \"xml\" is not one of: simple, table, json"},
+      {{"--fields", "a"}, "option --fields: the result of this command has no fields"},
+  };
+  std::vector<Line> lines;
+  lines.reserve(cases.size());
+  for (const auto& [arguments, text] : cases) lines.push_back({arguments, "hcli: " + text + '\n', kUsage});
+  ExpectLines(*NewEcho(), lines, "hidden\n");
+}
+
+TEST(PlinthOptions, MayStandWithoutTheirNamesWhereRequiredAndWithoutALetter) {
+  const auto probe = NewProbe(MetaObj::MetaString::New(""));
+  probe->parameters = {{"from", ParameterType::String, "", "", true, false, {}},
+                       {"via", ParameterType::String, "v", "", true, false, {}},
+                       {"to", ParameterType::String, "", "", true, false, {}}};
+  probe->body = [](const CallSpec::Input& input, CallSpec::Output& output) {
+    Post(output, MetaObj::MetaString::New(input.GetString("from") + ">" + input.GetString("to")));
+  };
+  ExpectLines(*probe, {
+                          {{"a", "b", "-v", "c"}, "a>b\n"},
+                          {{"b", "-vc", "--from", "a"}, "a>b\n"},
+                          {{"-vc", "--", "-a", "--b"}, "-a>--b\n"},
+                          {{"a", "b"}, "hcli: missing required option --via (-v)\n", kUsage},
+                          {{}, "hcli: missing required options --from, --via (-v), --to\n", kUsage},
+                          {{"a", "b", "c", "-vd"},
+                           "hcli: unexpected argument \"c\"; give values behind their options\n",
+                           kUsage},
+                      });
+}
+
+TEST(PlinthOptions, OfACommandWinOverGlobalOnesBehindTheWords) {
+  const auto root = AutoCli::Namespace::New();
+  const auto probe = NewProbe(MetaObj::MetaString::New(""));
+  probe->parameters = {{"output", ParameterType::String, "h", "", false, false, {}}};
+  probe->body = [](const CallSpec::Input& input, CallSpec::Output& output) {
+    Post(output, MetaObj::MetaString::New(input.GetString("output")));
+  };
+  root->RegisterNamespaceNode(probe, "probe");
+  const char* document = "{\"schema\": 1, \"status\": 0, \"messages\": [], \"result\": \"table\"}\n";
+  ExpectLines(*root, {
+                         {{"probe", "--output", "json"}, "json\n"},
+                         {{"probe", "-hfile"}, "file\n"},
+                         {{"--output", "json", "probe", "--output=table"}, document},
+                     });
+}
+
+TEST(PlinthOptions, AreNotSoughtInValues) {
+  const auto root = AutoCli::Namespace::New();
+  root->RegisterNamespaceNode(NewEcho(), "probe");
+  const struct {
+    Arguments arguments;
+    const char* shown;
+    bool isTraced;
+  } cases[] = {
+      {{"--output=simple", "probe", "--name", "--output=json"}, "name=--output=json;\n", false},
+      {{"probe", "-n", "--output", "-l", "json"}, "name=--output;list=json;\n", false},
+      {{"probe", "--name", "--trace"}, "name=--trace;\n", false},
+      {{"probe", "--name", "--plugins=/nowhere"}, "name=--plugins=/nowhere;\n", false},
+      {{"probe", "--count", "--output=json"}, "", false},
+      {{"probe", "--plugins=/nowhere"}, "", false},
+      {{"probe", "--trace"}, "\n", true},
+  };
+  for (const auto& [arguments, shown, isTraced] : cases) {
+    unsetenv("HCLI_TRACE");
+    TextConsole console;
+    const RunRecord record = RunCommandLine(*root, arguments, console);
+    EXPECT_EQ(console.out.text, shown);
+    EXPECT_EQ(record.status, *shown ? kSuccess : kUsage) << console.error.text;
+    EXPECT_EQ(getenv("HCLI_TRACE") != nullptr, isTraced);
+  }
+  unsetenv("HCLI_TRACE");
+}
+
+// Everything that a run may read or say, with the value given in each place where it could leak.
+TEST(PlinthOptions, NeverShowASensitiveValue) {
+  const auto echo = NewEcho();
+  for (const char* output : {"simple", "json"}) {
+    for (const Arguments& given : {Arguments{"--secret=hidden", "--secret", "x"},
+                                   {"--key", "hidden"},
+                                   {"-khidden"},
+                                   {"--secret=hidden", "--way=x"},
+                                   {"-shidden", "--help"}}) {
+      Arguments arguments = given;
+      arguments.insert(arguments.begin(), {"--output", output});
+      TextConsole console;
+      const RunRecord record = RunCommand(*echo, arguments, console);
+      EXPECT_FALSE(record.executed);
+      EXPECT_EQ((console.out.text + console.error.text).find("hidden"), std::string::npos);
+    }
+  }
+}
+
+}  // namespace
+}  // namespace Plinth::Test

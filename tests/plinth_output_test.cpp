@@ -1,0 +1,335 @@
+#include <gtest/gtest.h>
+#include <locale.h>
+
+#include <nlohmann/json.hpp>
+#include <stdexcept>
+
+#include "support/ProbeCommand.h"
+
+namespace Plinth::Test {
+namespace {
+
+using CallSpec::Input;
+using CallSpec::Output;
+using CallSpec::ParameterType;
+using MetaObj::MetaBool;
+using MetaObj::MetaInt;
+using MetaObj::MetaList;
+using MetaObj::MetaObject;
+using MetaObj::MetaString;
+using MetaObj::MetaStruct;
+using MetaObj::MetaType;
+using Arguments = std::vector<std::string>;
+
+boost::shared_ptr<MetaStruct> PortShape() {
+  auto shape = MetaStruct::New("Port");
+  shape->SetField("Name", MetaString::New());
+  shape->SetField("MTU", MetaInt::New());
+  shape->SetField("Link Up", MetaBool::New());
+  return shape;
+}
+
+boost::shared_ptr<MetaStruct> Port(const std::string& name, long long mtu, bool up) {
+  auto port = PortShape();
+  port->SetField("Name", name);
+  port->SetField("MTU", mtu);
+  port->SetField("Link Up", up);
+  return port;
+}
+
+boost::shared_ptr<MetaList> Ports(const std::vector<boost::shared_ptr<MetaObject>>& rows) {
+  auto list = MetaList::New(MetaType::Struct, PortShape());
+  for (const auto& row : rows) list->Append(row);
+  return list;
+}
+
+std::string Document(int status, const std::string& messages, const std::string& result) {
+  return "{\"schema\": 1, \"status\": " + std::to_string(status) + ", \"messages\": [" + messages +
+         "], \"result\": " + result + "}\n";
+}
+
+TEST(PlinthFormatters, ShowTheSameValuesInTheirForms) {
+  ASSERT_TRUE(setlocale(LC_CTYPE, "C.UTF-8"));
+  const std::string name = "n\xc3\xa4m\xe2\x82\xac \xe6\xbc\xa2";
+  const auto probe = NewProbe(Ports(
+      {Port(name, 1500, true), PortShape(), Port("a\nb\t\x1b\xff\"\\", -9223372036854775807LL, false)}));
+  probe->SetDefaultOutputParameter("fields:Port", "MTU,Name");
+  probe->SetDefaultOutputParameter("header:Port", "%Name% %Nope%: 100%");
+  const std::string marks = R"(a\nb\t\x1b\xff"\)";
+  const std::string header = " %Nope%: 100%\n   MTU: ";
+  ExpectLines(*probe,
+              {{{},
+                name + header + "1500\n   Name: " + name + "\n\n" + header + "\n   Name: \n\n" + marks +
+                    header + "-9223372036854775807\n   Name: " + marks + '\n'},
+               {{"--output=table"},
+                "                 MTU  Name\n--------------------  ----------------\n                1500  " +
+                    name + "\n\n-9223372036854775807  " + marks + '\n'},
+               {{"--output", "table", "--fields", "Name,Link Up"},
+                "Name              Link Up\n----------------  -------\n" + name + "           true\n\n" +
+                    marks + "  false\n"},
+               {{"--output", "json"},
+                Document(0, "",
+                         R"([{"Name": ")" + name +
+                             R"(", "MTU": 1500, "Link Up": true}, )"
+                             R"({"Name": null, "MTU": null, "Link Up": null}, {"Name": "a\nb\t\u001b)"
+                             "\xef\xbf\xbd"
+                             R"(\"\\", "MTU": -9223372036854775807, "Link Up": false}])")},
+               {{"--output=json", "--fields=MTU"},
+                Document(0, "", R"([{"MTU": 1500}, {"MTU": null}, {"MTU": -9223372036854775807}])")}});
+  ExpectLines(*NewProbe(Ports({})), {{{}, ""},
+                                     {{"--output", "table"}, "Name  MTU  Link Up\n----  ---  -------\n"},
+                                     {{"--output", "json"}, Document(0, "", "[]")}});
+  ExpectLines(*NewProbe(MetaBool::New(true)), {{{"--output", "table"}, "true\n"}});
+  ExpectLines(*NewProbe(MetaInt::New(-5)), {{{}, "-5\n"}});
+  ExpectLines(*NewProbe(MetaString::New("two\nlines\x1b")), {{{}, "two\nlines\\x1b\n"}});
+  ExpectLines(*NewProbe(Port("p", 1, true)),
+              {{{}, "   Name: p\n   MTU: 1\n   Link Up: true\n"},
+               {{"--output=table"}, "Name  MTU  Link Up\n----  ---  -------\np       1  true\n"}});
+}
+
+TEST(PlinthRun, EndsWithTheStatusThatTellsWhatHappened) {
+  const auto post = [](const Input&, Output& output) { Post(output, MetaBool::New(true)); };
+  const struct {
+    ProbeCommand::Body body;
+    int status;
+    const char* messages;
+    const char* result;
+    const char* out;
+    const char* error;
+  } cases[] = {
+      {post, kSuccess, "", "true", "true\n", ""},
+      {[](const Input&, Output& output) {
+         output.ReportError("No.");
+         output.ReportError("Line\n");
+       },
+       kReported, "\"No.\", \"Line\\n\"", "null", "", "No.\nLine\n"},
+      {[&](const Input& input, Output& output) {
+         output.ReportError("Reboot");
+         post(input, output);
+       },
+       kResultAndReported, "\"Reboot\"", "true", "true\n", "Reboot\n"},
+      {[](const Input&, Output&) {}, kFailure, "\"the command ended with neither a result nor a report\"",
+       "null", "", "hcli: the command ended with neither a result nor a report\n"},
+      {[&](const Input& input, Output& output) {
+         output.ReportError("First");
+         post(input, output);
+         throw std::runtime_error("bad\nluck");
+       },
+       kFailure, "\"First\", \"bad\\\\nluck\"", "null", "", "First\nhcli: bad\\nluck\n"},
+      {[](const Input&, Output&) { throw 42; }, kFailure, "\"an exception of type int\"", "null", "",
+       "hcli: an exception of type int\n"},
+  };
+  const auto probe = NewProbe(MetaBool::New());
+  for (const auto& one : cases) {
+    probe->body = one.body;
+    TextConsole plain;
+    EXPECT_EQ(RunCommand(*probe, {}, plain).status, one.status);
+    EXPECT_EQ(plain.out.text, one.out);
+    EXPECT_EQ(plain.error.text, one.error);
+    TextConsole json;
+    EXPECT_EQ(RunCommand(*probe, {"--output=json"}, json).status, one.status);
+    EXPECT_EQ(json.out.text, Document(one.status, one.messages, one.result));
+    EXPECT_EQ(json.error.text, one.error);
+  }
+}
+
+/// A tree with the framework's own commands and "net port list".
+boost::shared_ptr<AutoCli::Namespace> NewTree() {
+  auto root = AutoCli::Namespace::New();
+  const auto net = AutoCli::Namespace::New();
+  const auto port = AutoCli::Namespace::New();
+  const auto list = NewProbe(Ports({Port("p0", 9000, true)}));
+  list->SetDescription("List ports.");
+  list->SetDefaultOutputFormatter("table");
+  list->SetDefaultOutputParameter("fields:Port", "MTU");
+  list->SetDefaultOutputParameter("fields:Port", "Name");
+  list->SetMetaDataField("type", "fetcher");
+  list->parameters = {
+      {"way", ParameterType::String, "w", "Way. %ENUM%", true, false, {{"in", "inwards"}, {"out", ""}}},
+      {"mode", ParameterType::Flag, "", "", false, true, {}}};
+  port->RegisterNamespaceNode(list, "list");
+  net->SetDescription("Networks");
+  net->RegisterNamespaceNode(port, "port");
+  root->RegisterNamespaceNode(net, "net");
+  RegisterOwnCommands(*root);
+  return root;
+}
+
+TEST(PlinthRun, ResolvesWordsOrNamesWhatIsThere) {
+  ExpectLines(
+      *NewTree(),
+      {
+          {{"net", "port", "list", "-win"}, "Name\n----\np0\n"},
+          {{"net", "--output=simple", "port", "list", "--way", "in"}, "   Name: p0\n"},
+          {{"--", "net", "port", "list", "-win"},
+           "hcli: unexpected argument \"-win\"; give values behind their options\n",
+           kUsage},
+          {{"nte"}, "hcli: unknown command \"nte\"; did you mean \"net\"?\n", kUsage},
+          {{"net", "zzz"}, "hcli: unknown command \"zzz\" in \"net\"; there are: port\n", kUsage},
+          {{"net", ""}, "hcli: unknown command \"\" in \"net\"; there are: port\n", kUsage},
+          {{"net", "port", "list"}, "hcli: missing required option --way (-w)\n", kUsage},
+          {{"net", "port", "list", "-win", "--fields=Name,Speed"},
+           "hcli: option --fields: there is no field \"Speed\"; there are: Name,MTU,Link Up\n",
+           kUsage},
+          {{"net", "port", "list", "-win", "--fields=MTU,MTU"},
+           "hcli: option --fields: \"MTU\" is named twice\n",
+           kUsage},
+          {{"net", "--way", "in"}, "hcli: unknown option \"--way\"; --help lists the options\n", kUsage},
+          {{"--version"}, "hcli 0.1.0\n"},
+      });
+}
+
+TEST(PlinthRun, GivesOneDocumentHoweverItEnds) {
+  const auto root = NewTree();
+  const struct {
+    Arguments arguments;
+    int status;
+    std::size_t messages;
+    bool hasResult;
+  } cases[] = {
+      {{"--output", "json"}, 0, 0, true},
+      {{"--output=json", "--version"}, 0, 0, true},
+      {{"net", "port", "list", "--help", "--output", "json"}, 0, 0, true},
+      {{"nope", "--output", "json"}, 2, 1, false},
+      {{"--nope", "--output=json"}, 2, 1, false},
+      {{"--output", "nope", "--output", "json"}, 2, 1, false},
+      {{"net", "port", "list", "--output", "json", "--way", "\xff"}, 2, 1, false},
+      {{"completion", "ksh", "--output=json"}, 2, 1, false},
+      {{"completion", "fish", "--output=json"}, 0, 0, true},
+  };
+  for (const auto& [arguments, status, messages, hasResult] : cases) {
+    TextConsole console;
+    RunCommandLine(*root, arguments, console);
+    const auto document = nlohmann::json::parse(console.out.text);
+    EXPECT_EQ(document.size(), 4U);
+    EXPECT_EQ(document.at("schema"), 1);
+    EXPECT_EQ(document.at("status"), status) << console.out.text;
+    EXPECT_EQ(document.at("messages").size(), messages);
+    EXPECT_EQ(!document.at("result").is_null(), hasResult);
+    if (messages > 0) {
+      EXPECT_EQ("hcli: " + std::string(document.at("messages")[0]) + '\n', console.error.text);
+    }
+  }
+}
+
+TEST(PlinthHelp, StandsAtEveryNode) {
+  const auto root = NewTree();
+  const char* netHelp = "Usage: hcli net COMMAND... [OPTIONS]\n\nNetworks\n\nCommands:\n  port\n";
+  const char* listHelp =
+      "Usage: hcli net port list --way TEXT [OPTIONS]\n\nList ports.\n\nOptions:\n  -w, --way TEXT "
+      "(required)\n          Way. [in, out]\n          in: inwards\n      --mode\n          \"-\" reads it "
+      "from standard input, without echo.\n\nhcli --help lists the global options.\n\nResult: list with the "
+      "fields\n  Name     string\n  MTU      int\n  Link Up  bool\n";
+  ExpectLines(*root,
+              {{{"net"}, netHelp}, {{"-h", "net"}, netHelp}, {{"net", "port", "list", "--help"}, listHelp}});
+}
+
+TEST(PlinthCatalogue, DescribesTheTreeInItsFixedForm) {
+  TextConsole console;
+  RunCommandLine(*NewTree(), {"catalogue", "--output", "json"}, console);
+  const auto document = nlohmann::ordered_json::parse(console.out.text);
+  const auto expected = nlohmann::ordered_json::parse(R"json([
+    {"path": "net", "kind": "namespace", "description": "Networks"},
+    {"path": "net port", "kind": "namespace", "description": ""},
+    {"path": "net port list", "kind": "command", "description": "List ports.",
+     "metadata": {"type": "fetcher"},
+     "formatter": "table", "formatterParameters": {"fields:Port": "Name"},
+     "parameters": [{"name": "way", "short": "w", "type": "string", "required": true, "sensitive": false,
+                     "help": "Way. %ENUM%",
+                     "enum": [{"value": "in", "help": "inwards"}, {"value": "out", "help": ""}]},
+                    {"name": "mode", "short": "", "type": "flag", "required": false, "sensitive": true,
+                     "help": "", "enum": []}],
+     "result": {"kind": "list", "sample": "", "structure": {"name": "Port",
+                "fields": [{"name": "Name", "type": "string"}, {"name": "MTU", "type": "int"},
+                           {"name": "Link Up", "type": "bool"}]}}}])json");
+  const auto& nodes = document.at("result");
+  ASSERT_EQ(nodes.size(), 5U);
+  for (std::size_t index = 0; index < expected.size(); ++index) {
+    EXPECT_EQ(nodes[index].dump(), expected[index].dump());
+  }
+  EXPECT_EQ(nodes[4].at("formatter").dump() + nodes[4].at("formatterParameters").dump(), "null{}");
+  EXPECT_EQ(nodes[4].at("result").dump(), R"({"kind":"string","sample":"Script","structure":null})");
+}
+
+TEST(PlinthCheck, TellsWhereAResultDiffers) {
+  auto renamed = MetaStruct::New("Port");
+  renamed->SetField("Title", "");
+  auto mistyped = Port("p", 1, true);
+  mistyped->SetField("MTU", "1");
+  auto longer = Port("p", 1, true);
+  longer->SetField("More", 1);
+  auto shorter = MetaStruct::New("Port");
+  shorter->SetField("Name", "p");
+  const auto list = Ports({});
+  const struct {
+    boost::shared_ptr<MetaObject> declared;
+    boost::shared_ptr<MetaObject> posted;
+    const char* difference;
+  } cases[] = {
+      {list, Ports({Port("p", 1, true), PortShape()}), ""},
+      {MetaString::New("Status"), MetaString::New("x"), ""},
+      {MetaStruct::New("Port"), longer, ""},
+      {nullptr, MetaBool::New(true), "the command declares no result type"},
+      {MetaBool::New(), list, "the result is list, declared is bool"},
+      {list, MetaList::New(MetaType::Int, MetaInt::New()),
+       "the result is a list of int, declared is a list of struct"},
+      {list, Ports({MetaInt::New(1)}), "the result[0] is int, declared is struct"},
+      {list, Ports({PortShape(), renamed}), "the result[1]: field 1 is \"Title\", declared is \"Name\""},
+      {list, Ports({mistyped}), "the result[0].MTU is string, declared is int"},
+      {list, Ports({longer}), "the result[0]: field \"More\" is not declared"},
+      {list, Ports({shorter}), "the result[0]: field \"MTU\" is missing"},
+      {PortShape(), MetaStruct::New("Nic"), "the result is structure \"Nic\", declared is \"Port\""},
+  };
+  for (const auto& one : cases) EXPECT_EQ(CheckResult(one.declared.get(), *one.posted), one.difference);
+}
+
+TEST(PlinthCheck, EndsACheckedRunThatBreaksItsDeclarations) {
+  const auto probe = NewProbe(MetaBool::New());
+  probe->parameters = {{"name", ParameterType::String, "n", "", false, false, {}}};
+  const struct {
+    ProbeCommand::Body body;
+    const char* text;
+    /// What an unchecked run makes of it.
+    int status;
+  } cases[] = {
+      {[](const Input& input, Output&) { input.GetInt("name"); },
+       "the command reads the parameter \"name\" as int, declared is string", kFailure},
+      {[](const Input& input, Output&) { input.HasParameter("nam"); },
+       "the command reads the parameter \"nam\", not declared", kFailure},
+      {[](const Input&, Output& output) { output.Close(); }, "the command closes its output without a result",
+       kFailure},
+      {[](const Input&, Output& output) { output.SetResult(nullptr); }, "the command posts a null result",
+       kFailure},
+      {[](const Input&, Output& output) {
+         Post(output, MetaBool::New(true));
+         output.SetResult(MetaBool::New(true));
+       },
+       "the command posts a second result", kFailure},
+      {[](const Input&, Output& output) { output.SetResult(MetaBool::New(true)); },
+       "the command posts a result and does not close its output", kSuccess},
+      {[](const Input&, Output& output) { Post(output, MetaInt::New(1)); },
+       "the result is int, declared is bool", kSuccess},
+  };
+  for (const auto& one : cases) {
+    probe->body = one.body;
+    TextConsole console;
+    const RunRecord record = RunCommand(*probe, {}, console, {.checked = false});
+    EXPECT_EQ(record.status, one.status);
+    EXPECT_EQ(record.failure, one.status == kFailure ? one.text : "");
+    EXPECT_DEATH(RunCommand(*probe, {}, console, {.checked = true}), one.text);
+  }
+}
+
+TEST(PlinthTree, RefusesWhatItCannotHold) {
+  const auto root = AutoCli::Namespace::New();
+  const boost::shared_ptr<AutoCli::NamespaceNode> probe = NewProbe(MetaBool::New());
+  root->RegisterNamespaceNode(probe, "probe");
+  EXPECT_THROW(root->RegisterNamespaceNode(probe, "probe"), std::logic_error);
+  EXPECT_THROW(root->RegisterNamespaceNode(probe, ""), std::logic_error);
+  EXPECT_THROW(root->RegisterNamespaceNode(nullptr, "other"), std::logic_error);
+  EXPECT_THROW(probe->RegisterNamespaceNode(AutoCli::Namespace::New(), "x"), std::logic_error);
+  EXPECT_EQ(AutoCli::NodeData::ChildNames(*root), Arguments{"probe"});
+}
+
+}  // namespace
+}  // namespace Plinth::Test

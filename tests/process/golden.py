@@ -1,0 +1,91 @@
+"""What hcli prints, byte by byte, in each format, in a pipe and on a terminal, in any locale.
+
+UPDATE_GOLDEN=1 in the environment writes tests/golden/ anew and shows what has changed.
+"""
+
+import difflib
+import json
+import os
+import sys
+
+from support.program import SOURCE, Host
+
+GOLDEN = os.path.join(SOURCE, "tests/golden")
+FORMATS = ["simple", "table", "json"]
+# file: the command lines that it shows
+CASES = {
+    "list": ["iscsi adapter list", "iscsi adapter list --fields Adapter,Description"],
+    "get": ["iscsi adapter get --adapter hba1"],
+    "empty-list": ["iscsi adapter discovery sendtarget list"],
+    "text-result": ["iscsi software set --enabled true"],
+    "bool-result": ["iscsi software get", "iscsi adapter set --adapter hba1 --alias 'Büro 東京'"],
+    "failure": ["iscsi adapter set --adapter hba9 --alias x", "iscsi adapter get --adapter 'häb 1'"],
+    "result-and-report": ["iscsi adapter set --adapter hba9 --name iqn.2026-11.org.example:soft"],
+    "usage-error": ["iscsi adapter get", "iscsi software set --enabled perhaps", "iscsi adapter set --adaptor hba1"],
+    "unknown-word": ["iscsi adapter lits", "iscsi adaptor list", "söftware"],
+    "help-root": ["--help"],
+    "help-namespace": ["iscsi", "iscsi adapter", "iscsi software --help"],
+    "help-command": ["iscsi adapter auth chap set --help", "iscsi software get --help"],
+}
+
+
+def piped(host, line, locale):
+    """Standard output, standard error and status, with every byte."""
+    process = host.start(line, env=host.environment(LC_ALL=locale), text=False, encoding=None)
+    out, err = process.communicate(timeout=60)
+    return out, err, process.returncode
+
+
+def section(title, text):
+    if not text:
+        return ""
+    return f"-- {title}\n" + text.decode() + ("" if text.endswith(b"\n") else "\n-- (no newline at the end)\n")
+
+
+def seen(host, line, faults):
+    out, err, status = texts = piped(host, line, "C.UTF-8")
+    if piped(host, line, "C") != texts:
+        faults.append(f"hcli {line}: other output with LC_ALL=C than with C.UTF-8")
+    # Reports come as they are made, ahead of the result.
+    terminal = host.on_terminal(line)
+    if terminal != (err + out, status):
+        faults.append(f"hcli {line}: on a terminal {terminal}, in pipes {texts}")
+    return section("output", out) + section("errors", err) + f"-- status {status}\n\n"
+
+
+def transcript(host, line, faults):
+    """Formats that show the same stand together."""
+    shown = {}
+    for form in FORMATS:
+        written = f"--output {form} {line}"
+        shown.setdefault(seen(host, written, faults), []).append(f"$ hcli {written}\n")
+    return "".join("".join(lines) + text for text, lines in shown.items())
+
+
+def catalogue(host, path):
+    node = next(node for node in host.result("catalogue") if node["path"] == path)
+    return json.dumps(node, indent=1, ensure_ascii=False) + "\n"
+
+
+def main():
+    host, faults, update = Host(os.path.join(GOLDEN, "host.json")), [], os.environ.get("UPDATE_GOLDEN") == "1"
+    texts = {name: "".join(transcript(host, line, faults) for line in lines) for name, lines in CASES.items()}
+    texts["catalogue"] = catalogue(host, "iscsi adapter auth chap set")
+    for name, text in texts.items():
+        path = os.path.join(GOLDEN, name + ".txt")
+        expected = ""
+        if os.path.exists(path):
+            with open(path, encoding="utf-8", newline="") as file:
+                expected = file.read()
+        difference = "".join(difflib.unified_diff(expected.splitlines(True), text.splitlines(True), path, "now"))
+        if difference and update:
+            with open(path, "w", encoding="utf-8", newline="") as file:
+                file.write(text)
+            print(difference)
+        elif difference:
+            faults.append(difference + "If this is meant: UPDATE_GOLDEN=1 ctest -R process.golden, and read the diff.")
+    sys.exit("\n".join(faults) if faults else 0)
+
+
+if __name__ == "__main__":
+    main()

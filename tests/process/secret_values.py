@@ -1,0 +1,61 @@
+"""A secret given as "-" comes from a pipe or a terminal, and is seen nowhere but where the host keeps it."""
+
+import os
+import subprocess
+import time
+
+from support.program import Host, check
+
+SECRET = "correct horse 東"
+LINE = "--trace iscsi adapter auth chap set -A hba2 -d uni -l required -N user --secret -"
+
+
+def waiting(process):
+    """Waits until the process sleeps over its reading, and returns what others can see of it."""
+    folder, asleep = f"/proc/{process.pid}", 0
+    while asleep < 10:
+        time.sleep(0.005)
+        with open(f"{folder}/stat", encoding="utf-8") as file:
+            asleep = asleep + 1 if file.read().rpartition(")")[2].split()[0] == "S" else 0
+    with open(f"{folder}/cmdline", "rb") as command, open(f"{folder}/environ", "rb") as environment:
+        return (command.read() + environment.read()).decode()
+
+
+def is_set(host, shown, *texts):
+    for text in (shown, *texts):
+        check(SECRET not in text, "the secret shows", text)
+    check("***" in shown and "true" in shown, "the trace has no mark of a secret", shown)
+    check(SECRET in host.succeed("simulator show --secrets"), "the host does not have the secret")
+    check(SECRET not in host.succeed("simulator show"), "simulator show shows the secret")
+    check(os.stat(host.database).st_mode & 0o077 == 0, "others can read the database")
+
+
+def from_pipe():
+    host = Host()
+    process = host.start(LINE, stdin=subprocess.PIPE)
+    seen = waiting(process)
+    out, err = process.communicate(SECRET + "\nnot a part of it\n", timeout=60)
+    check(process.returncode == 0, process.returncode, out, err)
+    is_set(host, err + out, seen)
+
+
+def from_terminal():
+    host = Host()
+    shown, status = host.on_terminal(LINE, SECRET + "\n")
+    check(status == 0, shown)
+    is_set(host, shown.decode())
+
+
+def in_messages():
+    """Neither usage errors nor refusals repeat a secret that stood on the command line."""
+    host = Host()
+    for line in (f"iscsi adapter auth chap set -A hba2 --secret '{SECRET}' --no-such-option",
+                 f"iscsi adapter auth chap set -A nothing -d uni -l required -N user --secret='{SECRET}' --trace",
+                 f"iscsi adapter auth chap set -A hba2 -d uni -l nonsense -N user -S'{SECRET}' --output json"):
+        done = host.run(line)
+        check(done.returncode in (1, 2) and SECRET not in done.stdout + done.stderr, "the secret shows", done)
+
+
+from_pipe()
+from_terminal()
+in_messages()

@@ -1,0 +1,207 @@
+// iscsi session list, add and remove, and session connection list: what they show, select and change.
+#include "support/Harness.h"
+
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+constexpr char kHost[] = R"({"remoteTargets": [
+  {"name": "t0", "portals": [{"host": "192.0.2.1", "tag": 3}]},
+  {"name": "t1", "portals": [{"host": "192.0.2.2"}]},
+  {"name": "closed", "portals": [{"host": "192.0.2.3"}], "refusedInitiators": ["iqn.2026-11.org.example:one"]},
+  {"name": "new", "portals": [{"host": "198.51.100.9", "tag": 9}]}],
+ "adapters": [
+  {"name": "hba0", "initiatorName": "iqn.2026-11.org.example:zero", "targets": [
+    {"name": "t0", "addresses": [{"address": "192.0.2.1", "tag": 3}], "sessions": [
+      {"isid": "00023d000001", "tsih": 5, "targetPortalGroupTag": 3, "authMethod": 1, "maxBurstLength": 4294967295,
+       "connections": [{"cid": 0, "headerDigest": 1, "ifMarker": true, "ifMarkerInterval": 4294967295, "state": 3,
+                        "connectionAddress": "2001:db8::1", "remoteAddress": "192.0.2.1",
+                        "sessionCreateTime": "2012-06-15 14:03:22", "connectionCreateTime": "2012-06-31 25:00:00",
+                        "connectionStartTime": "9999-12-31 23:59:60"},
+                       {"cid": 65535, "state": 8}]},
+      {"isid": "80aabbccddee", "authMethod": 2, "immediateData": false}]},
+    {"name": "t1", "addresses": [{"address": "192.0.2.2"}]}]},
+  {"name": "hba1", "initiatorName": "iqn.2026-11.org.example:one", "targets": [
+    {"name": "t0", "sessions": [{"isid": "00023d000001", "immediateData": false, "initialR2T": false,
+                                 "firstBurstLength": 512, "connections": [{"cid": 1}]}]},
+    {"name": "closed", "addresses": [{"address": "192.0.2.3"}]}],
+   "staticTargets": [{"name": "new", "host": "198.51.100.9", "portalGroup": 9}]},
+  {"name": "hba2"},
+  {"name": "hba3", "state": 1, "targets": [{"name": "t0"}]}]})";
+
+TEST(SessionList, ShowsWhatWasNegotiated) {
+  const Outcome run = Harness(kHost)("iscsi session list");
+  ASSERT_EQ(run.result.size(), 3u);
+  EXPECT_EQ(run.result[0], nlohmann::json::parse(R"({
+      "ID": "hba0,t0,00023d000001", "Adapter": "hba0", "Target": "t0", "AuthenticationMethod": "chap",
+      "DataPduInOrder": true, "DataSequenceInOrder": true, "DefaultTime2Retain": 20, "DefaultTime2Wait": 2,
+      "ErrorRecoveryLevel": 0, "FirstBurstLength": "65536", "ImmediateData": true, "InitialR2T": true,
+      "ISID": "00023d000001", "MaxBurstLength": 4294967295, "MaxConnections": 1, "MaxOutstandingR2T": 1,
+      "TargetPortalGroupTag": 3, "TSIH": 5})"));
+  EXPECT_EQ(run.result[1]["AuthenticationMethod"], "unsupported");
+  EXPECT_EQ(run.result[1]["FirstBurstLength"], "Irrelevant");  // no immediate data, and R2T first
+  EXPECT_EQ(run.result[2]["AuthenticationMethod"], "none");
+  EXPECT_EQ(run.result[2]["FirstBurstLength"], "512");
+}
+
+TEST(SessionList, FiltersCombine) {
+  Harness host(kHost);
+  const std::pair<const char*, std::size_t> cases[] = {
+      {"-s 00023d000001", 2}, {"-s 00023D000001", 0}, {"-A hba1 -s 00023d000001", 1},
+      {"-n t0", 3},           {"-A hba2", 0},         {"-s 80AABBCCDDEE", 0},
+      {"-n t1", 0},           {"-A none", 0}};
+  for (const auto& [options, count] : cases) {
+    for (const char* command : {"iscsi session list ", "iscsi session connection list "}) {
+      const Outcome run = host(std::string(command) + options);
+      EXPECT_TRUE(run.closed && run.messages.empty()) << options;
+      EXPECT_EQ(run.result.empty(), count == 0) << command << options;
+    }
+    EXPECT_EQ(host(std::string("iscsi session list ") + options).result.size(), count) << options;
+  }
+}
+
+TEST(ConnectionList, ShowsWhatIsKnown) {
+  const Outcome run = Harness(kHost)("iscsi session connection list");
+  ASSERT_EQ(run.result.size(), 3u);
+  EXPECT_EQ(run.result[0], nlohmann::json::parse(R"({
+      "ID": "hba0,t0,00023d000001,0", "Adapter": "hba0", "Target": "t0", "ISID": "00023d000001", "CID": 0,
+      "DataDigest": "NONE", "HeaderDigest": "CRC32C", "IFMarker": true, "IFMarkerInterval": 4294967295,
+      "MaxRecvDataSegmentLength": 8192, "MaxTransmitDataSegmentLength": 8192, "OFMarker": false,
+      "OFMarkerInterval": 0, "ConnectionAddress": "2001:db8::1", "RemoteAddress": "192.0.2.1",
+      "LocalAddress": "Not Available", "SessionCreateTime": "06/15/12 14:03:22",
+      "ConnectionCreateTime": "Not Available", "ConnectionStartTime": "12/31/99 23:59:60",
+      "State": "in_login"})"));
+  EXPECT_EQ(run.result[1]["ID"], "hba0,t0,00023d000001,65535");
+  EXPECT_EQ(run.result[1]["State"], "unknown");
+  EXPECT_EQ(run.result[2]["State"], "logged_in");
+}
+
+TEST(ConnectionList, CidIsReadAsFarAsItIsANumber) {
+  Harness host(kHost);
+  const std::pair<const char*, std::vector<int>> cases[] = {
+      {"0", {0}},     {"abc", {0}}, {"''", {0}}, {"65535", {65535}},           {" 1x", {1}},
+      {"131071", {}}, {"-1", {}},   {"2", {}},   {"99999999999999999999", {}},
+  };
+  for (const auto& [cid, shown] : cases) {
+    const Outcome run =
+        host(std::string("iscsi session connection list --cid=") + (cid[0] == ' ' ? "' 1x'" : cid));
+    std::vector<int> found;
+    for (const auto& row : run.result) found.push_back(row["CID"].get<int>());
+    EXPECT_EQ(found, shown) << cid;
+  }
+}
+
+TEST(ConnectionList, ReadsNothingOfWhatIsFilteredOut) {
+  Harness host(kHost);
+  EXPECT_THAT(
+      host("iscsi session connection list -A hba0 -n t0 -s 00023d000001 -c 65535").Calls(),
+      ElementsAre("IMA_GetLhbaOidList", "IMA_GetLhbaProperties", "IMA_GetTargetOidList",
+                  "IMA_GetTargetProperties", "IMA_GetSessionOidList", "IMA_GetSessionProperties",
+                  "IMA_GetConnectionOidList", "IMA_GetConnectionProperties", "IMA_GetConnectionProperties",
+                  "IMA_TSR_GetConnectionStatus", "IMA_GetSessionProperties", "IMA_GetTargetProperties",
+                  "IMA_GetLhbaProperties", "IMA_GetLhbaProperties", "IMA_GetLhbaProperties"));
+}
+
+TEST(ConnectionList, UnknownDigestLeavesTheCommand) {
+  for (const char* digest : {"headerDigest", "dataDigest"}) {
+    Harness host(std::string(R"({"adapters": [{"name": "a", "targets": [{"name": "t", "sessions": [{
+        "isid": "000000000000", "connections": [{"cid": 0, ")") +
+                 digest + R"(": 2}]}]}]}]})");
+    const Outcome run = host("iscsi session connection list");
+    EXPECT_EQ(run.status, 4);
+    EXPECT_THAT(run.failure, testing::HasSubstr("Invalid digest value"));
+    EXPECT_THAT(run.messages, IsEmpty());
+    EXPECT_TRUE(run.result.is_null());
+  }
+}
+
+TEST(SessionList, SaysOfUnreadableSessionsThatTheyAreNotSupported) {
+  Harness host(WithAnswers(kHost, R"({"operation": "IMA_GetSessionProperties", "call": 3, "imaStatus": 1})"));
+  const Outcome run = host("iscsi session list");
+  EXPECT_THAT(run.messages, ElementsAre("Feature not supported by this adapters."));
+  EXPECT_TRUE(run.result.is_null());  // the rows before it too
+}
+
+constexpr char kNoMatch[] = "Failed to find matching object.";
+
+TEST(SessionSelection, SaysNothingMoreOfWhatIsNotThere) {
+  const char* silent[] = {"-A ''",
+                          "-A hba2 -n t0",
+                          "-A hba0 -n T0",
+                          "-A hba0 -n t1 -s 00023d000001",
+                          "-A hba0 -n t0 -s 80AABBCCDDEE",
+                          "-A hba0 -n ''"};
+  for (const char* verb : {"add", "remove"}) {
+    const std::string command = std::string("iscsi session ") + verb + ' ';
+    for (const char* options : silent) {
+      const Outcome run = Harness(kHost)(command + options);
+      EXPECT_THAT(run.messages, ElementsAre(kNoMatch)) << options;
+      EXPECT_EQ(run.status, 1);
+    }
+    const Outcome alone = Harness(kHost)(command + "-A hba0 -s 00023d000001");
+    EXPECT_THAT(alone.messages,
+                ElementsAre("Should not use isid option alone, missing target option.", kNoMatch));
+    EXPECT_THAT(alone.trace, IsEmpty());
+  }
+}
+
+/// The sessions of the adapter as "target/isid/tsih/tag".
+std::vector<std::string> Sessions(Harness& host, const char* adapter) {
+  std::vector<std::string> sessions;
+  for (const auto& row : host(std::string("iscsi session list -A ") + adapter).result) {
+    sessions.push_back(row["Target"].get<std::string>() + '/' + row["ISID"].get<std::string>().substr(8) +
+                       '/' + row["TSIH"].dump() + '/' + row["TargetPortalGroupTag"].dump());
+  }
+  return sessions;
+}
+
+TEST(SessionAdd, LogsInWhatIsSelected) {
+  Harness host(kHost);
+  const Outcome run = host("iscsi session add -A hba0");
+  EXPECT_EQ(run.result, true);
+  EXPECT_TRUE(run.closed);
+  EXPECT_THAT(run.Calls(), ElementsAre("IMA_GetLhbaOidList", "IMA_GetLhbaProperties", "IMA_TSR_AddSession"));
+  // The target that had sessions keeps them; the other one got its first.
+  EXPECT_THAT(Sessions(host, "hba0"), ElementsAre("t0/0001/5/3", "t0/ddee/1/1", "t1/0001/1/1"));
+
+  EXPECT_EQ(host("iscsi session add -A hba0 -n t0").result, true);
+  EXPECT_EQ(host("iscsi session add -A hba0 -n t0 -s 00023d000001").result, true);
+  EXPECT_THAT(Sessions(host, "hba0"),
+              ElementsAre("t0/0001/5/3", "t0/ddee/1/1", "t0/0001/2/3", "t0/0002/3/3", "t1/0001/1/1"));
+  const nlohmann::json added = host("iscsi session list -A hba0 -n t0").result[2];
+  EXPECT_EQ(added["ISID"].get<std::string>().substr(0, 2), "80");                           // the random type
+  EXPECT_EQ(host("iscsi session list -A hba0 -n t0").result[3]["MaxBurstLength"], 262144);  // agreed on anew
+  EXPECT_EQ(host("iscsi session connection list -A hba0 -n t1").result[0]["RemoteAddress"], "192.0.2.2");
+}
+
+TEST(SessionAdd, RefusalShowsAsLastError) {
+  Harness host(kHost);
+  for (const char* line : {"iscsi session add -A hba1", "iscsi session add -A hba1 -n closed"}) {
+    EXPECT_THAT(host(line).messages, ElementsAre("Failed to add session.")) << line;
+  }
+  // The others of the adapter were logged in all the same, the one known from its portal alone too.
+  EXPECT_THAT(Sessions(host, "hba1"), ElementsAre("t0/0001/1/1", "new/0001/1/9"));
+  const nlohmann::json closed = host("iscsi adapter target list -A hba1 -n closed").result[0];
+  EXPECT_EQ(closed["Last Error"], "0x0202 Initiator is not allowed access to the given target.");
+  EXPECT_EQ(host("iscsi session connection list -n new").result[0]["RemoteAddress"], "198.51.100.9");
+  EXPECT_EQ(host("iscsi adapter target portal list -n new").result.size(), 1u);
+
+  EXPECT_THAT(host("iscsi session add -A hba3").messages, ElementsAre("Failed to add session."));  // offline
+}
+
+TEST(SessionRemove, LogsOutWhatIsSelected) {
+  Harness host(kHost);
+  EXPECT_EQ(host("iscsi session remove -A hba0 -n t0 -s 00023d000001").result, true);
+  EXPECT_THAT(Sessions(host, "hba0"), ElementsAre("t0/ddee/1/1"));
+  EXPECT_EQ(host("iscsi session add -A hba0").result, true);
+  EXPECT_EQ(host("iscsi session remove -A hba0 -n t0").result, true);
+  EXPECT_THAT(Sessions(host, "hba0"), ElementsAre("t1/0001/1/1"));
+  EXPECT_EQ(host("iscsi session remove -A hba0").result, true);
+  EXPECT_EQ(host("iscsi session remove -A hba0").result, true);  // nothing left to do
+  EXPECT_THAT(Sessions(host, "hba0"), IsEmpty());
+  EXPECT_EQ(Sessions(host, "hba1").size(), 1u);
+  EXPECT_EQ(host("iscsi session remove -A hba1 -n new").result, true);  // known from its portal alone
+}
+
+}  // namespace

@@ -1,0 +1,99 @@
+// iscsi software get|set: the switch, and the initiator name that goes with it.
+#include "host/Host.h"
+#include "support/Harness.h"
+
+namespace {
+
+using testing::ElementsAre;
+
+constexpr char kOff[] = R"({"softwareIscsi": {"enabled": false}})";
+constexpr char kNameFile[] = "etc/tessaro/coreiscsid/initiatorname.iscsi";
+
+class Software : public testing::Test {
+ protected:
+  std::string NameFile() const { return root_.Read(kNameFile); }
+
+  TemporaryRoot root_;
+};
+
+TEST_F(Software, SwitchesOnAndStoresTheName) {
+  Harness host(kOff);
+  EXPECT_EQ(host("iscsi software get").result, false);
+  const Outcome run = host("iscsi software set --enabled=true --name iqn.2026-11.org.example:host1");
+  EXPECT_EQ(run.result, "Software iSCSI Enabled");
+  EXPECT_EQ(run.status, 0);
+  EXPECT_THAT(run.Calls(), ElementsAre("CheckInitiatorName", "Parse", "Save", "EnableSoftwareiScsi"));
+  EXPECT_EQ(NameFile(), "InitiatorName=iqn.2026-11.org.example:host1\n");
+  EXPECT_EQ(host("iscsi software get").result, true);
+
+  // Without a name the file is left alone, also where the software initiator is on already.
+  EXPECT_THAT(host("iscsi software set -e yes").Calls(), ElementsAre("EnableSoftwareiScsi"));
+  EXPECT_EQ(NameFile(), "InitiatorName=iqn.2026-11.org.example:host1\n");
+}
+
+TEST_F(Software, SwitchingOffTakesNoName) {
+  Harness host(R"({"softwareIscsi": {"enabled": true}})");
+  const Outcome refused = host("iscsi software set --enabled=false --name x");
+  EXPECT_THAT(refused.messages,
+              ElementsAre("-n|--name must not be specified when disabling software iSCSI."));
+  EXPECT_TRUE(refused.trace.empty());
+  const Outcome run = host("iscsi software set --enabled=no");
+  EXPECT_EQ(run.result, "Software iSCSI Disabled. (Reboot Required)");
+  EXPECT_TRUE(run.messages.empty());
+  EXPECT_TRUE(run.closed);
+}
+
+TEST_F(Software, FailuresTellTheReasonAndKeepWhatWasDone) {
+  const std::string answers =
+      R"({"operation": "EnableSoftwareiScsi", "throw": "NodeCtlException", "text": "why"},
+                                 {"operation": "HasSoftwareiScsiEnabled", "throw": "NodeCtlException"})";
+  Harness host(WithAnswers(kOff, answers));
+  EXPECT_THAT(host("iscsi software set -e true -n iqn.2026-11.org.example:new").messages,
+              ElementsAre("Failed to enable software iSCSI: why"));
+  EXPECT_EQ(NameFile(), "InitiatorName=iqn.2026-11.org.example:new\n");
+  EXPECT_THAT(host("iscsi software get").messages, ElementsAre("Unable to get Software iSCSI information."));
+}
+
+TEST_F(Software, RefusedNameChangesNothing) {
+  Harness host(kOff);
+  const Outcome run = host("iscsi software set --enabled=true --name nonsense");
+  ASSERT_EQ(run.messages.size(), 1u);
+  EXPECT_EQ(run.messages[0].rfind("Failed to enable software iSCSI: ", 0), 0u) << run.messages[0];
+  EXPECT_NE(run.messages[0].find("nonsense"), std::string::npos) << run.messages[0];
+  EXPECT_EQ(NameFile(), "");
+  EXPECT_EQ(host("iscsi software get").result, false);
+}
+
+TEST_F(Software, TheNameGivenLastHoldsFromTheNextStartOn) {
+  Harness host(
+      R"({"adapters": [{"name": "hba0", "kind": "software", "initiatorName": "iqn.2026-11.org.example:old",
+                                 "capabilities": {"Name And Alias Settable": true}}]})");
+  const std::string set = "iscsi software set -e yes -n iqn.2026-11.org.example:";
+  const std::string adapterSet = "iscsi adapter set -A hba0 -n iqn.2026-11.org.example:";
+  const struct {
+    std::string line;
+    const char* name;
+  } steps[] = {
+      {set + "x", "old"},      {"reboot", "x"},
+      {set + "x2", "x"},       {"iscsi software set -e no", "x"},
+      {"reboot", nullptr},     {"iscsi software set -e yes", "x2"},
+      {adapterSet + "y", "y"}, {"iscsi software set -e yes", "y"},
+      {"reboot", "y"},         {"iscsi software set -e no", "y"},
+      {"reboot", nullptr},     {"iscsi software set -e yes", "y"},
+      {set + "x2", "y"},       {"reboot", "x2"},
+      {set + "x3", "x2"},      {adapterSet + "z", "z"},
+      {"reboot", "z"},
+  };
+  for (const auto& [line, name] : steps) {
+    if (line == "reboot") {
+      host::Host::Current().Reboot();
+    } else {
+      ASSERT_EQ(host(line).status, 0) << line;
+    }
+    const nlohmann::json listed = host("iscsi adapter get -A hba0").result;
+    const nlohmann::json shown = listed.is_null() ? listed : listed[0]["Name"];
+    EXPECT_EQ(shown, name ? nlohmann::json(std::string("iqn.2026-11.org.example:") + name) : nullptr) << line;
+  }
+}
+
+}  // namespace

@@ -1,0 +1,187 @@
+#include "support/Harness.h"
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <set>
+
+#include "host/Host.h"
+#include "ima/Memory.h"
+#include "plinth/Declarations.h"
+#include "support/Words.h"
+
+extern "C" void AutoCli_RegisterNamespaces(boost::shared_ptr<Plinth::AutoCli::Namespace> parent);
+
+namespace {
+
+using nlohmann::json;
+using namespace Plinth::MetaObj;
+
+template <class Scalar>
+json ValueOf(const MetaObject& object) {
+  const auto& scalar = dynamic_cast<const Scalar&>(object);
+  return scalar.HasValue() ? json(scalar.GetValue()) : json();
+}
+
+json ToJson(const MetaObject& object) {
+  json value;
+  switch (object.GetType()) {
+    case MetaType::Bool:
+      return ValueOf<MetaBool>(object);
+    case MetaType::Int:
+      return ValueOf<MetaInt>(object);
+    case MetaType::String:
+      return ValueOf<MetaString>(object);
+    case MetaType::Struct: {
+      value = json::object();
+      const auto& structure = dynamic_cast<const MetaStruct&>(object);
+      for (std::size_t i = 0; i < structure.GetFieldCount(); ++i) {
+        value[structure.GetFieldName(i)] = ToJson(*structure.GetField(i));
+      }
+      break;
+    }
+    case MetaType::List: {
+      value = json::array();
+      const auto& list = dynamic_cast<const MetaList&>(object);
+      for (std::size_t i = 0; i < list.GetSize(); ++i) value.push_back(ToJson(*list.GetElement(i)));
+    }
+  }
+  return value;
+}
+
+/// Which commands succeeded and which failed in some test: one that lacks either has no test worth the name.
+std::set<std::string> succeeded;
+std::set<std::string> failed;
+
+void CollectCommands(const Plinth::AutoCli::NamespaceNode& node, const std::string& path,
+                     std::set<std::string>& commands) {
+  const auto& data = Plinth::AutoCli::NodeData::Of(node);
+  if (data.isCommand) commands.insert(path);
+  for (const auto& child : data.children) {
+    CollectCommands(*child.node, path.empty() ? child.name : path + ' ' + child.name, commands);
+  }
+}
+
+/// Commands of which a success or a failure cannot be tested here. This list only ever shrinks.
+const std::set<std::string> kUntested = {
+    "catalogue",   // cannot fail
+    "completion",  // a wrong shell is a usage error
+};
+
+class EveryCommandIsTested : public testing::Environment {
+ public:
+  void TearDown() override {
+    if (testing::GTEST_FLAG(filter) != "*") return;
+    std::set<std::string> commands;
+    CollectCommands(CommandTree(), "", commands);
+    commands.insert(succeeded.begin(), succeeded.end());
+    commands.insert(failed.begin(), failed.end());
+    for (const std::string& name : commands) {
+      if (kUntested.contains(name)) continue;
+      EXPECT_TRUE(succeeded.contains(name)) << name << ": no test in which it succeeds";
+      EXPECT_TRUE(failed.contains(name)) << name << ": no test in which it fails";
+    }
+  }
+};
+
+[[maybe_unused]] const testing::Environment* const kGate =
+    testing::AddGlobalTestEnvironment(new EveryCommandIsTested);
+
+}  // namespace
+
+std::vector<std::string> Outcome::Calls() const {
+  std::vector<std::string> names;
+  for (const std::string& line : trace) names.push_back(line.substr(0, line.find('(')));
+  return names;
+}
+
+std::string WithAnswers(const std::string& description, const std::string& answers) {
+  json host = json::parse(description);
+  for (json& answer : json::parse('[' + answers + ']')) host["answers"].push_back(std::move(answer));
+  return host.dump();
+}
+
+Plinth::AutoCli::Namespace& CommandTree() {
+  static const auto root = [] {
+    auto made = Plinth::AutoCli::Namespace::New();
+    AutoCli_RegisterNamespaces(made);
+    Plinth::RegisterOwnCommands(*made);
+    return made;
+  }();
+  return *root;
+}
+
+Harness::Harness(const std::string& description) {
+  host::Host::Use(host::Host::InMemory(description));
+  host::SetTraceSink([this](const std::string& line) { trace_.push_back(line); });
+}
+
+Harness::~Harness() {
+  host::SetTraceSink(nullptr);
+  host::Host::Use(nullptr);
+}
+
+Outcome Harness::operator()(const std::string& line) { return (*this)(SplitWords(line)); }
+
+Outcome Harness::operator()(const std::vector<std::string>& words) {
+  Plinth::TextConsole console;
+  console.input = input;
+  trace_.clear();
+  Plinth::RunRecord record = Plinth::RunCommandLine(CommandTree(), words, console, {.checked = true});
+  const std::string name = record.executed ? record.path : "";
+  return Finish(std::move(record), console, name);
+}
+
+Outcome Harness::operator()(const std::string& name,
+                            const boost::shared_ptr<Plinth::AutoCli::NamespaceNode>& command,
+                            const std::string& options) {
+  Plinth::TextConsole console;
+  console.input = input;
+  trace_.clear();
+  auto& runnable = dynamic_cast<Plinth::AutoCli::Command&>(*command);
+  return Finish(Plinth::RunCommand(runnable, SplitWords(options), console, {.checked = true}), console, name);
+}
+
+Outcome Harness::Finish(Plinth::RunRecord record, Plinth::TextConsole& console, const std::string& name) {
+  EXPECT_EQ(ima::OutstandingAllocations(), 0u) << name << " kept memory of the management API";
+  if (counts && !name.empty()) {
+    if (record.result) succeeded.insert(name);
+    if (!record.messages.empty() || record.status == Plinth::kFailure) failed.insert(name);
+  }
+  Outcome run;
+  run.status = record.status;
+  run.messages = std::move(record.messages);
+  if (record.result) run.result = ToJson(*record.result);
+  run.closed = record.closed;
+  run.failure = std::move(record.failure);
+  run.trace = trace_;
+  run.out = std::move(console.out.text);
+  run.err = std::move(console.error.text);
+  return run;
+}
+
+json Harness::Show() const { return json::parse(host::Host::Current().Show(true)); }
+
+json Harness::Show(const std::string& pointer) const { return Show().at(json::json_pointer(pointer)); }
+
+TemporaryRoot::TemporaryRoot() {
+  std::string name = (std::filesystem::temp_directory_path() / "hcli-test-XXXXXX").string();
+  if (mkdtemp(name.data()) == nullptr) throw std::runtime_error("no temporary folder " + name);
+  path_ = name;
+  const char* before = std::getenv("HCLI_ROOT");
+  if (before != nullptr) before_ = before;
+  setenv("HCLI_ROOT", path_.c_str(), 1);
+}
+
+TemporaryRoot::~TemporaryRoot() {
+  if (before_.empty()) unsetenv("HCLI_ROOT");
+  if (!before_.empty()) setenv("HCLI_ROOT", before_.c_str(), 1);
+  std::error_code ignored;
+  std::filesystem::remove_all(path_, ignored);
+}
+
+std::string TemporaryRoot::Read(const std::string& file) const {
+  std::ifstream stream(path_ + '/' + file);
+  return {std::istreambuf_iterator<char>(stream), {}};
+}
