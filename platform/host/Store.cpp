@@ -192,10 +192,14 @@ sqlite3_stmt* Store::Prepared(const char* sql) {
   for (const auto& [known, statement] : statements_) {
     if (known == sql) return statement;
   }
-  sqlite3_stmt* statement = nullptr;
+  // It has its place before there is one: a statement that nobody finalizes keeps the database from being
+  // closed.
+  sqlite3_stmt*& statement = statements_.emplace_back(sql, nullptr).second;
   const int code = sqlite3_prepare_v3(database_, sql, -1, 0, &statement, nullptr);
-  if (code != SQLITE_OK) Fail(code);
-  statements_.emplace_back(sql, statement);
+  if (code != SQLITE_OK) {
+    statements_.pop_back();
+    Fail(code);
+  }
   return statement;
 }
 
