@@ -105,8 +105,8 @@ std::string FormatIpv4(const Ipv4Bytes& bytes) {
 }
 
 std::string FormatIpv6(const Ipv6Bytes& bytes) {
-  // inet_ntop is not used: it writes every address below ::/96 with dots, which section 5 keeps for known
-  // prefixes.
+  // inet_ntop is not used: it writes every address below ::/96 with dots, which RFC 5952 section 5
+  // keeps for known prefixes.
   unsigned groups[8];
   for (std::size_t i = 0; i < 8; ++i) groups[i] = bytes[2 * i] * 256u + bytes[2 * i + 1];
   const bool mapped =

@@ -26,7 +26,7 @@ std::optional<Agreement> Negotiate(const OperationalParameters& initiator,
     const auto [least, greatest] = std::minmax(initiator.*rule.value, target.*rule.value);
     agreement.values.*rule.value = rule.result == NegotiationRule::Result::Least ? least : greatest;
   }
-  // Section 13.14: the first burst is a part of a burst.
+  // RFC 7143 section 13.14: the first burst is a part of a burst.
   agreement.values.firstBurstLength =
       std::min(agreement.values.firstBurstLength, agreement.values.maxBurstLength);
   return agreement;
