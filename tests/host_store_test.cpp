@@ -203,6 +203,27 @@ TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
   }
 }
 
+TEST_F(HostStore, WhileAnAdapterIsHeldAllIsReadFromOneState) {
+  MakeHost();
+  CoreCtl::Storage::StorageInfoImpl info;
+  std::unique_ptr<NodeCtl::Storage::ScsiInterface> held(info.GetScsiInterface("hba0"));
+  auto& adapter = dynamic_cast<NodeCtl::Storage::iScsiInterface&>(*held);
+  host::Store other(File());
+  other.SetPatience(0);
+  const auto change = [&] {
+    host::Transaction transaction(other, host::Transaction::Access::Change);
+    other.Execute("UPDATE object SET record = json_set(record, '$.alias', 'theirs') WHERE name = 'hba0'");
+    transaction.Commit();
+  };
+  EXPECT_THAT(WhatFails(change), HasSubstr("is locked by another process."));
+  adapter.SetInitiatorAlias("ours");  // ends what was read before
+  change();
+  EXPECT_EQ(adapter.GetInitiatorAlias(), "theirs");
+  EXPECT_THAT(WhatFails(change), HasSubstr("is locked by another process."));
+  held.reset();
+  change();
+}
+
 TEST(HostTree, ChildrenKeepTheirOrderAndIdsAreNeverUsedAgain) {
   const Harness harness(R"({"adapters": [{"name": "b"}, {"name": "a"}]})");
   Host::Current().Change(host::Call::OnHost("Rediscover"), [](host::Tree& tree) {

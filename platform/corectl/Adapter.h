@@ -78,6 +78,7 @@ class AdapterRef {
   host::Object Find(host::Tree& tree) const;
 
   std::string name_;
+  host::Reading reading_;  // what a command learns of the adapters it holds is of one moment
 };
 
 using host::IsIscsi;

@@ -77,6 +77,7 @@ class Host {
     Tree& GetTree() { return tree_; }
 
    private:
+    Reading reading_;  // so that opening the store and the work itself read once
     Transaction transaction_;
     Tree tree_;
   };

@@ -63,6 +63,17 @@ std::string Words(const std::string& message, int code) {
   return printable ? message : sqlite3_errstr(code);
 }
 
+void RollBack(Store& store) {
+  try {
+    Statement(store, "ROLLBACK").Step();
+  } catch (const std::exception&) {
+    // SQLite has rolled back by itself: after some failures there is no transaction left.
+  }
+}
+
+int readings = 0;
+Store* kept = nullptr;  // the store with a transaction that is open for the sake of them
+
 std::string Reason(int code, int systemError, const std::string& message) {
   switch (code & 0xff) {
     case SQLITE_CORRUPT:
@@ -126,6 +137,7 @@ Store::Store(const std::string& path) : path_(path) {
 Store::~Store() { Close(); }
 
 void Store::Close() {
+  if (kept == this) kept = nullptr;
   for (const auto& [sql, statement] : statements_) sqlite3_finalize(statement);
   sqlite3_close(database_);
 }
@@ -229,8 +241,6 @@ std::string Store::Serialize() {
   return std::string(reinterpret_cast<const char*>(bytes.get()), static_cast<std::size_t>(size));
 }
 
-bool Store::IsInTransaction() const { return sqlite3_get_autocommit(database_) == 0; }
-
 std::int64_t Store::LastId() const { return sqlite3_last_insert_rowid(database_); }
 
 Statement::~Statement() {
@@ -273,29 +283,60 @@ std::string Statement::GetText(int column) const {
              : std::string(text, static_cast<std::size_t>(sqlite3_column_bytes(statement_, column)));
 }
 
-Transaction::Transaction(Store& store, Access access) : store_(store) {
+void Store::EndReading() {
+  if (kept != this) return;
+  kept = nullptr;
+  try {
+    Statement(*this, "COMMIT").Step();
+  } catch (...) {
+    RollBack(*this);
+    throw;
+  }
+}
+
+Reading::Reading() { ++readings; }
+
+Reading::~Reading() {
+  if (--readings > 0 || kept == nullptr) return;
+  try {
+    kept->EndReading();
+  } catch (const std::exception&) {
+    // It has read what it was to read.
+  }
+}
+
+Transaction::Transaction(Store& store, Access access) : store_(store), access_(access) {
   if (access == Access::Read) {
-    Statement(store, "BEGIN").Step();
+    if (kept == &store) {
+      open_ = false;
+    } else {
+      Statement(store, "BEGIN").Step();
+    }
   } else {
+    store.EndReading();
     // Some damage shows as rows that are not there; what is written on top of it would be lost as well. In a
     // large file the look would take many times what a change does.
     if (store.IsSmall()) store.CheckStructure();
     Statement(store, "BEGIN IMMEDIATE").Step();
   }
+  store_.inTransaction_ = true;
 }
 
 Transaction::~Transaction() {
-  if (!open_) return;
-  try {
-    Statement(store_, "ROLLBACK").Step();
-  } catch (const std::exception&) {
-    // SQLite has rolled back by itself: after some failures there is no transaction left.
-  }
+  store_.inTransaction_ = false;
+  if (open_) RollBack(store_);
 }
 
 void Transaction::Commit() {
-  Statement(store_, "COMMIT").Step();
+  if (open_) {
+    if (access_ == Access::Read && readings > 0 && kept == nullptr) {
+      kept = &store_;
+    } else {
+      Statement(store_, "COMMIT").Step();
+    }
+  }
   open_ = false;
+  store_.inTransaction_ = false;
 }
 
 void CreateTables(Store& store) {

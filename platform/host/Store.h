@@ -40,7 +40,9 @@ class Store {
   std::int64_t LastId() const;
   const std::string& GetPath() const { return path_; }
   /// True between the begin and the end of a transaction.
-  bool IsInTransaction() const;
+  bool IsInTransaction() const { return inTransaction_; }
+  /// Ends what a Reading keeps open.
+  void EndReading();
   /// An Error where the file's structure is damaged. Looks once at the whole of it; later calls cost nothing.
   void CheckStructure();
   /// True where looking at the whole file takes no more than a few tenths of a millisecond.
@@ -56,6 +58,7 @@ class Store {
 
  private:
   friend class Statement;
+  friend class Transaction;
   sqlite3_stmt* Prepared(const char* sql);
   int Step(sqlite3_stmt* statement);
   [[noreturn]] void Fail(int code);
@@ -69,6 +72,7 @@ class Store {
   };
   std::string path_;
   bool checked_ = false;
+  bool inTransaction_ = false;
   sqlite3* database_ = nullptr;
   /// By the address of the text: each statement has one place in the code.
   std::vector<std::pair<const char*, sqlite3_stmt*>> statements_;
@@ -99,6 +103,18 @@ class Statement {
   int bound_ = 0;
 };
 
+/// While one of these lives, all that is read comes from one state of the store, at the price of one
+/// transaction: that of the first read stays open for those that follow, until the last of these goes, or
+/// until something is changed. Others cannot write meanwhile, so none should live while a person, or a pipe,
+/// is waited for.
+class Reading {
+ public:
+  Reading();
+  Reading(const Reading&) = delete;
+  Reading& operator=(const Reading&) = delete;
+  ~Reading();
+};
+
 /// What runs in between happens whole, or not at all when Commit is not reached.
 class Transaction {
  public:
@@ -111,6 +127,7 @@ class Transaction {
 
  private:
   Store& store_;
+  Access access_;
   bool open_ = true;
 };
 
