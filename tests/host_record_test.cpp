@@ -9,6 +9,7 @@
 namespace {
 
 using host::Record;
+using testing::ThrowsMessage;
 
 TEST(Record, ACopyIsChangedWithoutTheOriginal) {
   const std::string text = R"({"name":"a","inner":{"key":1},"list":[{"key":2}]})";
@@ -16,7 +17,6 @@ TEST(Record, ACopyIsChangedWithoutTheOriginal) {
     std::function<void(Record&)> change;
     const char* expected;
   } kCases[] = {
-      {[](Record& r) { r.Set("name", "b"); }, R"({"name":"b","inner":{"key":1},"list":[{"key":2}]})"},
       {[](Record& r) { r.Set("inner/key", 3); }, R"({"name":"a","inner":{"key":3},"list":[{"key":2}]})"},
       {[](Record& r) { r.Set("list/0/key", 3); }, R"({"name":"a","inner":{"key":1},"list":[{"key":3}]})"},
       {[](Record& r) { r.Set("inner", r); },
@@ -37,13 +37,10 @@ TEST(Record, ACopyIsChangedWithoutTheOriginal) {
 
 TEST(Record, WhatCannotBeStoredIsNotRepeated) {
   Record record;
-  const std::pair<std::string, const char*> kCases[] = {
-      {"hush\xff", "The text for \"chap/secret\" is not UTF-8."},
-      {std::string("hush\0", 5), "The text for \"chap/secret\" has a zero byte."}};
-  for (const auto& one : kCases) {
-    EXPECT_THAT([&] { record.Set("chap/secret", one.first); },
-                testing::ThrowsMessage<host::Error>(one.second));
-  }
+  EXPECT_THAT([&] { record.Set("chap/secret", "hush\xff"); },
+              ThrowsMessage<host::Error>("The text for \"chap/secret\" is not UTF-8."));
+  EXPECT_THAT([&] { record.Set("chap/secret", std::string("hush\0", 5)); },
+              ThrowsMessage<host::Error>("The text for \"chap/secret\" has a zero byte."));
 }
 
 }  // namespace

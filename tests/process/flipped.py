@@ -5,12 +5,10 @@ import contextlib
 import json
 import os
 import random
-import shutil
 import sqlite3
 import sys
-import tempfile
 
-from support.program import SOURCE, Host, check
+from support.program import SOURCE, Host, beside, check, is_sound, read
 
 CASES = int(sys.argv[1]) if len(sys.argv) > 1 else 25
 SEED = 20261122
@@ -88,17 +86,6 @@ def change_journal(path):
         file.write(begin + random.randbytes(random.choice([0, 1, 20, 512, 9000])))
 
 
-def is_sound(path):
-    """What SQLite itself finds; a copy is looked at, for looking can change the file."""
-    with tempfile.TemporaryDirectory(prefix="hcli-sound-") as folder:
-        with contextlib.closing(sqlite3.connect(shutil.copy(path, folder))) as database:
-            database.text_factory = bytes
-            try:
-                return database.execute("PRAGMA integrity_check").fetchall() == [(b"ok",)]
-            except (sqlite3.DatabaseError, UnicodeDecodeError):  # a schema that is noise
-                return False
-
-
 def judge(what, host, line, changes=False):
     """Runs the line, and holds against its outcome what holds for all."""
     with open(host.database, "rb") as file:
@@ -121,18 +108,11 @@ def judge(what, host, line, changes=False):
 
 def main():
     random.seed(SEED)
-    with open(os.path.join(SOURCE, "hosts/demo.json"), encoding="utf-8") as file:
-        description = json.load(file)
+    description = json.loads(read(os.path.join(SOURCE, "hosts/demo.json")))
     for adapter in description["adapters"]:
         adapter["alias"] = MARK
-    host = Host()
-    path = os.path.join(host.root, "own.json")
-    with open(path, "w", encoding="utf-8") as file:
-        json.dump(description, file)
-    host.succeed(f"simulator load {path}")
-    whole = os.path.join(host.root, "whole.db")
-    shutil.copy(host.database, whole)
-    with open(whole, "rb") as file:
+    host = Host(description)
+    with open(host.database, "rb") as file:
         old = file.read()
 
     def write(changed):
@@ -146,7 +126,7 @@ def main():
         outcomes = {"shown": 0, "refused": 0}
         cases = random.sample(cases, min(len(cases), 3 * CASES if kind == "row" else CASES))
         for number, change in enumerate(cases):
-            for name in os.listdir(os.path.dirname(host.database)):
+            for name in beside(host.database):
                 os.remove(os.path.join(os.path.dirname(host.database), name))
             write(old)
             change()

@@ -8,7 +8,7 @@ import json
 import os
 import sys
 
-from support.program import SOURCE, Host
+from support.program import SOURCE, Host, read, write
 
 GOLDEN = os.path.join(SOURCE, "tests/golden")
 FORMATS = ["simple", "table", "json"]
@@ -68,24 +68,19 @@ def catalogue(host, path):
 
 
 def main():
-    host, faults, update = Host(os.path.join(GOLDEN, "host.json")), [], os.environ.get("UPDATE_GOLDEN") == "1"
+    host, faults = Host(json.loads(read(os.path.join(GOLDEN, "host.json")))), []
     texts = {name: "".join(transcript(host, line, faults) for line in lines) for name, lines in CASES.items()}
     texts["catalogue"] = catalogue(host, "iscsi adapter auth chap set")
     for name, text in texts.items():
         path = os.path.join(GOLDEN, name + ".txt")
-        expected = ""
-        if os.path.exists(path):
-            with open(path, encoding="utf-8", newline="") as file:
-                expected = file.read()
+        expected = read(path) if os.path.exists(path) else ""
         difference = "".join(difflib.unified_diff(expected.splitlines(True), text.splitlines(True), path, "now"))
-        if difference and update:
-            with open(path, "w", encoding="utf-8", newline="") as file:
-                file.write(text)
+        if difference and os.environ.get("UPDATE_GOLDEN") == "1":
+            write(path, text)
             print(difference)
         elif difference:
             faults.append(difference + "If this is meant: UPDATE_GOLDEN=1 ctest -R process.golden, and read the diff.")
     sys.exit("\n".join(faults) if faults else 0)
 
 
-if __name__ == "__main__":
-    main()
+main()

@@ -4,26 +4,20 @@ import json
 import os
 import tempfile
 
-from support.program import check, run
+from support.program import Host, check, run
 
 with tempfile.TemporaryDirectory(prefix="hcli installed ") as folder:
-    installed, moved, root = (os.path.join(folder, name) for name in ("installed", "moved away", "root"))
+    installed, moved = os.path.join(folder, "installed"), os.path.join(folder, "moved away")
     done = run("cmake", "--install", os.environ["HCLI_BUILD_DIR"], "--prefix", installed)
     check(done.returncode == 0, done.stderr)
     os.rename(installed, moved)
-    os.mkdir(root)
+    host = Host()
     hcli = os.path.join(moved, "bin", "hcli")
-
-    catalogue = run(hcli, "catalogue", "--output", "json", HCLI_ROOT=root)
-    paths = {node["path"] for node in json.loads(catalogue.stdout)["result"]}
-    for path in "iscsi adapter list", "simulator load", "catalogue":
-        check(path in paths, f"no '{path}' in the catalogue; standard error: {catalogue.stderr}")
-
-    adapters = run(hcli, "iscsi", "adapter", "list", "--output", "json", HCLI_ROOT=root)
-    check(adapters.returncode == 0 and json.loads(adapters.stdout)["result"], adapters)
-    check(adapters.stderr == "", adapters.stderr)
-    check(os.path.exists(os.path.join(root, "var/lib/tessaro/host.db")), "the host was not kept below HCLI_ROOT")
-
+    catalogue = json.loads(host.succeed("catalogue --output json", executable=hcli))
+    missing = {"iscsi adapter list", "simulator load", "catalogue"} - {node["path"] for node in catalogue["result"]}
+    check(not missing, f"not in the catalogue: {missing}")
+    check("hba0" in host.succeed("iscsi adapter list", executable=hcli), "no demo host")
+    check(os.path.exists(host.database), "the host was not kept below HCLI_ROOT")
     # Nothing in the tree may lead back to where it was built.
     for path, _, names in os.walk(moved):
         for file in (os.path.join(path, name) for name in names):

@@ -6,6 +6,8 @@ import subprocess
 import sys
 import tempfile
 
+from support.program import SOURCE, write
+
 LISTS = """cmake_minimum_required(VERSION 3.25)
 project(small LANGUAGES NONE)
 add_custom_command(OUTPUT bin/hcli DEPENDS ${PROJECT_SOURCE_DIR}/hcli
@@ -17,11 +19,6 @@ PRESETS = """{"version": 6, "configurePresets": [
   {"name": "release", "generator": "Ninja", "binaryDir": "${sourceDir}/build/release"}]}
 """
 PROGRAM = '#!/bin/sh\necho "root $HCLI_ROOT"\nprintf "%s|" "$@"\nexit 3\n'
-
-
-def write(path, text):
-    with open(path, "w", encoding="utf-8") as file:
-        file.write(text)
 
 
 def start(tree, *words, **environment):
@@ -39,7 +36,7 @@ def expect(name, process, status, out, err):
 
 with tempfile.TemporaryDirectory(prefix="hcli with blanks ") as folder:
     tree = os.path.join(os.path.realpath(folder), "a tree")
-    shutil.copytree(os.path.join(os.environ["HCLI_SOURCE_DIR"], "scripts"), os.path.join(tree, "scripts"))
+    shutil.copytree(os.path.join(SOURCE, "scripts"), os.path.join(tree, "scripts"))
     program = os.path.join(tree, "hcli")
     write(os.path.join(tree, "CMakeLists.txt"), LISTS)
     write(os.path.join(tree, "CMakePresets.json"), PRESETS)

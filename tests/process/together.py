@@ -1,120 +1,87 @@
 """Several hcli at once on one host: no change is lost, nobody is turned away, and one first run makes the host.
 together.py [SECONDS] lets eight writers and eight readers work for so long."""
 
-import os
+import itertools
 import sys
-import threading
 import time
+from concurrent.futures import ThreadPoolExecutor
 
-from support.program import Host, check
+from support.program import SET_NAME, Host, beside, check, finished, read, succeeded
 
 ADAPTERS = 4  # writers share them, so that they change the same lists
+SENDTARGET = "iscsi adapter discovery sendtarget"
 
 
-def description(folder):
-    path = os.path.join(folder, "host.json")
-    capabilities = '{"Name And Alias Settable": true, "Sendtarget Discovery Settable": true}'
-    with open(path, "w", encoding="utf-8") as file:
-        rows = [f'{{"name": "hba{number}", "capabilities": {capabilities}}}' for number in range(ADAPTERS)]
-        file.write(f'{{"adapters": [{", ".join(rows)}]}}')
-    return path
+def address(number, count):
+    return f"10.{number}.{count // 250}.{count % 250 + 1}:3260"
 
 
-class Worker(threading.Thread):
-    """Runs one command line after the other, at least two, until the time is over or one fails."""
-
-    def __init__(self, host, number, until):
-        super().__init__()
-        self.host, self.number, self.until = host, number, until
-        self.done, self.fault = 0, None
-        self.start()
-
-    def run(self):
-        while (self.done < 2 or time.monotonic() < self.until) and not self.fault:
-            line = self.line(self.done + 1)
-            done = self.host.run(line)
-            if done.returncode != 0 or done.stderr or not done.stdout:
-                self.fault = done
-            else:
-                self.done += 1
+def writing(number, count):
+    """Every third removes what the one before it has added."""
+    verb, count = ("add", count) if count % 3 else ("remove", count - 1)
+    return f"{SENDTARGET} {verb} -A hba{number % ADAPTERS} -a {address(number, count)}"
 
 
-class Writer(Worker):
-    def address(self, count):
-        return f"10.{self.number}.{count // 250}.{count % 250 + 1}:3260"
-
-    def line(self, count):
-        adapter = self.number % ADAPTERS
-        if count % 3 == 0:
-            return f"iscsi adapter discovery sendtarget remove -A hba{adapter} -a {self.address(count - 1)}"
-        return f"iscsi adapter discovery sendtarget add -A hba{adapter} -a {self.address(count)}"
-
-    def expected(self):
-        kept = {count for count in range(1, self.done + 1) if count % 3 != 0}
-        kept -= {count - 1 for count in range(3, self.done + 1, 3)}
-        return {(f"hba{self.number % ADAPTERS}", self.address(count)) for count in kept}
+def reading(_, count):
+    return ["iscsi adapter list", f"{SENDTARGET} list", "simulator show"][count % 3]
 
 
-class Reader(Worker):
-    def line(self, count):
-        return ["iscsi adapter list", "iscsi adapter discovery sendtarget list", "simulator show"][count % 3]
+def sendtargets(host):
+    rows = [(row["Adapter"], row["Sendtarget"]) for row in host.result(f"{SENDTARGET} list")]
+    check(len(rows) == len(set(rows)), "twice in", rows)
+    return set(rows)
 
 
 def work(writers, readers, seconds=1.5):
-    host = Host()
-    host.succeed(f"simulator load {description(host.root)}")
+    capabilities = {"Name And Alias Settable": True, "Sendtarget Discovery Settable": True}
+    host = Host({"adapters": [{"name": f"hba{number}", "capabilities": capabilities} for number in range(ADAPTERS)]})
     until = time.monotonic() + seconds
-    workers = [Writer(host, number, until) for number in range(writers)]
-    workers += [Reader(host, number, until) for number in range(readers)]
-    for worker in workers:
-        worker.join()
-        check(not worker.fault, f"{writers} writers, {readers} readers:", worker.fault)
-    expected = set().union(*(worker.expected() for worker in workers if isinstance(worker, Writer)))
-    rows = host.result("iscsi adapter discovery sendtarget list")
-    found = {(row["Adapter"], row["Sendtarget"]) for row in rows}
-    check(found == expected and len(rows) == len(found), f"lost {expected - found}, too many {found - expected}")
-    counts = [sum(worker.done for worker in workers if isinstance(worker, kind)) for kind in (Writer, Reader)]
-    print(f"{writers} writers made {counts[0]} changes, {readers} readers read {counts[1]} times")
+
+    def worker(line, number):
+        """Runs one command line after the other, at least two, until the time is over; returns how many."""
+        for count in itertools.count(1):
+            if count > 2 and time.monotonic() >= until:
+                return count - 1
+            check(host.succeed(line(number, count)), "no result of", line(number, count))
+
+    with ThreadPoolExecutor(writers + readers) as pool:
+        tasks = [pool.submit(worker, *task) for task in
+                 [(writing, number) for number in range(writers)] + [(reading, 0)] * readers]
+    done = [task.result() for task in tasks]
+    expected = {(f"hba{number % ADAPTERS}", address(number, count)) for number in range(writers)
+                for count in range(1, done[number] + 1) if count % 3 == 1 or count % 3 == 2 and count == done[number]}
+    found = sendtargets(host)
+    check(found == expected, f"lost {expected - found}, too many {found - expected}")
+    print(f"{writers} writers made {sum(done[:writers])} changes, {readers} readers read {sum(done[writers:])} times")
+
+
+def at_once(host, lines):
+    for process in [host.start(line) for line in lines]:
+        succeeded(finished(process))
 
 
 def first_runs(count):
     host = Host()
-    processes = [host.start(f"iscsi adapter discovery sendtarget add -A hba2 -a 10.0.0.{number}:3260")
-                 for number in range(1, count + 1)]
-    for process in processes:
-        out, err = process.communicate(timeout=60)
-        check(process.returncode == 0 and not err, "a first run of several:", process.returncode, out, err)
-    addresses = {row["Sendtarget"] for row in host.result("iscsi adapter discovery sendtarget list")}
-    missing = {f"10.0.0.{number}:3260" for number in range(1, count + 1)} - addresses
+    at_once(host, [f"{SENDTARGET} add -A hba2 -a 10.0.0.{number}:3260" for number in range(count)])
+    missing = {("hba2", f"10.0.0.{number}:3260") for number in range(count)} - sendtargets(host)
     check(not missing, f"first runs at once: the changes with {missing} are lost")
-    files = os.listdir(os.path.dirname(host.database))
-    check(files == ["host.db"], f"first runs at once leave {files}")
+    check(not beside(host.database), f"first runs at once leave {beside(host.database)}")
 
 
 def names_at_once(count):
     host = Host()
-    path = os.path.join(host.root, "etc/tessaro/coreiscsid/initiatorname.iscsi")
-    names = [f"iqn.2026-11.org.example:host{number}" for number in range(count)]
-    processes = [host.start(f"iscsi software set --enabled true --name {name}") for name in names]
-    for process in processes:
-        out, err = process.communicate(timeout=60)
-        check(process.returncode == 0 and not err, "names at once:", process.returncode, out, err)
-    with open(path, encoding="utf-8") as file:
-        found = file.read()
-    check(found in {f"InitiatorName={name}\n" for name in names}, "names at once made", found)
-    check(os.listdir(os.path.dirname(path)) == [os.path.basename(path)], os.listdir(os.path.dirname(path)))
+    lines = [f"{SET_NAME}{number}" for number in range(count)]
+    at_once(host, lines)
+    check(read(host.names) in {f"InitiatorName={line.split()[-1]}\n" for line in lines}, "made", read(host.names))
+    check(not beside(host.names), f"names at once leave {beside(host.names)}")
 
 
-def main():
-    if len(sys.argv) > 1:
-        return work(8, 8, float(sys.argv[1]))
+if len(sys.argv) > 1:
+    work(8, 8, float(sys.argv[1]))
+else:
     for _ in range(3):
         first_runs(8)
         names_at_once(8)
     work(1, 1)
     work(2, 0)
     work(5, 3)
-
-
-if __name__ == "__main__":
-    sys.exit(main())

@@ -10,7 +10,9 @@ import subprocess
 import sys
 import tempfile
 
-PAGE = os.path.join(os.environ["HCLI_SOURCE_DIR"], "docs/tutorial.md")
+from support.program import HCLI, SOURCE, check, read, write
+
+PAGE = os.path.join(SOURCE, "docs/tutorial.md")
 TIME = re.compile(r"\d\d/\d\d/\d\d \d\d:\d\d:\d\d")
 MASK = "MM/DD/YY hh:mm:ss"  # the page says so too
 
@@ -28,19 +30,16 @@ def block(text, environment):
     return "".join(f"$ {command}\n{shown(command, environment)}" for command in commands)
 
 
-with open(PAGE, encoding="utf-8") as file:
-    page = file.read()
+page = read(PAGE)
 with tempfile.TemporaryDirectory(prefix="hcli tutorial ") as root:
-    path = os.path.dirname(os.environ["HCLI_BIN"]) + os.pathsep + os.environ["PATH"]
+    path = os.path.dirname(HCLI) + os.pathsep + os.environ["PATH"]
     environment = {**os.environ, "PATH": path, "HCLI_ROOT": root, "COLUMNS": "120"}
     parts = re.split(r"(?ms)^(```console\n)(.*?)(?=^```$)", page)
-    if len(parts) < 4:
-        sys.exit(f"{PAGE} has no block of commands")
+    check(len(parts) > 3, f"{PAGE} has no block of commands")
     for i in range(2, len(parts), 3):
         parts[i] = block(parts[i], environment)
     run = "".join(parts)
 if run != page and os.environ.get("HCLI_WRITE_DOCS"):
-    with open(PAGE, "w", encoding="utf-8") as file:
-        file.write(run)
+    write(PAGE, run)
 elif run != page:
     sys.exit("".join(difflib.unified_diff(page.splitlines(True), run.splitlines(True), "the page", "the program")))
