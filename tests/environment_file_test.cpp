@@ -1,8 +1,6 @@
 #include <CoreCtl/Util.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/stat.h>
-#include <unistd.h>
 
 #include <cstdio>
 #include <filesystem>
@@ -97,17 +95,6 @@ TEST_F(EnvironmentFile, RefusesWhatItCannotKeep) {
   // It still holds what was read before.
   file.Save();
   EXPECT_EQ(Contents(), "A=1\n");
-}
-
-TEST_F(EnvironmentFile, OwnerAndModeStay) {
-  Write("A=1\n");
-  const uid_t owner = geteuid() == 0 ? 4321 : geteuid();
-  ASSERT_EQ(chmod(File().c_str(), 0646) + chown(File().c_str(), owner, static_cast<gid_t>(-1)), 0);
-  Store("A", "2");
-  struct stat status {};
-  EXPECT_EQ(stat(File().c_str(), &status), 0);
-  EXPECT_EQ(status.st_mode & 07777, 0646u);
-  EXPECT_EQ(status.st_uid, owner);
 }
 
 }  // namespace

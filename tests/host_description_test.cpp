@@ -42,7 +42,6 @@ TEST(HostDescription, FaultsNameTheirPath) {
   } cases[] = {
       {"", "not a JSON document: parse error at line 1, column 1"},
       {"{\n\"adapters\": [,]}", "not a JSON document: parse error at line 2"},
-      {"{} {}", "not a JSON document"},
       {R"({"state": 1e999})", "the document has a number that is too large"},
       {"[]", "expected an object in braces"},
       {R"({"adapters": {}})", "adapters: expected a list"},
@@ -89,8 +88,6 @@ TEST(HostDescription, FaultsOfAnswersAndAdaptersNameTheirPath) {
     const char* fault;
   } adapters[] = {
       {R"("capabilities": {"MTU Settable": "yes"})", ".capabilities.MTU Settable: expected true or false"},
-      {R"("capabilities": {"Subnet Mask Settable": true})",
-       ".capabilities.Subnet Mask Settable: unknown key; did you mean \"Subnet Mask Setttable\"?"},
       {R"("kind": "soft")", ".kind: expected one of \"independent\", \"dependent\", \"software\", \"scsi\""},
       {R"("state": 2147483648)", ".state: expected a whole number from -2147483648 to 2147483647"},
       {R"("state": 18446744073709551615)", ".state: expected a whole number"},

@@ -8,6 +8,7 @@
 #include <fstream>
 #include <memory>
 #include <new>
+#include <utility>
 
 #include "host/Host.h"
 #include "ima/Memory.h"
@@ -36,17 +37,8 @@ std::unique_ptr<iScsiInterface> Adapter(const std::string& name) {
       dynamic_cast<iScsiInterfaceImpl*>(StorageInfoImpl().GetScsiInterface(name)));
 }
 
-/// The host, and the trace of what is called on it.
-struct Traced {
-  explicit Traced(const std::string& description) : harness(description) {
-    host::SetTraceSink([this](const std::string& line) { trace.push_back(line); });
-  }
-  std::vector<std::string> trace;
-  Harness harness;  // ends the trace when it goes
-};
-
 TEST(HostOperation, TheTraceTellsEachCallAndItsOutcome) {
-  const Traced host(With(
+  const Harness host(With(
       R"("answers": [{"operation": "GetCapabilities", "throw": "NodeCtlException", "text": "no\nway"}])"));
   const auto adapter = Adapter("hba0");
   adapter->SetInitiatorAlias("a \"b\"\x01");
@@ -70,10 +62,10 @@ TEST(HostOperation, TheTraceTellsEachCallAndItsOutcome) {
 }
 
 TEST(HostOperation, AnswersAreForTheirOperationAdapterAndCall) {
-  const Traced host(With(R"("answers": [
-      {"operation": "GetAdapterState", "adapter": "hba0", "call": 2, "throw": "NodeCtlException", "text": "second"},
+  const Harness host(With(R"("answers": [
+      {"operation": "GetAdapterState", "adapter": "hba0", "call": 2, "throw": "NodeCtlException"},
       {"operation": "GetInitiatorName", "call": 3, "throw": "bad_alloc"},
-      {"operation": "GetScsiInterface", "adapter": "hba1", "call": 2, "throw": "NodeCtlException", "text": "x"}])"));
+      {"operation": "GetScsiInterface", "adapter": "hba1", "call": 2, "throw": "NodeCtlException"}])"));
   const auto hba0 = Adapter("hba0");
   const auto hba1 = Adapter("hba1");
   hba1->GetAdapterState();
@@ -84,11 +76,10 @@ TEST(HostOperation, AnswersAreForTheirOperationAdapterAndCall) {
   hba1->GetInitiatorName();
   EXPECT_THROW(hba0->GetInitiatorName(), std::bad_alloc);
   EXPECT_THROW(Adapter("hba1"), NodeCtlException);
-  EXPECT_EQ(host.trace.back(), "GetScsiInterface(\"hba1\") ! NodeCtlException: x");
 }
 
 TEST(HostOperation, Adapters) {
-  const Traced host(With(R"("softwareIscsi": {"enabled": true})"));
+  const Harness host(With(R"("softwareIscsi": {"enabled": true})"));
   const std::unique_ptr<ScsiInterface> disk(StorageInfoImpl().GetScsiInterface("disk0"));
   EXPECT_EQ(dynamic_cast<iScsiInterfaceImpl*>(disk.get()), nullptr);
   EXPECT_EQ(disk->GetName() + disk->GetAdapterUid() + disk->GetDriverName(), "disk0ud");
@@ -106,10 +97,10 @@ TEST(HostOperation, TheSoftwareAdapterComesAndGoesWithTheInitiator) {
   std::filesystem::create_directories(root.Path() + "/etc/tessaro/coreiscsid");
   std::ofstream(root.Path() + "/etc/tessaro/coreiscsid/initiatorname.iscsi")
       << "InitiatorName='iqn.2001-04.com.example:it'\n";
-  const Traced host(With(R"("softwareIscsi": {"enabled": false})"));
+  const Harness host(With(R"("softwareIscsi": {"enabled": false})"));
   StorageInfoImpl().EnableSoftwareiScsi(false);
   EXPECT_EQ(Adapter("hba2")->GetInitiatorName(), "iqn.2001-04.com.example:it");
-  auto description = host.harness.Show();
+  auto description = host.Show();
   EXPECT_EQ(description["adapters"].size(), 4u);
   description["softwareIscsi"] = {{"enabled", false}};
   host::Host::Current().Load(description.dump());
@@ -117,17 +108,15 @@ TEST(HostOperation, TheSoftwareAdapterComesAndGoesWithTheInitiator) {
 }
 
 TEST(Ima, CallsGiveTheirFailuresAsStatus) {
-  const Traced host("{}");
-  const auto call = [](std::int64_t id) {
-    return ima::Read(host::Call::Ima("IMA_GetLhbaProperties", id, {id}),
-                     [&](host::Tree& tree) { tree.Get(id, host::Kind::Adapter); });
+  const Harness host("{}");
+  IMA_LHBA_PROPERTIES properties;
+  const auto call = [&](std::int64_t id) {
+    return IMA_GetLhbaProperties(ima::Oid(IMA_OBJECT_TYPE_LHBA, id), &properties);
   };
   EXPECT_EQ(call(host::kRoot), IMA_ERROR_INCORRECT_OBJECT_TYPE);
   EXPECT_EQ(call(999), IMA_ERROR_OBJECT_NOT_FOUND);
-  EXPECT_EQ(host.trace.back(), "IMA_GetLhbaProperties(999) = 0x80000007");
-  EXPECT_EQ(
-      ima::Read(host::Call::Ima("IMA_GetLhbaProperties", 0), [](host::Tree&) { throw std::bad_alloc(); }),
-      IMA_ERROR_INSUFFICIENT_MEMORY);
+  EXPECT_EQ(host.trace.back(), "IMA_GetLhbaProperties(lhba 999) = 0x80000007");
+  EXPECT_EQ(ima::StatusOf([] { throw std::bad_alloc(); }), IMA_ERROR_INSUFFICIENT_MEMORY);
 }
 
 TEST(Ima, MemoryIsTakenBackOnce) {
@@ -143,31 +132,26 @@ TEST(Ima, MemoryIsTakenBackOnce) {
 }
 
 TEST(TextHelpers, CharacterSets) {
-  for (const auto& [narrow, wide] : std::initializer_list<std::pair<const char*, const wchar_t*>>{
-           {"", L""},
-           {"a\x7f", L"a\x7f"},
-           {"\xc2\x80", L"\x80"},
-           {"\xdf\xbf\xe0\xa0\x80", L"\x7ff\x800"},
-           {"\xed\x9f\xbf\xee\x80\x80\xef\xbf\xbf", L"\xd7ff\xe000\xffff"},
-           {"\xf0\x90\x80\x80\xf4\x8f\xbf\xbf", L"\x10000\x10ffff"}}) {
-    wchar_t* toWide = nullptr;
-    char* toNarrow = nullptr;
-    ASSERT_TRUE(CodeSet_UTF8ToUTF32(narrow, &toWide)) << narrow;
-    ASSERT_TRUE(CodeSet_UTF32ToUTF8(wide, &toNarrow)) << narrow;
-    EXPECT_STREQ(toWide, wide);
-    EXPECT_STREQ(toNarrow, narrow);
-    std::free(toWide);
-    std::free(toNarrow);
-  }
+  // The least and the greatest of each length, and those beside the surrogates.
+  const char narrow[] =
+      "\x01\x7f\xc2\x80\xdf\xbf\xe0\xa0\x80\xed\x9f\xbf\xee\x80\x80\xef\xbf\xbf\xf0\x90\x80\x80"
+      "\xf4\x8f\xbf\xbf";
+  const wchar_t wide[] = L"\x01\x7f\x80\x7ff\x800\xd7ff\xe000\xffff\x10000\x10ffff";
   wchar_t* toWide = nullptr;
+  char* toNarrow = nullptr;
+  ASSERT_TRUE(CodeSet_UTF8ToUTF32(narrow, &toWide));
+  ASSERT_TRUE(CodeSet_UTF32ToUTF8(wide, &toNarrow));
+  EXPECT_STREQ(toWide, wide);
+  EXPECT_STREQ(toNarrow, narrow);
+  std::free(std::exchange(toWide, nullptr));
+  std::free(std::exchange(toNarrow, nullptr));
   for (const char* malformed : {"\x80", "\xc0\x80", "\xc3", "\xc3(", "\xe0\x9f\xbf", "\xed\xa0\x80",
                                 "\xf0\x8f\xbf\xbf", "\xf4\x90\x80\x80", "\xf5\x80\x80\x80", "ok\xff"}) {
     EXPECT_FALSE(CodeSet_UTF8ToUTF32(malformed, &toWide)) << malformed;
   }
-  char* toNarrow = nullptr;
   for (const int malformed : {0xd800, 0xdfff, 0x110000, -1}) {
-    const wchar_t wide[] = {L'a', static_cast<wchar_t>(malformed), 0};
-    EXPECT_FALSE(CodeSet_UTF32ToUTF8(wide, &toNarrow)) << malformed;
+    const wchar_t text[] = {L'a', static_cast<wchar_t>(malformed), 0};
+    EXPECT_FALSE(CodeSet_UTF32ToUTF8(text, &toNarrow)) << malformed;
   }
   EXPECT_TRUE(toWide == nullptr && toNarrow == nullptr);
 }

@@ -15,6 +15,7 @@
 
 using host::Host;
 using testing::HasSubstr;
+using testing::ThrowsMessage;
 
 namespace {
 
@@ -60,12 +61,8 @@ TEST_F(HostStore, ALockThatStaysIsTold) {
   const host::Transaction lock(other, host::Transaction::Access::Change);
   Host::Current().GetStore().SetPatience(10);
   EXPECT_NO_THROW(Host::Current().Show(true));  // who writes does not keep readers out
-  try {
-    SetAlias("x");
-    ADD_FAILURE() << "the lock is ignored";
-  } catch (const NodeCtl::Lib::NodeCtlException& error) {
-    EXPECT_THAT(error.what(), HasSubstr(File() + " is locked by another process."));
-  }
+  EXPECT_THAT([] { SetAlias("x"); }, ThrowsMessage<NodeCtl::Lib::NodeCtlException>(
+                                         HasSubstr(File() + " is locked by another process.")));
 }
 
 TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {

@@ -8,7 +8,7 @@ import random
 import sqlite3
 import sys
 
-from support.program import SOURCE, Host, beside, check, is_sound, read
+from support.program import SOURCE, Host, beside, check, contents, is_sound, read
 
 CASES = int(sys.argv[1]) if len(sys.argv) > 1 else 25
 SEED = 20261122
@@ -112,8 +112,7 @@ def main():
     for adapter in description["adapters"]:
         adapter["alias"] = MARK
     host = Host(description)
-    with open(host.database, "rb") as file:
-        old = file.read()
+    old = contents(host.root)[host.database]
 
     def write(changed):
         with open(host.database, "wb") as file:

@@ -8,7 +8,7 @@ import json
 import os
 import sys
 
-from support.program import SOURCE, Host, read, write
+from support.program import SOURCE, Host, finished, read, write
 
 GOLDEN = os.path.join(SOURCE, "tests/golden")
 FORMATS = ["simple", "table", "json"]
@@ -31,9 +31,8 @@ CASES = {
 
 def piped(host, line, locale):
     """Standard output, standard error and status, with every byte."""
-    process = host.start(line, env=host.environment(LC_ALL=locale), text=False, encoding=None)
-    out, err = process.communicate(timeout=60)
-    return out, err, process.returncode
+    done = finished(host.start(line, env=host.environment(LC_ALL=locale), text=False, encoding=None))
+    return done.stdout, done.stderr, done.returncode
 
 
 def section(title, text):

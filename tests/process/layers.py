@@ -1,10 +1,11 @@
 """The arrows between the folders run downward only: each folder includes what its row allows, and nothing else."""
 
+import glob
 import os
 import re
-import sys
 
-SOURCE = os.environ["HCLI_SOURCE_DIR"]
+from support.program import SOURCE, check, read
+
 # folder: the folders that it may include from, and the libraries beyond the standard one
 FRAMEWORK = ["contracts/Plinth"]
 LIBRARY = ["contracts/NodeCtl", "contracts/CoreCtl", "contracts/ima", "contracts/text", "platform/host"]
@@ -24,13 +25,6 @@ LIBRARIES = re.compile(r"boost/|nlohmann/|sqlite3|gtest/|gmock/|benchmark/")
 INCLUDE = re.compile(r'\s*#\s*include\s*[<"]([^>"]+)[>"]')
 
 
-def sources(folder):
-    for path, _, names in os.walk(os.path.join(SOURCE, folder)):
-        for name in sorted(names):
-            if name.endswith((".h", ".cpp")):
-                yield os.path.relpath(os.path.join(path, name), SOURCE)
-
-
 def meant(including, name):
     """The project's files that an include may mean: beside the including file, or below an include root."""
     places = [os.path.dirname(including)] + ROOTS
@@ -40,24 +34,21 @@ def meant(including, name):
 
 def faults():
     for folder, (allowed, libraries) in RULES.items():
-        files = list(sources(folder))
-        if not files:
-            yield f"{folder}: no sources found"
+        files = glob.glob(f"{folder}/**/*.h", root_dir=SOURCE, recursive=True)
+        files += glob.glob(f"{folder}/**/*.cpp", root_dir=SOURCE, recursive=True)
+        check(files, f"{folder}: no sources found")
         for file in files:
-            for number, line in enumerate(open(os.path.join(SOURCE, file), encoding="utf-8"), 1):
+            for number, line in enumerate(read(os.path.join(SOURCE, file)).splitlines(), 1):
                 if folder in ("platform/plinth", "platform/hcli") and "iscsi" in line.lower():
                     yield f"{file}:{number}: the framework must know nothing of what its plug-ins manage"
                 include = INCLUDE.match(line)
-                if not include:
-                    continue
-                name = include.group(1)
+                name = include.group(1) if include else ""
                 found = meant(file, name)
                 if found and not any(f.startswith(a + "/") for f in found for a in allowed):
                     yield f"{file}:{number}: includes {found[0]}; {folder} may use {', '.join(allowed)}"
-                if not found and LIBRARIES.match(name) and not any(name.startswith(l) for l in libraries):
+                if not found and LIBRARIES.match(name) and not name.startswith(tuple(libraries)):
                     yield f"{file}:{number}: includes {name}, which {folder} does not use"
 
 
 found = list(faults())
-print("\n".join(found) or "every include points downward")
-sys.exit(1 if found else 0)
+check(not found, *found)

@@ -3,10 +3,9 @@
 import os
 import shutil
 import subprocess
-import sys
 import tempfile
 
-from support.program import SOURCE, write
+from support.program import SOURCE, check, finished, write
 
 LISTS = """cmake_minimum_required(VERSION 3.25)
 project(small LANGUAGES NONE)
@@ -29,9 +28,8 @@ def start(tree, *words, **environment):
 
 def expect(name, process, status, out, err):
     """Standard output is held against `out` to the letter; standard error needs to have `err` in it."""
-    seen = process.communicate(timeout=120)
-    if process.returncode != status or seen[0] != out or err not in seen[1] or (not err and seen[1]):
-        sys.exit(f"{name}: status {process.returncode}, output {seen[0]!r}, errors {seen[1]!r}")
+    done = finished(process)
+    check((done.returncode, done.stdout) == (status, out) and err in done.stderr and bool(err) == bool(done.stderr), name, done)
 
 
 with tempfile.TemporaryDirectory(prefix="hcli with blanks ") as folder:
@@ -45,11 +43,9 @@ with tempfile.TemporaryDirectory(prefix="hcli with blanks ") as folder:
     own_root = f"root {tree}/build/root\n"
 
     both = start(tree, "first"), start(tree, "second")
-    texts = [process.communicate(timeout=120) for process in both]
-    if [text[0] for text in texts] != [own_root + "first|", own_root + "second|"]:
-        sys.exit(f"two first runs at once: {texts}")
-    if sorted(bool(text[1]) for text in texts) != [False, True]:
-        sys.exit(f"one of the two should have said that it builds: {texts}")
+    done = [finished(process) for process in both]
+    check([each.stdout for each in done] == [own_root + "first|", own_root + "second|"], "two first runs at once", done)
+    check([bool(each.stderr) for each in done].count(True) == 1, "one of the two should have said that it builds", done)
 
     expect("arguments as given", start(tree, "", "a b", "--x=*"), 3, own_root + "|a b|--x=*|", "")
     given = os.path.join(folder, "given")

@@ -9,6 +9,8 @@
 #include "host/Host.h"
 #include "ima/Memory.h"
 #include "plinth/Declarations.h"
+#include "plinth/Formatter.h"
+#include "plinth/OwnCommands.h"
 #include "support/Words.h"
 
 extern "C" void AutoCli_RegisterNamespaces(boost::shared_ptr<Plinth::AutoCli::Namespace> parent);
@@ -25,7 +27,6 @@ json ValueOf(const MetaObject& object) {
 }
 
 json ToJson(const MetaObject& object) {
-  json value;
   switch (object.GetType()) {
     case MetaType::Bool:
       return ValueOf<MetaBool>(object);
@@ -34,34 +35,25 @@ json ToJson(const MetaObject& object) {
     case MetaType::String:
       return ValueOf<MetaString>(object);
     case MetaType::Struct: {
-      value = json::object();
+      json fields = json::object();
       const auto& structure = dynamic_cast<const MetaStruct&>(object);
       for (std::size_t i = 0; i < structure.GetFieldCount(); ++i) {
-        value[structure.GetFieldName(i)] = ToJson(*structure.GetField(i));
+        fields[structure.GetFieldName(i)] = ToJson(*structure.GetField(i));
       }
-      break;
+      return fields;
     }
     case MetaType::List: {
-      value = json::array();
-      const auto& list = dynamic_cast<const MetaList&>(object);
-      for (std::size_t i = 0; i < list.GetSize(); ++i) value.push_back(ToJson(*list.GetElement(i)));
+      json elements = json::array();
+      Plinth::ForEachElement(object, [&](const MetaObject& element) { elements.push_back(ToJson(element)); });
+      return elements;
     }
   }
-  return value;
+  return {};
 }
 
 /// Which commands succeeded and which failed in some test: one that lacks either has no test worth the name.
 std::set<std::string> succeeded;
 std::set<std::string> failed;
-
-void CollectCommands(const Plinth::AutoCli::NamespaceNode& node, const std::string& path,
-                     std::set<std::string>& commands) {
-  const auto& data = Plinth::AutoCli::NodeData::Of(node);
-  if (data.isCommand) commands.insert(path);
-  for (const auto& child : data.children) {
-    CollectCommands(*child.node, path.empty() ? child.name : path + ' ' + child.name, commands);
-  }
-}
 
 /// Commands of which a success or a failure cannot be tested here. This list only ever shrinks.
 const std::set<std::string> kUntested = {
@@ -74,7 +66,9 @@ class EveryCommandIsTested : public testing::Environment {
   void TearDown() override {
     if (testing::GTEST_FLAG(filter) != "*") return;
     std::set<std::string> commands;
-    CollectCommands(CommandTree(), "", commands);
+    Plinth::WalkTree(CommandTree(), "", [&](const std::string& path, const auto& node) {
+      if (Plinth::AutoCli::NodeData::Of(node).isCommand) commands.insert(path);
+    });
     commands.insert(succeeded.begin(), succeeded.end());
     commands.insert(failed.begin(), failed.end());
     for (const std::string& name : commands) {
@@ -114,7 +108,7 @@ Plinth::AutoCli::Namespace& CommandTree() {
 
 Harness::Harness(const std::string& description) {
   host::Host::Use(host::Host::InMemory(description));
-  host::SetTraceSink([this](const std::string& line) { trace_.push_back(line); });
+  host::SetTraceSink([this](const std::string& line) { trace.push_back(line); });
 }
 
 Harness::~Harness() {
@@ -127,7 +121,7 @@ Outcome Harness::operator()(const std::string& line) { return (*this)(SplitWords
 Outcome Harness::operator()(const std::vector<std::string>& words) {
   Plinth::TextConsole console;
   console.input = input;
-  trace_.clear();
+  trace.clear();
   Plinth::RunRecord record = Plinth::RunCommandLine(CommandTree(), words, console, {.checked = true});
   const std::string name = record.executed ? record.path : "";
   return Finish(std::move(record), console, name);
@@ -138,7 +132,7 @@ Outcome Harness::operator()(const std::string& name,
                             const std::string& options) {
   Plinth::TextConsole console;
   console.input = input;
-  trace_.clear();
+  trace.clear();
   auto& runnable = dynamic_cast<Plinth::AutoCli::Command&>(*command);
   return Finish(Plinth::RunCommand(runnable, SplitWords(options), console, {.checked = true}), console, name);
 }
@@ -155,7 +149,7 @@ Outcome Harness::Finish(Plinth::RunRecord record, Plinth::TextConsole& console, 
   if (record.result) run.result = ToJson(*record.result);
   run.closed = record.closed;
   run.failure = std::move(record.failure);
-  run.trace = trace_;
+  run.trace = trace;
   run.out = std::move(console.out.text);
   run.err = std::move(console.error.text);
   return run;

@@ -62,11 +62,11 @@ class Harness {
   std::string input;
   /// The runs count as tests of their commands.
   bool counts = true;
+  /// What was called on the host since the last run began.
+  std::vector<std::string> trace;
 
  private:
   Outcome Finish(Plinth::RunRecord record, Plinth::TextConsole& console, const std::string& name);
-
-  std::vector<std::string> trace_;
 };
 
 /// The command tree as the plug-in registers it, with the framework's own commands behind it.
