@@ -10,6 +10,7 @@
 #include "host/Description.h"
 #include "host/Error.h"
 #include "host/Host.h"
+#include "host/Record.h"
 #include "host/Schema.h"
 #include "simulator/Commands.h"
 #include "support/Harness.h"
@@ -131,6 +132,14 @@ TEST(HostDescription, FaultsOfTheDocumentDoNotRepeatIt) {
     EXPECT_THAT([&] { host::Host::Current().Load(text); },
                 ThrowsMessage<host::Error>(AllOf(HasSubstr("line 1, column"), Not(HasSubstr("hush")))));
   }
+}
+
+TEST(HostDescription, TextsThatCannotBeStoredAreNotRepeated) {
+  host::Record record;
+  EXPECT_THAT([&] { record.Set("chap/secret", "hush\xff"); },
+              ThrowsMessage<host::Error>("The text for \"chap/secret\" is not UTF-8."));
+  EXPECT_THAT([&] { record.Set("chap/secret", std::string("hush\0", 5)); },
+              ThrowsMessage<host::Error>("The text for \"chap/secret\" has a zero byte."));
 }
 
 TEST(HostDescription, OnlyDefaultsComeOnTopOfWhatWasWritten) {

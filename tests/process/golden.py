@@ -3,12 +3,11 @@
 UPDATE_GOLDEN=1 in the environment writes tests/golden/ anew and shows what has changed.
 """
 
-import difflib
 import json
 import os
 import sys
 
-from support.program import SOURCE, Host, finished, read, write
+from support.program import SOURCE, Host, expect_file, finished, read
 
 GOLDEN = os.path.join(SOURCE, "tests/golden")
 FORMATS = ["simple", "table", "json"]
@@ -71,15 +70,9 @@ def main():
     texts = {name: "".join(transcript(host, line, faults) for line in lines) for name, lines in CASES.items()}
     texts["catalogue"] = catalogue(host, "iscsi adapter auth chap set")
     for name, text in texts.items():
-        path = os.path.join(GOLDEN, name + ".txt")
-        expected = read(path) if os.path.exists(path) else ""
-        difference = "".join(difflib.unified_diff(expected.splitlines(True), text.splitlines(True), path, "now"))
-        if difference and os.environ.get("UPDATE_GOLDEN") == "1":
-            write(path, text)
-            print(difference)
-        elif difference:
-            faults.append(difference + "If this is meant: UPDATE_GOLDEN=1 ctest -R process.golden, and read the diff.")
-    sys.exit("\n".join(faults) if faults else 0)
+        faults.append(expect_file(os.path.join(GOLDEN, name + ".txt"), text, os.environ.get("UPDATE_GOLDEN") == "1"))
+    if any(faults):
+        sys.exit("\n".join(faults) + "If this is meant: UPDATE_GOLDEN=1 ctest -R process.golden, and read the diff.")
 
 
 main()

@@ -1,7 +1,6 @@
 """hcli killed at any moment while it writes: the host is as before or as after, and what was said to be done is done.
 killed.py [KILLS]"""
 
-import itertools
 import json
 import os
 import random
@@ -68,11 +67,14 @@ def killed(host, line):
     return done, what
 
 
-def enough(outcomes, run, least):
-    """True behind the `least` runs once each outcome was seen, and an end where one never is: the delays would miss what
-    they are for."""
-    check(run < 20 * least, f"after {run} runs:", outcomes)
-    return run >= least and all(outcomes.values())
+def runs(outcomes, least):
+    """Numbers of runs, until there were the `least` and each outcome was seen; an end where one never is: the delays
+    would miss what they are for."""
+    for run in range(20 * least):
+        if sum(outcomes.values()) >= least and all(outcomes.values()):
+            return
+        yield run
+    check(False, "after too many runs:", outcomes)
 
 
 def changes():
@@ -89,9 +91,7 @@ def changes():
         host.succeed(f"simulator load {path}")
         loads.append((path, state(host)))
     now, outcomes, ended, remains = state(host), {"killed, not done": 0, "killed, done": 0}, 0, 0
-    for run in itertools.count():
-        if enough(outcomes, run - ended, KILLS):
-            break
+    for run in runs(outcomes, KILLS):
         before, (line, after) = now, change(run, now, loads)
         done, what = killed(host, line)
         what = f"run {run}, {what}"
@@ -116,9 +116,7 @@ def changes():
 def first_runs(least):
     """Killed while it makes the host: there is none, or a whole one, and in either case the next command goes on."""
     demo, outcomes = Host().show(), {"no host": 0, "a host": 0}
-    for run in itertools.count():
-        if enough(outcomes, run, least):
-            break
+    for run in runs(outcomes, least):
         host = Host()
         what = f"first run {run}, " + killed(host, "simulator show")[1]
         outcomes["a host" if os.path.exists(host.database) else "no host"] += 1

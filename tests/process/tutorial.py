@@ -3,14 +3,13 @@
 HCLI_WRITE_DOCS=1 writes what they say into the page.
 """
 
-import difflib
 import os
 import re
 import subprocess
 import sys
 import tempfile
 
-from support.program import HCLI, SOURCE, check, read, write
+from support.program import HCLI, SOURCE, check, expect_file, read
 
 PAGE = os.path.join(SOURCE, "docs/tutorial.md")
 TIME = re.compile(r"\d\d/\d\d/\d\d \d\d:\d\d:\d\d")
@@ -39,7 +38,4 @@ with tempfile.TemporaryDirectory(prefix="hcli tutorial ") as root:
     for i in range(2, len(parts), 3):
         parts[i] = block(parts[i], environment)
     run = "".join(parts)
-if run != page and os.environ.get("HCLI_WRITE_DOCS"):
-    write(PAGE, run)
-elif run != page:
-    sys.exit("".join(difflib.unified_diff(page.splitlines(True), run.splitlines(True), "the page", "the program")))
+sys.exit(expect_file(PAGE, run, os.environ.get("HCLI_WRITE_DOCS")) or 0)

@@ -2,22 +2,12 @@
 
 #include <dlfcn.h>
 
-#include <cstdlib>
 #include <new>
 
 namespace {
 
 long countdown = 0;
 bool (*exempt)() = nullptr;
-
-using Allocate = void*(std::size_t);
-
-/// The operator that this one stands in front of: the sanitizers have one of their own.
-Allocate* Next(const char* symbol) {
-  void* const found = dlsym(RTLD_NEXT, symbol);
-  if (found == nullptr) std::abort();
-  return reinterpret_cast<Allocate*>(found);
-}
 
 void Count() {
   if (countdown > 0 && !exempt() && --countdown == 0) {
@@ -28,15 +18,10 @@ void Count() {
 
 }  // namespace
 
-// The matching operators delete stay the ones of the library.
+// The one for arrays calls this one; the operators delete stay the ones of the library.
 void* operator new(std::size_t size) {
-  static Allocate* const next = Next("_Znwm");
-  Count();
-  return next(size);
-}
-
-void* operator new[](std::size_t size) {
-  static Allocate* const next = Next("_Znam");
+  // The operator that this one stands in front of: the sanitizers have one of their own.
+  static auto* const next = reinterpret_cast<void* (*)(std::size_t)>(dlsym(RTLD_NEXT, "_Znwm"));
   Count();
   return next(size);
 }

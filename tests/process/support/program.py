@@ -1,6 +1,7 @@
 """What tests of the built program share: running it on a host of their own, and saying what was wrong."""
 
 import contextlib
+import difflib
 import json
 import os
 import pty
@@ -34,6 +35,17 @@ def read(path):
 def write(path, text):
     with open(path, "w", encoding="utf-8", newline="") as file:
         file.write(text)
+
+
+def expect_file(path, text, renewed):
+    """How the file differs from the text that it should have; where it is `renewed`, it has it from now on."""
+    old = read(path) if os.path.exists(path) else ""
+    difference = "".join(difflib.unified_diff(old.splitlines(True), text.splitlines(True), path, "now"))
+    if difference and renewed:
+        write(path, text)
+        print(difference)
+        return ""
+    return difference
 
 
 def beside(path):
