@@ -26,21 +26,26 @@ using testing::ThrowsMessage;
 
 namespace {
 
-/// Loads @p description and expects the refusal to begin with @p fault, and the host to stay.
-void ExpectRefused(const std::string& description, const std::string& fault) {
-  SCOPED_TRACE(description);
-  const Harness host(R"({"adapters": [{"name": "before"}]})");
-  const json before = host.Show();
-  EXPECT_THAT([&] { host::Host::Current().Load(description); },
-              ThrowsMessage<host::Error>(StartsWith(fault)));
-  EXPECT_EQ(host.Show(), before);
+struct Refusal {
+  std::string keys, fault;
+};
+
+/// Loads each row's keys between @p before and @p after; it is refused for its fault at @p path, and the host
+/// stays.
+void ExpectRefused(const std::string& before, const std::string& after, const std::string& path,
+                   const std::vector<Refusal>& rows) {
+  for (const auto& [keys, fault] : rows) {
+    SCOPED_TRACE(keys);
+    const Harness host(R"({"adapters": [{"name": "before"}]})");
+    const json shown = host.Show();
+    EXPECT_THAT([&] { host::Host::Current().Load(before + keys + after); },
+                ThrowsMessage<host::Error>(StartsWith(path + fault)));
+    EXPECT_EQ(host.Show(), shown);
+  }
 }
 
 TEST(HostDescription, FaultsNameTheirPath) {
-  const struct {
-    const char* description;
-    const char* fault;
-  } cases[] = {
+  const std::vector<Refusal> documents = {
       {"", "not a JSON document: parse error at line 1, column 1"},
       {"{\n\"adapters\": [,]}", "not a JSON document: parse error at line 2"},
       {R"({"state": 1e999})", "the document has a number that is too large"},
@@ -63,14 +68,8 @@ TEST(HostDescription, FaultsNameTheirPath) {
        "remoteTargets[0].chap.secret: \"***\" stands for a secret that was not shown; simulator show "
        "--secrets"},
   };
-  for (const auto& [description, fault] : cases) ExpectRefused(description, fault);
-}
-
-TEST(HostDescription, FaultsOfAnswersAndAdaptersNameTheirPath) {
-  const struct {
-    const char* keys;
-    const char* fault;
-  } answers[] = {
+  ExpectRefused("", "", "", documents);
+  const std::vector<Refusal> answers = {
       {R"("operation": "GetNames", "throw": "bad_alloc")",
        ".operation: no operation is called \"GetNames\"; did you mean \"GetName\"?"},
       {R"("operation": "GetName")", ": expected exactly one of"},
@@ -81,13 +80,8 @@ TEST(HostDescription, FaultsOfAnswersAndAdaptersNameTheirPath) {
        ": IMA_GetLhbaOidList can be answered by an \"imaStatus\" only"},
       {R"("operation": "SetMtu", "status": 1, "text": "x")", ".text: goes with \"throw\" only"},
   };
-  for (const auto& [keys, fault] : answers) {
-    ExpectRefused(std::string(R"({"answers": [{)") + keys + "}]}", std::string("answers[0]") + fault);
-  }
-  const struct {
-    const char* keys;
-    const char* fault;
-  } adapters[] = {
+  ExpectRefused(R"({"answers": [{)", "}]}", "answers[0]", answers);
+  const std::vector<Refusal> adapters = {
       {R"("capabilities": {"MTU Settable": "yes"})", ".capabilities.MTU Settable: expected true or false"},
       {R"("kind": "soft")", ".kind: expected one of \"independent\", \"dependent\", \"software\", \"scsi\""},
       {R"("state": 2147483648)", ".state: expected a whole number from -2147483648 to 2147483647"},
@@ -118,10 +112,7 @@ TEST(HostDescription, FaultsOfAnswersAndAdaptersNameTheirPath) {
       {R"("network": {"ipv6Addresses": [{"address": "::2"}, {"address": "0::2", "prefixLength": 9}]})",
        ".network.ipv6Addresses[1].address: \"0::2\" is taken by network.ipv6Addresses[0]"},
   };
-  for (const auto& [keys, fault] : adapters) {
-    ExpectRefused(std::string(R"({"adapters": [{"name": "hba0"}, {"name": "hba1", )") + keys + "}]}",
-                  std::string("adapters[1]") + fault);
-  }
+  ExpectRefused(R"({"adapters": [{"name": "hba0"}, {"name": "hba1", )", "}]}", "adapters[1]", adapters);
 }
 
 TEST(HostDescription, FaultsOfTheDocumentDoNotRepeatIt) {

@@ -3,10 +3,9 @@
 import os
 import re
 import shutil
-import sys
 import tempfile
 
-from support.program import HCLI, SOURCE, run
+from support.program import HCLI, SOURCE, check, read, run
 
 BUILD = os.environ["HCLI_BUILD_DIR"]
 LIBRARIES = os.path.join(BUILD, "lib")
@@ -17,9 +16,8 @@ UNREGISTERED = ["AdapterDiscoveryIsns" + name for name in ("Add", "List", "Param
 UNREGISTERED += ["AdapterIsnsParamGet", "AdapterIsnsParamSet", "RouteAdd", "RouteList", "RouteRemove"]
 
 
-def check(done, status, text):
-    if done.returncode != status or text not in done.stdout + done.stderr:
-        sys.exit(f"{done.args}: status {done.returncode}\n{done.stdout}\n{done.stderr}")
+def expect(done, status, text):
+    check(done.returncode == status and text in done.stdout + done.stderr, done.args, done.stdout, done.stderr)
 
 
 with tempfile.TemporaryDirectory(prefix="hcli-plugin-") as folder:
@@ -27,20 +25,18 @@ with tempfile.TemporaryDirectory(prefix="hcli-plugin-") as folder:
     for name in "cmake", "contracts", "plugins":
         shutil.copytree(os.path.join(SOURCE, name), os.path.join(tree, name))
     shutil.copy(os.path.join(SOURCE, "CMakeLists.txt"), tree)
-    with open(os.path.join(BUILD, "CMakeCache.txt"), encoding="utf-8") as cache:
-        same = ["-D" + found.group() for found in SAME.finditer(cache.read())]
+    same = ["-D" + found.group() for found in SAME.finditer(read(os.path.join(BUILD, "CMakeCache.txt")))]
     configure = ["cmake", "-S", tree, "-B", build, "-G", "Ninja", "-DHCLI_PLUGIN_ONLY=ON", *same]
-    check(run(*configure), 1, "set HCLI_FRAMEWORK_LIBRARY to the library to link")
-    check(run(*configure, "-DHCLI_FRAMEWORK_LIBRARY=/no/such.so"), 1, "no such file: /no/such.so")
-    check(run(*configure, f"-DHCLI_FRAMEWORK_LIBRARY={LIBRARIES}/libplinth.so",
+    expect(run(*configure), 1, "set HCLI_FRAMEWORK_LIBRARY to the library to link")
+    expect(run(*configure, "-DHCLI_FRAMEWORK_LIBRARY=/no/such.so"), 1, "no such file: /no/such.so")
+    expect(run(*configure, f"-DHCLI_FRAMEWORK_LIBRARY={LIBRARIES}/libplinth.so",
               f"-DHCLI_STORAGE_LIBRARIES={LIBRARIES}/libcorectl.so;{LIBRARIES}/libhost.so",
               f"-DHCLI_IMA_LIBRARY={LIBRARIES}/libima.so"), 0, "")
-    check(run("ninja", "-C", build), 0, "")
+    expect(run("ninja", "-C", build), 0, "")
     plugins = os.path.join(build, "lib/hcli/plugins")
-    if os.listdir(plugins) != ["iscsi.so"]:
-        sys.exit(f"built {os.listdir(plugins)}")
+    check(os.listdir(plugins) == ["iscsi.so"], os.listdir(plugins))
     # What stands on no path can be made from outside all the same.
     exported = run("nm", "-DC", "--defined-only", os.path.join(plugins, "iscsi.so"))
     for name in UNREGISTERED:
-        check(exported, 0, f"Make<TessaroCli::IscsiNamespace::{name}>()")
-    check(run(HCLI, "iscsi", "adapter", "--help", HCLI_PLUGINS=plugins, HCLI_ROOT=folder), 0, "list")
+        expect(exported, 0, f"Make<TessaroCli::IscsiNamespace::{name}>()")
+    expect(run(HCLI, "iscsi", "adapter", "--help", HCLI_PLUGINS=plugins, HCLI_ROOT=folder), 0, "list")
