@@ -69,9 +69,9 @@ def main():
     host, faults = Host(json.loads(read(os.path.join(GOLDEN, "host.json")))), []
     texts = {name: "".join(transcript(host, line, faults) for line in lines) for name, lines in CASES.items()}
     texts["catalogue"] = catalogue(host, "iscsi adapter auth chap set")
-    for name, text in texts.items():
-        faults.append(expect_file(os.path.join(GOLDEN, name + ".txt"), text, os.environ.get("UPDATE_GOLDEN") == "1"))
-    if any(faults):
+    renewed = os.environ.get("UPDATE_GOLDEN") == "1"
+    faults += filter(None, [expect_file(f"{GOLDEN}/{name}.txt", text, renewed) for name, text in texts.items()])
+    if faults:
         sys.exit("\n".join(faults) + "If this is meant: UPDATE_GOLDEN=1 ctest -R process.golden, and read the diff.")
 
 
