@@ -99,7 +99,6 @@ TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
 }
 
 TEST_F(HostStore, WhileAnAdapterIsHeldAllIsReadFromOneState) {
-  MakeHost();
   CoreCtl::Storage::StorageInfoImpl info;
   std::unique_ptr<NodeCtl::Storage::ScsiInterface> held(info.GetScsiInterface("hba0"));
   auto& adapter = dynamic_cast<NodeCtl::Storage::iScsiInterface&>(*held);
@@ -110,11 +109,12 @@ TEST_F(HostStore, WhileAnAdapterIsHeldAllIsReadFromOneState) {
     other.Execute("UPDATE object SET record = json_set(record, '$.alias', 'theirs') WHERE name = 'hba0'");
     transaction.Commit();
   };
-  EXPECT_THAT(WhatFails(change), HasSubstr("is locked by another process."));
+  const auto isLocked = ThrowsMessage<host::Error>(HasSubstr("is locked by another process."));
+  EXPECT_THAT(change, isLocked);
   adapter.SetInitiatorAlias("ours");  // ends what was read before
   change();
   EXPECT_EQ(adapter.GetInitiatorAlias(), "theirs");
-  EXPECT_THAT(WhatFails(change), HasSubstr("is locked by another process."));
+  EXPECT_THAT(change, isLocked);
   held.reset();
   change();
 }
