@@ -114,18 +114,20 @@ TEST(RemovalWalk, NotesNothingOnceAResetIsToBeDone) {
 // One command at a time: what is called, what is said, what is stored.
 
 struct Case {
-  json host;
   const char* line;
   std::string steps;
   std::string messages;
   std::string stored = "{}";  ///< changed keys of the network configuration
+  json host = HostWith();
 };
 
 /// A case in which the library refuses the last of the steps.
-Case Refused(const json& host, const char* line, const std::string& steps, const std::string& reason,
-             const char* failure, const std::string& stored = "{}") {
-  return {host, line, steps + " ! NodeCtlException: " + reason, failure + ("; " + reason), stored};
+Case Refused(const char* line, const std::string& steps, const std::string& reason, const char* failure,
+             const json& host = HostWith(), const std::string& stored = "{}") {
+  return {line, steps + " ! NodeCtlException: " + reason, failure + ("; " + reason), stored, host};
 }
+
+constexpr char kGet[] = "GetNetworkProperties()";
 
 template <std::size_t count>
 void Check(const std::string& command, const Case (&cases)[count]) {
@@ -146,50 +148,49 @@ TEST(IpconfigSet, StepsMessagesAndStore) {
   constexpr char kDhcp[] =
       "Cannot set static IPv4 configuration, as DHCPv4 is enabled for adapter a0. You need to first disable "
       "DHCPv4.";
+  const std::string failed = "Failed to set IP configuration on network portal.";
+  const std::string get = std::string(kGet) + "; ";
   const json dhcp = HostWith({{"useDhcpv4", true}});
-  const auto refused = [](const json& host, const char* line, const std::string& call, const char* reason) {
-    return Refused(host, line, "GetNetworkProperties(); " + call, reason,
-                   "Failed to set IP configuration on network portal.");
+  const auto refused = [&](const char* line, const std::string& call, const char* reason,
+                           const json& host = HostWith()) {
+    return Refused(line, get + call, reason, failed.c_str(), host);
   };
-  Check(
-      "ipconfig set",
-      {
-          {HostWith(), "-n nosuch", "", ""},
-          {HostWith(), "-e false -i 1 -d true", "SetIpVersionEnabled(4, false)", "",
-           R"({"ipv4Enabled": false})"},
-          {dhcp, "-e true -d false -i 198.51.100.7 -s 255.255.254.0 -g 198.51.101.1",
-           R"(SetIpVersionEnabled(4, true); SetUseDhcpv4(false); SetIpv4Address("198.51.100.7"); )"
-           R"(SetIpv4SubnetMask("255.255.254.0"); SetIpv4Gateway("198.51.101.1"))",
-           "",
-           R"({"useDhcpv4": false, "ipv4Address": "198.51.100.7", "ipv4Netmask": "255.255.254.0",
-               "gateway": "198.51.101.1"})"},
-          {HostWith(), "-d true -g x", "SetUseDhcpv4(true)", "", R"({"useDhcpv4": true})"},
-          {dhcp, "-i 192.0.2.7", "GetNetworkProperties()", kDhcp},
-          {HostWith(), "-y 2001:db8::53", R"(GetNetworkProperties(); SetDnsServers("", "2001:db8::53"))", "",
-           R"({"primaryDns": "", "secondaryDns": "2001:db8::53"})"},
-          {HostWith(), "-g 0.0.0.0", R"(GetNetworkProperties(); SetIpv4Gateway("0.0.0.0"))", "",
-           R"({"gateway": "0.0.0.0"})"},
-          {HostWith(), "-g 1.2.3", "GetNetworkProperties()",
-           R"(Failed to set IP configuration on network portal.; "1.2.3" is not an IPv4 address.)"},
-          refused(
-              HostWith(), "-g 192.0.3.1", R"(SetIpv4Gateway("192.0.3.1"))",
-              R"(The gateway "192.0.3.1" is not in the subnet of the address "192.0.2.9" with the mask "255.255.255.0".)"),
-          refused(HostWith(), "-i 224.0.0.1", R"(SetIpv4Address("224.0.0.1"))",
-                  R"("224.0.0.1" is not a unicast address.)"),
-          refused(
-              HostWith(), "-s 255.0.255.0", R"(SetIpv4SubnetMask("255.0.255.0"))",
+  const Case cases[] = {
+      {"-n nosuch", "", ""},
+      {"-e false -i 1 -d true", "SetIpVersionEnabled(4, false)", "", R"({"ipv4Enabled": false})"},
+      {"-e true -d false -i 198.51.100.7 -s 255.255.254.0 -g 198.51.101.1",
+       R"(SetIpVersionEnabled(4, true); SetUseDhcpv4(false); SetIpv4Address("198.51.100.7"); )"
+       R"(SetIpv4SubnetMask("255.255.254.0"); SetIpv4Gateway("198.51.101.1"))",
+       "",
+       R"({"useDhcpv4": false, "ipv4Address": "198.51.100.7", "ipv4Netmask": "255.255.254.0",
+               "gateway": "198.51.101.1"})",
+       dhcp},
+      {"-d true -g x", "SetUseDhcpv4(true)", "", R"({"useDhcpv4": true})"},
+      {"-i 192.0.2.7", kGet, kDhcp, "{}", dhcp},
+      {"-y 2001:db8::53", get + R"(SetDnsServers("", "2001:db8::53"))", "",
+       R"({"primaryDns": "", "secondaryDns": "2001:db8::53"})"},
+      {"-g 0.0.0.0", get + R"(SetIpv4Gateway("0.0.0.0"))", "", R"({"gateway": "0.0.0.0"})"},
+      {"-g 1.2.3", kGet, failed + R"(; "1.2.3" is not an IPv4 address.)"},
+      refused(
+          "-g 192.0.3.1", R"(SetIpv4Gateway("192.0.3.1"))",
+          R"(The gateway "192.0.3.1" is not in the subnet of the address "192.0.2.9" with the mask "255.255.255.0".)"),
+      refused("-i 224.0.0.1", R"(SetIpv4Address("224.0.0.1"))", R"("224.0.0.1" is not a unicast address.)"),
+      refused("-s 255.0.255.0", R"(SetIpv4SubnetMask("255.0.255.0"))",
               R"("255.0.255.0" is not a subnet mask: its one bits must stand in front of its zero bits.)"),
-          refused(HostWith(), "-s 0.0.0.0", R"(SetIpv4SubnetMask("0.0.0.0"))",
-                  R"("0.0.0.0" is not a subnet mask: its one bits must stand in front of its zero bits.)"),
-          refused(HostWith(), "-x dns.example", R"(SetDnsServers("dns.example", ""))",
-                  R"("dns.example" is not an IP address.)"),
-          refused(Without("Subnet Mask Setttable"), "-s 255.0.0.0", R"(SetIpv4SubnetMask("255.0.0.0"))",
-                  R"(The subnet mask of the adapter "a0" is not settable.)"),
-          refused(Without("Default Gateway Settable"), "-g 192.0.2.2", R"(SetIpv4Gateway("192.0.2.2"))",
-                  R"(The default gateway of the adapter "a0" is not settable.)"),
-          refused(Without("Primary DNS Settable"), "-y 192.0.2.4", R"(SetDnsServers("", "192.0.2.4"))",
-                  R"(The primary DNS server of the adapter "a0" is not settable.)"),
-      });
+      refused("-s 0.0.0.0", R"(SetIpv4SubnetMask("0.0.0.0"))",
+              R"("0.0.0.0" is not a subnet mask: its one bits must stand in front of its zero bits.)"),
+      refused("-x dns.example", R"(SetDnsServers("dns.example", ""))",
+              R"("dns.example" is not an IP address.)"),
+      refused("-s 255.0.0.0", R"(SetIpv4SubnetMask("255.0.0.0"))",
+              R"(The subnet mask of the adapter "a0" is not settable.)", Without("Subnet Mask Setttable")),
+      refused("-g 192.0.2.2", R"(SetIpv4Gateway("192.0.2.2"))",
+              R"(The default gateway of the adapter "a0" is not settable.)",
+              Without("Default Gateway Settable")),
+      refused("-y 192.0.2.4", R"(SetDnsServers("", "192.0.2.4"))",
+              R"(The primary DNS server of the adapter "a0" is not settable.)",
+              Without("Primary DNS Settable")),
+  };
+  Check("ipconfig set", cases);
   // A change that went through before the test of DHCP takes effect.
   Harness changed(WithAnswers(dhcp.dump(), R"({"operation": "SetIpVersionEnabled", "status": 2})"));
   const Outcome refusal = changed("iscsi networkportal ipconfig set -A a0 -e true -i 192.0.2.7");
@@ -238,36 +239,34 @@ TEST(IpconfigGet, SettlesTheName) {
 TEST(Ipv6configSet, StepsMessagesAndStore) {
   constexpr char kFailed[] = "Failed to set IPv6 configuration on network portal.";
   const auto unsettable = [](const std::string& capability, const char* line, const char* message) {
-    return Case{Without(capability + " Settable"), line, "GetCapabilities()", message};
+    return Case{line, "GetCapabilities()", message, "{}", Without(capability + " Settable")};
   };
-  Check(
-      "ipv6config set",
-      {
-          {Without("IPv6 Supported"), "", "", ""},
-          {Without("IPv6 Supported"), "-g x", "GetCapabilities()", "IPv6 is not supported by adapter a0."},
-          unsettable(
-              "IPv6 Enable", "-e true -g ::1",
-              "Enabling/Disabling IPv6 is not supported by adapter a0. This parameter is not settable."),
-          unsettable("IPv6 DHCP Configuration Method", "-d no",
-                     "DHCPv6 configuration mode is not settable for adapter a0."),
-          unsettable("IPv6 Linklocal Auto Configuration Method", "-l no",
-                     "Link local auto configuration mode is not settable for adapter a0."),
-          unsettable("IPv6 Router Advertisement Configuration Method", "-r no",
-                     "Router Advertisemnet configuration mode is not supported by adapter a0."),
-          {Without("IPv6 Default Gateway Settable"), "-g ::1 -e false",
-           "GetCapabilities(); SetIpVersionEnabled(6, false)",
-           "IPv6 default gateway is not settable for adapter a0.", R"({"ipv6Enabled": false})"},
-          {HostWith(), "-e false -d true -l true -r true -g 2001:DB8:0:0::1",
-           R"(GetCapabilities(); SetIpVersionEnabled(6, false); SetIpv6ConfigMethod(2, true); )"
-           R"(SetIpv6ConfigMethod(1, true); SetIpv6ConfigMethod(3, true); SetIpv6Gateway("2001:DB8:0:0::1"))",
-           "",
-           R"({"ipv6Enabled": false, "useDhcpv6": true, "useLinkLocalAutoConfiguration": true,
+  const Case cases[] = {
+      {"", "", "", "{}", Without("IPv6 Supported")},
+      {"-g x", "GetCapabilities()", "IPv6 is not supported by adapter a0.", "{}", Without("IPv6 Supported")},
+      unsettable("IPv6 Enable", "-e true -g ::1",
+                 "Enabling/Disabling IPv6 is not supported by adapter a0. This parameter is not settable."),
+      unsettable("IPv6 DHCP Configuration Method", "-d no",
+                 "DHCPv6 configuration mode is not settable for adapter a0."),
+      unsettable("IPv6 Linklocal Auto Configuration Method", "-l no",
+                 "Link local auto configuration mode is not settable for adapter a0."),
+      unsettable("IPv6 Router Advertisement Configuration Method", "-r no",
+                 "Router Advertisemnet configuration mode is not supported by adapter a0."),
+      {"-g ::1 -e false", "GetCapabilities(); SetIpVersionEnabled(6, false)",
+       "IPv6 default gateway is not settable for adapter a0.", R"({"ipv6Enabled": false})",
+       Without("IPv6 Default Gateway Settable")},
+      {"-e false -d true -l true -r true -g 2001:DB8:0:0::1",
+       R"(GetCapabilities(); SetIpVersionEnabled(6, false); SetIpv6ConfigMethod(2, true); )"
+       R"(SetIpv6ConfigMethod(1, true); SetIpv6ConfigMethod(3, true); SetIpv6Gateway("2001:DB8:0:0::1"))",
+       "",
+       R"({"ipv6Enabled": false, "useDhcpv6": true, "useLinkLocalAutoConfiguration": true,
            "useRouterAdvertisement": true, "gateway6": "2001:db8::1"})"},
-          {HostWith({{"gateway6", "2001:db8::9"}}), "-g ''", R"(GetCapabilities(); SetIpv6Gateway(""))", "",
-           R"({"gateway6": "::"})"},
-          Refused(HostWith(), "-g ff02::1", R"(GetCapabilities(); SetIpv6Gateway("ff02::1"))",
-                  R"("ff02::1" is not a unicast address.)", kFailed),
-      });
+      {"-g ''", R"(GetCapabilities(); SetIpv6Gateway(""))", "", R"({"gateway6": "::"})",
+       HostWith({{"gateway6", "2001:db8::9"}})},
+      Refused("-g ff02::1", R"(GetCapabilities(); SetIpv6Gateway("ff02::1"))",
+              R"("ff02::1" is not a unicast address.)", kFailed),
+  };
+  Check("ipv6config set", cases);
 }
 
 TEST(Ipv6configGet, ShowsWhatIsStated) {
@@ -283,8 +282,6 @@ TEST(Ipv6configGet, ShowsWhatIsStated) {
 }
 
 // Addresses
-
-constexpr char kGet[] = "GetNetworkProperties()";
 
 /// The addresses as they are stored.
 std::string Stored(const std::vector<json>& addresses) {
@@ -332,25 +329,24 @@ TEST(AddressCheck, RefusesBeforeAnythingChanges) {
   };
   for (const auto& [network, list, add, remove] : kCases) {
     const json host = HostWith(json::parse(network));
-    Check("ipv6config address add", {{host, list, kGet, add}});
-    Check("ipv6config address remove", {{host, list, kGet, remove}});
+    Check("ipv6config address add", {{list, kGet, add, "{}", host}});
+    Check("ipv6config address remove", {{list, kGet, remove, "{}", host}});
   }
   const json none = Without("IPv6 Supported");
-  Check("ipv6config address remove", {{none, "-a x", kGet, "IPv6 not supported by adapter a0."}});
-  Check(
-      "ipv6config address add",
-      {
-          {none, "-a x", kGet, "IPv6 not supported by adapter a0."},
-          {none, "", "",
-           "No command option specified. Either --address-list or --remove-all-existing must be specified."},
-          {HostWith({{"useRouterAdvertisement", true}}), "-r -a fe80::1/64", kGet,
-           "Cannot remove existing IPv6 addresses" + advertised},
-      });
+  constexpr char kNotSupported[] = "IPv6 not supported by adapter a0.";
+  Check("ipv6config address remove", {{"-a x", kGet, kNotSupported, "{}", none}});
+  const Case cases[] = {
+      {"-a x", kGet, kNotSupported, "{}", none},
+      {"", "",
+       "No command option specified. Either --address-list or --remove-all-existing must be specified."},
+      {"-r -a fe80::1/64", kGet, "Cannot remove existing IPv6 addresses" + advertised, "{}",
+       HostWith({{"useRouterAdvertisement", true}})},
+  };
+  Check("ipv6config address add", cases);
 }
 
 TEST(AddressAdd, WalksAndStores) {
   constexpr char kFailed[] = "Error adding IPv6 address list on network portal";
-  const json empty = HostWith({{"ipv6Addresses", json::array()}});
   const json linkLocal = {"fe80::9", 64, 7};
   const std::string removed =
       R"(GetNetworkProperties(); SetIpv6Address("2001:db8::1", 64, false); SetIpv6Address("2001:db8::2", 64, false); )"
@@ -358,44 +354,42 @@ TEST(AddressAdd, WalksAndStores) {
   const auto adding = [](const std::string& address) {
     return "GetNetworkProperties(); SetIpv6Address(" + address + ", true)";
   };
-  Check("ipv6config address add",
-        {
-            {HostWith(), "-r", removed, "", Stored({linkLocal})},
-            {HostWith({{"ipv6MaxStaticAddresses", 1}}), "-r=false -a 2001:DB8::5/48",
-             removed + R"(; SetIpv6Address("2001:db8::5", 48, true))", "",
-             Stored({linkLocal, {"2001:db8::5", 48, 0}})},
-            {HostWith({{"useRouterAdvertisement", true}, {"ipv6Addresses", json::array()}}), "-a fe80::5/64",
-             adding(R"("fe80::5", 64)"), "", Stored({json{"fe80::5", 64, 0}})},
-            // Refused by the adapter, with what was done by then kept.
-            Refused(empty, "-a 2001:db8::5/64 -a 2001:db8::5/48 -a 2001:db8::6/64",
-                    adding(R"("2001:db8::5", 64)") + R"(; SetIpv6Address("2001:db8::5", 48, true))",
-                    R"(The adapter has the address "2001:db8::5" already.)", kFailed,
-                    Stored({json{"2001:db8::5", 64, 0}})),
-            Refused(HostWith({{"ipv6MaxStaticAddresses", 1}}), "-a 2001:db8::5/64",
-                    adding(R"("2001:db8::5", 64)"), "The adapter takes at most 1 static routable addresses.",
-                    kFailed),
-            Refused(HostWith(), "-a fe80::5/64", adding(R"("fe80::5", 64)"),
-                    R"(The adapter has the link-local address "fe80::9" already, and takes only one.)",
-                    kFailed),
-        });
+  const Case cases[] = {
+      {"-r", removed, "", Stored({linkLocal})},
+      {"-r=false -a 2001:DB8::5/48", removed + R"(; SetIpv6Address("2001:db8::5", 48, true))", "",
+       Stored({linkLocal, {"2001:db8::5", 48, 0}}), HostWith({{"ipv6MaxStaticAddresses", 1}})},
+      {"-a fe80::5/64", adding(R"("fe80::5", 64)"), "", Stored({json{"fe80::5", 64, 0}}),
+       HostWith({{"useRouterAdvertisement", true}, {"ipv6Addresses", json::array()}})},
+      // Refused by the adapter, with what was done by then kept.
+      Refused("-a 2001:db8::5/64 -a 2001:db8::5/48 -a 2001:db8::6/64",
+              adding(R"("2001:db8::5", 64)") + R"(; SetIpv6Address("2001:db8::5", 48, true))",
+              R"(The adapter has the address "2001:db8::5" already.)", kFailed,
+              HostWith({{"ipv6Addresses", json::array()}}), Stored({json{"2001:db8::5", 64, 0}})),
+      Refused("-a 2001:db8::5/64", adding(R"("2001:db8::5", 64)"),
+              "The adapter takes at most 1 static routable addresses.", kFailed,
+              HostWith({{"ipv6MaxStaticAddresses", 1}})),
+      Refused("-a fe80::5/64", adding(R"("fe80::5", 64)"),
+              R"(The adapter has the link-local address "fe80::9" already, and takes only one.)", kFailed),
+  };
+  Check("ipv6config address add", cases);
 }
 
 TEST(AddressRemove, WalksAndStores) {
   const std::string kept = Stored({{"fe80::9", 64, 7}, {"2001:db8::2", 64, 9}, {"2001:db8::3", 64, 7}});
   const std::string first = R"(GetNetworkProperties(); SetIpv6Address("2001:db8::1", 64, false))";
   const auto refused = [&](const char* line, const std::string& call, const char* reason) {
-    return Refused(HostWith(), line, first + "; " + call, reason,
-                   "Error removing IPv6 address on network portal.", kept);
+    return Refused(line, first + "; " + call, reason, "Error removing IPv6 address on network portal.",
+                   HostWith(), kept);
   };
-  Check("ipv6config address remove",
-        {
-            {HostWith(), "-a 2001:db8::1/64", first, "", kept},
-            refused("-a 2001:db8::1/64 -a 2001:db8::7/64 -a 2001:db8::2/64",
-                    R"(SetIpv6Address("2001:db8::7", 64, false))",
-                    R"(The adapter does not have the address "2001:db8::7".)"),
-            refused("-a 2001:db8::1/64 -a 2001:db8::2/48", R"(SetIpv6Address("2001:db8::2", 48, false))",
-                    R"(The prefix of the address "2001:db8::2" has 64 bits, not 48.)"),
-        });
+  const Case cases[] = {
+      {"-a 2001:db8::1/64", first, "", kept},
+      refused("-a 2001:db8::1/64 -a 2001:db8::7/64 -a 2001:db8::2/64",
+              R"(SetIpv6Address("2001:db8::7", 64, false))",
+              R"(The adapter does not have the address "2001:db8::7".)"),
+      refused("-a 2001:db8::1/64 -a 2001:db8::2/48", R"(SetIpv6Address("2001:db8::2", 48, false))",
+              R"(The prefix of the address "2001:db8::2" has 64 bits, not 48.)"),
+  };
+  Check("ipv6config address remove", cases);
 }
 
 TEST(AddressList, ShowsEachWithItsType) {
