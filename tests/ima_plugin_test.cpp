@@ -4,7 +4,6 @@
 namespace {
 
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 constexpr char kNoMatch[] = "Unable to find matching plugin.";
 
@@ -32,7 +31,6 @@ TEST(PluginList, SelectsAndNeverPostsNothing) {
       {"", {vendor, "first", "second"}, {}},
       {"-p libb.so", {"first"}, {}},
       {"-p LIBB.SO", {}, {kNoMatch}},
-      {"-p ''", {}, {kNoMatch}},
       {"-A hba0", {vendor}, {}},
       {"-A hba1", {"first"}, {}},
       {"-A hba2", {}, {"Unable to get plugin identifier."}},
@@ -45,28 +43,19 @@ TEST(PluginList, SelectsAndNeverPostsNothing) {
     EXPECT_TRUE(run.closed) << one.options;
     EXPECT_EQ(run.status, one.messages.empty() ? 0 : 3) << one.options;
   }
-  EXPECT_EQ(
-      host("iscsi plugin list").result[1],
-      nlohmann::json::parse(R"({"Supported Ima Version": 1, "Vendor": "first", "Implementation Version": "",
-                                      "File Name": "libb.so", "Build Time": "na",
-                                      "Auto Persistence Supported": false,
-                                      "Lhbas Can Be Created And Destroyed": false})"));
-  const nlohmann::json first = host("iscsi plugin list").result[0];
-  EXPECT_EQ(first["Supported Ima Version"], 4294967295);
-  EXPECT_EQ(first["Build Time"], "na");
-  EXPECT_EQ(first["Lhbas Can Be Created And Destroyed"], true);
-  EXPECT_EQ(first["Auto Persistence Supported"], false);  // only 1 is true
+  nlohmann::json first = host("iscsi plugin list").result[0];
+  first.erase("Vendor");
+  EXPECT_EQ(first,
+            nlohmann::json::parse(R"({"Supported Ima Version": 4294967295, "Implementation Version": "1.2",
+      "File Name": "liba.so", "Build Time": "na", "Auto Persistence Supported": false,
+      "Lhbas Can Be Created And Destroyed": true})"));
   EXPECT_THAT(host("iscsi plugin list -p libb.so").Calls(),
               ElementsAre("IMA_GetPluginOidList", "IMA_GetPluginProperties", "IMA_GetPluginProperties"));
 
   const Outcome both = host("iscsi plugin list -p liba.so -A hba0");
   EXPECT_THAT(both.messages, ElementsAre("adapter and plugin options are mutually exclusive."));
-  EXPECT_TRUE(both.result.is_null());
-  EXPECT_THAT(both.trace, IsEmpty());
-
-  const Outcome none = Harness("{}")("iscsi plugin list");
-  EXPECT_THAT(none.messages, ElementsAre(kNoMatch));
-  EXPECT_THAT(none.result, IsEmpty());
+  EXPECT_TRUE(both.result.is_null() && both.trace.empty());
+  EXPECT_THAT(Harness("{}")("iscsi plugin list").messages, ElementsAre(kNoMatch));
 }
 
 TEST(PluginList, FailureLeavesTheRowsBeforeIt) {
@@ -74,7 +63,6 @@ TEST(PluginList, FailureLeavesTheRowsBeforeIt) {
   const Outcome run = host("iscsi plugin list");
   EXPECT_THAT(run.messages, ElementsAre("Unable to get plugin properties."));
   EXPECT_EQ(run.result.size(), 2u);
-  EXPECT_TRUE(run.closed);
 }
 
 }  // namespace

@@ -35,8 +35,6 @@ TEST(Isns, EachCommandTestsInItsOrder) {
   constexpr char kAddress[] = "Address required for static discovery method";
   constexpr char kOnlyOne[] = "Only one options value, inherit, default can be used at once.";
   constexpr char kTogether[] = "The value and default options cannot be used together.";
-  constexpr char kKey[] = "Invalid iscsi key input.";
-  constexpr char kValue[] = "Invalid iscsi value input.";
   constexpr char kDefault[] = "Invalid default option use, it does not take false/no/n/0 value.";
   const std::string bad = "\"a b\" is not an IPv4 address, an IPv6 address or a host name.";
   const std::string none = "The adapter \"a0\" has no iSNS server \"192.0.2.9\".";
@@ -61,36 +59,36 @@ TEST(Isns, EachCommandTestsInItsOrder) {
       {kAdd, noAddress, bad + notAdded, nullptr},
       {kAdd, noAdapter, kUnknownAdapter, ""},
       {kAdd, server, R"(The adapter "a0" has the iSNS server "192.0.2.1" already.)" + notAdded,
-       "AddIsnsConfig"},
+       "AddIsnsConfig "},
       {kAdd, "-A a1 -m static -a ::1", R"(The iSNS servers of the adapter "a1" are not settable.)" + notAdded,
-       "AddIsnsConfig"},
+       "AddIsnsConfig "},
       {kRemove, "-A none -m Static -a ''", kMethod, nullptr},
       {kRemove, noAddress, bad + "|Failed to remove iSNS discovery address..", nullptr},
-      {kRemove, unknown, none + "|Unable to remove iSNS discovery address.", "RemoveIsnsConfig"},
+      {kRemove, unknown, none + "|Unable to remove iSNS discovery address.", "RemoveIsnsConfig "},
       {kShow, "-A none -m slp", kMethod, nullptr},
       {kShow, noAddress, bad + kGet, nullptr},
-      {kShow, unknown, none + kGet, "GetIsnsParms"},
+      {kShow, unknown, none + kGet, "GetIsnsParms "},
       {kSet, "-A none -m dhcp -k ''", kOnlyOne, nullptr},
       {kSet, "-A none -m dhcp -k '' -v '' -I", kOnlyOne, nullptr},
       {kSet, "-A none -m dhcp -k '' -v ''", kMethod, nullptr},
       {kSet, "-A none -m static -k '' -D", kAddress, nullptr},
       {kSet, noAddress + "-k '' -D", bad + "|Unnable to set isns parameters.", nullptr},
-      {kSet, noAdapter + "-k '' -v ''", kKey, nullptr},
-      {kSet, noAdapter + "-k x -v ''", kValue, nullptr},
+      {kSet, noAdapter + "-k '' -v ''", "Invalid iscsi key input.", nullptr},
+      {kSet, noAdapter + "-k x -v ''", "Invalid iscsi value input.", nullptr},
       {kSet, noAdapter + "-k x -v 1", kUnknownAdapter, ""},
-      {kSet, server + "-k pollInterval -v 7", "Invalid parameter key" + Unset("isns"), "GetIsnsParms"},
-      {kSet, server + "-k PollInterval -D=false", kDefault, "GetIsnsParms"},
+      {kSet, server + "-k pollInterval -v 7", "Invalid parameter key" + Unset("isns"), "GetIsnsParms "},
+      {kSet, server + "-k PollInterval -D=false", kDefault, "GetIsnsParms "},
       {kSet, server + "-k PollInterval -v 3601", "PollInterval 3601 is not from 1 to 3600." + Unset("isns"),
-       "GetIsnsParms SetIsnsParms"},
+       "GetIsnsParms SetIsnsParms "},
       {kSetAdapter, "-A none -k ''", kTogether, nullptr},
       {kSetAdapter, "-A none -k '' -v 1 -D", kTogether, nullptr},
       {kSetAdapter, "-A none -k x -v 1", kUnknownAdapter, ""},
-      {kSetAdapter, "-A a0 -k x -v 1", "Invalid parameter key" + Unset("iSNS"), "GetAdapterIsnsParms"},
+      {kSetAdapter, "-A a0 -k x -v 1", "Invalid parameter key" + Unset("iSNS"), "GetAdapterIsnsParms "},
       {kSetAdapter, "-A a2 -k PollInterval -D", "Parameter PollInterval is not settable.\n",
-       "GetAdapterIsnsParms"},
-      {kSetAdapter, "-A a0 -k PollInterval -D=no", kDefault, "GetAdapterIsnsParms"},
+       "GetAdapterIsnsParms "},
+      {kSetAdapter, "-A a0 -k PollInterval -D=no", kDefault, "GetAdapterIsnsParms "},
       {kSetAdapter, "-A a0 -k PollInterval -v 4", "PollInterval 4 is not from 5 to 600." + Unset("iSNS"),
-       "GetAdapterIsnsParms SetAdapterIsnsParms"},
+       "GetAdapterIsnsParms SetAdapterIsnsParms "},
   };
   for (const auto& [name, options, messages, calls] : kCases) {
     SCOPED_TRACE(name + (" " + options));
@@ -99,9 +97,8 @@ TEST(Isns, EachCommandTestsInItsOrder) {
     const Outcome run = RunOn(host, name, options);
     EXPECT_EQ(run.messages, sweep::Parts(messages));
     std::string made;
-    for (const std::string& call : run.Calls()) made += (made.empty() ? "" : " ") + call;
-    const std::string looked = "GetScsiInterface";
-    EXPECT_EQ(made, calls == nullptr ? "" : *calls == 0 ? looked : looked + ' ' + calls);
+    for (const std::string& call : run.Calls()) made += call + ' ';
+    EXPECT_EQ(made, calls == nullptr ? "" : std::string("GetScsiInterface ") + calls);
     EXPECT_TRUE(run.result.is_null() && !run.closed);
     EXPECT_EQ(host.Show(), before);
   }
@@ -118,9 +115,8 @@ json Servers(Harness& host, const std::string& options) {
 
 TEST(Isns, ListAddRemove) {
   Harness host(kHost);
-  const json all = {"a0 static 192.0.2.1", "a0 dhcp ", "a0 slp ", "a0 static isns.example"};
-  EXPECT_EQ(Servers(host, ""), all);
-  EXPECT_EQ(Servers(host, "-A a0"), all);
+  EXPECT_EQ(Servers(host, "-A a0"),
+            (json{"a0 static 192.0.2.1", "a0 dhcp ", "a0 slp ", "a0 static isns.example"}));
   EXPECT_EQ(Servers(host, "-A a1"), json::array());
 
   EXPECT_EQ(RunOn(host, "AdapterDiscoveryIsnsAdd", "-A a0 -m static -a 2001:DB8:0::7").result, true);
@@ -131,14 +127,9 @@ TEST(Isns, ListAddRemove) {
 
 json ParmRow(const json& current, const json& standard, const json& min, const json& max,
              const json& settable, const json& inherit) {
-  return json{{{"ID", nullptr},
-               {"Name", "PollInterval"},
-               {"Current", current},
-               {"Default", standard},
-               {"Min", min},
-               {"Max", max},
-               {"Settable", settable},
-               {"Inherit", inherit}}};
+  json row = {{"ID", nullptr}, {"Name", "PollInterval"}, {"Current", current}, {"Default", standard}};
+  row.update({{"Min", min}, {"Max", max}, {"Settable", settable}, {"Inherit", inherit}});
+  return json::array({row});
 }
 
 TEST(Isns, ParameterGoesFromDefaultToValueToInherited) {
@@ -152,9 +143,8 @@ TEST(Isns, ParameterGoesFromDefaultToValueToInherited) {
   EXPECT_EQ(RunOn(host, "AdapterDiscoveryIsnsParamGet", "-A a0 -m static -a isns.example").result,
             ParmRow("20", "30", "2", "3600", true, false));
   EXPECT_EQ(set("-v 45"), true);
-  EXPECT_EQ(get(), ParmRow("45", "30", "1", "3600", true, false));
   EXPECT_EQ(set("--inherit=false"), true);
-  EXPECT_EQ(get()[0]["Inherit"], false);
+  EXPECT_EQ(get(), ParmRow("45", "30", "1", "3600", true, false));
   EXPECT_EQ(set("-I"), true);
   EXPECT_EQ(set("-D"), true);
   EXPECT_EQ(get(), ParmRow("30", "30", "1", "3600", true, false));
@@ -164,7 +154,6 @@ TEST(Isns, ParameterGoesFromDefaultToValueToInherited) {
   const auto adapter = [&] { return RunOn(host, "AdapterIsnsParamGet", "-A a0").result; };
   EXPECT_EQ(adapter(), ParmRow("60", "30", "5", "600", true, false));
   EXPECT_EQ(RunOn(host, "AdapterIsnsParamSet", "-A a0 -k PollInterval -v 600abc").result, true);
-  EXPECT_EQ(adapter()[0]["Current"], "600");
   EXPECT_EQ(get()[0]["Current"], "600");
   EXPECT_EQ(RunOn(host, "AdapterIsnsParamSet", "-A a0 -k PollInterval -D").result, true);
   EXPECT_EQ(adapter()[0]["Current"], "30");
