@@ -27,24 +27,30 @@ std::string Refusal(Body body) {
 }
 
 TEST(Conversions, LevelWordsGoBothWaysAndAreExact) {
-  const char* words[] = {"prohibited", "discouraged", "preferred", "required"};
-  for (int number = 1; number <= 4; ++number) {
-    const std::string word = words[number - 1];
+  int number = 0;
+  for (const std::string word : {"prohibited", "discouraged", "preferred", "required"}) {
+    ++number;
     EXPECT_EQ(IscsiTools::GetStringFromDigest(iScsiDigestType(number)), word);
     EXPECT_EQ(int(IscsiTools::GetDigestFromString(word)), number);
     EXPECT_EQ(IscsiTools::GetStringFromChapType(iScsiChapType(number)), word);
     EXPECT_EQ(int(IscsiTools::GetChapTypeFromString(word)), number);
   }
-  for (const int number : {-1, 0, 5, 1 << 30}) {
-    EXPECT_EQ(Refusal([&] { IscsiTools::GetStringFromDigest(iScsiDigestType(number)); }),
+  for (const int other : {-1, 0, 5}) {
+    EXPECT_EQ(Refusal([&] { IscsiTools::GetStringFromDigest(iScsiDigestType(other)); }),
               "Invalid digest value");
-    EXPECT_EQ(Refusal([&] { IscsiTools::GetStringFromChapType(iScsiChapType(number)); }),
+    EXPECT_EQ(Refusal([&] { IscsiTools::GetStringFromChapType(iScsiChapType(other)); }),
               "Invalid Chap Level value");
   }
   for (const char* word : {"", "Required", "required ", "none"}) {
     EXPECT_EQ(Refusal([&] { IscsiTools::GetDigestFromString(word); }), "Invalid digest value");
     EXPECT_EQ(Refusal([&] { IscsiTools::GetChapTypeFromString(word); }), "Invalid Chap Level value");
   }
+  const auto list =
+      Plinth::MetaObj::MetaList::New(Plinth::MetaObj::MetaType::Struct, IscsiTools::ParmStructure());
+  const auto fill = [&] {
+    IscsiTools::ParmFill("id", list, {}, iScsiDigestType::Required, iScsiDigestType{9}, true, true);
+  };
+  EXPECT_EQ(Refusal(fill), "Invalid digest value");
   EXPECT_EQ(IscsiTools::GetStringFromImaDigest(0), "none");
   EXPECT_EQ(IscsiTools::GetStringFromImaDigest(1), "crc32c");
   EXPECT_EQ(Refusal([] { IscsiTools::GetStringFromImaDigest(2); }), "Invalid digest value");
@@ -175,15 +181,10 @@ TEST(Addresses, ValuesOfTheIpConfiguration) {
 }
 
 TEST(Parameters, NumbersAreWhatStrtolMakesOfThem) {
-  const std::map<std::string, std::int64_t> cases = {{"12abc", 12},
-                                                     {"abc", 0},
-                                                     {"", 0},
-                                                     {" 7", 7},
-                                                     {"-1", -1},
-                                                     {"2147483647", 2147483647},
-                                                     {"4294967301", 5},
-                                                     {"99999999999999999999", -1},
-                                                     {"-99999999999999999999", 0}};
+  const std::map<std::string, std::int64_t> cases = {{" 12abc", 12},    {"abc", 0},
+                                                     {"-1", -1},        {"2147483647", 2147483647},
+                                                     {"4294967301", 5}, {"99999999999999999999", -1},
+                                                     {"", 0},           {"-99999999999999999999", 0}};
   for (const auto& [text, stored] : cases) {
     iScsiParms parms;
     parms.loginTimeoutInherited = true;
@@ -236,17 +237,6 @@ TEST(Parameters, KeysAreExact) {
     };
     for (const auto& operation : operations) EXPECT_EQ(Refusal(operation), "Invalid parameter key") << key;
   }
-}
-
-TEST(Parameters, ADigestOutsideTheWordsIsRefused) {
-  const iScsiParms parms;
-  const auto list =
-      Plinth::MetaObj::MetaList::New(Plinth::MetaObj::MetaType::Struct, IscsiTools::ParmStructure());
-  EXPECT_EQ(Refusal([&] {
-              IscsiTools::ParmFill("id", list, parms, iScsiDigestType::Required, iScsiDigestType{9}, true,
-                                   true);
-            }),
-            "Invalid digest value");
 }
 
 }  // namespace

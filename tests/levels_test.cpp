@@ -267,27 +267,21 @@ TEST(ChapGet, ShowsOneDirection) {
   Harness host(kHost);
   EXPECT_EQ(ChapRow(host, kLevels[0], "uni")["Adapter"], "hba0");
   EXPECT_EQ(ChapRow(host, kLevels[1], "uni")["Sendtarget"], "192.0.2.1:3260");
-  const Outcome all =
-      host("iscsi adapter target portal auth chap get -A hba0 -n all -a all -d mutual -m chap");
-  ASSERT_EQ(all.result.size(), 2u);
-  EXPECT_EQ(all.result[1], json::parse(R"({"TargetName": "iqn.2026-11.org.example:found",
+  const json all =
+      host("iscsi adapter target portal auth chap get -A hba0 -n all -a all -d mutual -m chap").result;
+  EXPECT_EQ(all.at(1), json::parse(R"({"TargetName": "iqn.2026-11.org.example:found",
       "Address": "192.0.2.9:3260", "Method": "chap", "Direction": "mutual", "Name": "none",
       "Level": "prohibited", "Inheritance": true, "Parent": "192.0.2.1:3260"})"));
-}
-
-/// kHost with entries of @p level, named "u" and "m", of which the first has the level @p uni.
-std::string HostWithChap(const LevelCase& level, const std::string& uni) {
-  json host = json::parse(kHost);
-  host[json::json_pointer(std::string(level.record) + "/chap")] = {
-      {"uni", {{"name", "u"}, {"secret", "secret-u"}, {"level", uni}}},
-      {"mutual", {{"name", "m"}, {"secret", "secret-m"}, {"level", "required"}}}};
-  return host.dump();
 }
 
 /// Sets the level @p wanted, or the default where that is empty, of one direction while uni is at @p uni.
 void CheckChapSet(const LevelCase& level, const std::string& uni, bool mutual, const std::string& wanted) {
   SCOPED_TRACE(level.path + uni + (mutual ? " mutual " : " uni ") + wanted);
-  Harness host(HostWithChap(level, uni));
+  json description = json::parse(kHost);
+  description[json::json_pointer(std::string(level.record) + "/chap")] = {
+      {"uni", {{"name", "u"}, {"secret", "secret-u"}, {"level", uni}}},
+      {"mutual", {{"name", "m"}, {"secret", "secret-m"}, {"level", "required"}}}};
+  Harness host(description.dump());
   const Outcome run = host(level.Command(std::string("auth chap set") + (mutual ? " -d mutual" : "") +
                                          (wanted.empty() ? " -D" : " -N n -S secret-n -l " + wanted)));
   const bool off = wanted.empty() || wanted == "prohibited";
@@ -296,14 +290,12 @@ void CheckChapSet(const LevelCase& level, const std::string& uni, bool mutual, c
                         : uni != "required"    ? kBadCombination
                                                : nullptr;
   const bool done = refusal == nullptr;
-  std::vector<std::pair<const char*, const char*>> operations;
-  if (level.Inherits()) operations.emplace_back("Get", "Parms");
-  if (mutual && refusal != kBadLevel) operations.emplace_back("Get", "ChapParameters");
-  if (done && level.Inherits()) operations.emplace_back("Set", "Parms");
-  if (done) operations.emplace_back("Set", "ChapParameters");
-  if (!mutual && off) operations.emplace_back("Set", "ChapParameters");
   Texts calls = {"GetScsiInterface"};
-  for (const auto& [verb, what] : operations) calls.push_back(level.Operation(verb, what));
+  if (level.Inherits()) calls.push_back(level.Operation("Get", "Parms"));
+  if (mutual && refusal != kBadLevel) calls.push_back(level.Operation("Get", "ChapParameters"));
+  if (done && level.Inherits()) calls.push_back(level.Operation("Set", "Parms"));
+  if (done) calls.push_back(level.Operation("Set", "ChapParameters"));
+  if (!mutual && off) calls.push_back(level.Operation("Set", "ChapParameters"));
   EXPECT_EQ(run.Calls(), calls);
   EXPECT_EQ(run.messages, done ? Texts() : Texts{refusal});
   EXPECT_EQ(run.result, done ? json(true) : json());
@@ -330,21 +322,17 @@ TEST(ChapSet, DirectionLevelAndTheCurrentUniLevel) {
 TEST(ChapSet, InputIsTestedBehindTheAdapterAndAheadOfAnyStore) {
   constexpr char kInput[] =
       "Invalid CHAP authentication input. Make sure [--default] or [--authname --secret --level] is given.";
-  const struct {
-    const char* options;
-    const char* message;
-  } cases[] = {
+  const std::pair<const char*, const char*> cases[] = {
       {"", kInput},
       {" -N a -S b", kInput},
       {" -N a -l required", kInput},
       {" --default=false -N a -S b -l required", kFalseDefault},
   };
   for (const LevelCase& level : kLevels) {
-    for (const auto& c : cases) {
-      Harness host(kHost);
-      const Outcome run = host(level.Command("auth chap set") + c.options);
-      EXPECT_THAT(run.messages, ElementsAre(c.message)) << level.path << c.options;
-      EXPECT_EQ(run.Calls().size(), level.Inherits() ? 2u : 1u) << c.options;
+    for (const auto& [options, message] : cases) {
+      const Outcome run = Harness(kHost)(level.Command("auth chap set") + options);
+      EXPECT_THAT(run.messages, ElementsAre(message)) << level.path << options;
+      EXPECT_EQ(run.Calls().size(), level.Inherits() ? 2u : 1u) << options;
     }
   }
 }
@@ -379,21 +367,21 @@ TEST(ChapSet, InheritSetsTheMarkOfTheDirectionAlone) {
 TEST(ChapSet, WhatTheAdapterLacksIsRefusedWithoutTheSecret) {
   for (const LevelCase& level : kLevels) {
     Harness host(kHost);
-    const Outcome run = host(level.Command("auth chap set -N a -S hush-hush-hush -l required", "bare"));
-    EXPECT_THAT(run.messages, ElementsAre(level.chapSetFailure));
-    EXPECT_THAT(run.trace.back(), HasSubstr("CHAP cannot be required: the adapter lacks"));
-    EXPECT_THAT(run.trace.back() + run.err, testing::Not(HasSubstr("hush")));
-    const std::pair<std::string, const char*> secrets[] = {
-        {"hush\xff", "The CHAP secret is not UTF-8."},
-        {std::string("hush\0", 5), "The CHAP secret has a zero byte."},
-        {std::string(252, ' ') + "hush", "The CHAP secret has 256 bytes, and from 1 to 255 are allowed."},
-        {"***", "The CHAP secret is ***, which stands for a secret that is not shown."}};
-    for (const auto& [secret, reason] : secrets) {
+    const std::string lacked = level.Inherits() ? "Target Level Authentication" : "CHAP Authorization";
+    const std::tuple<const char*, std::string, std::string> cases[] = {
+        {"bare", "hush-hush-hush",
+         "CHAP cannot be required: the adapter lacks \"" + lacked + " Supported\"."},
+        {"hba0", "hush\xff", "The CHAP secret is not UTF-8."},
+        {"hba0", std::string("hush\0", 5), "The CHAP secret has a zero byte."},
+        {"hba0", std::string(252, ' ') + "hush",
+         "The CHAP secret has 256 bytes, and from 1 to 255 are allowed."},
+        {"hba0", "***", "The CHAP secret is ***, which stands for a secret that is not shown."}};
+    for (const auto& [adapter, secret, reason] : cases) {
       host.input = secret;
-      const Outcome unfit = host(level.Command("auth chap set -N a -S - -l required"));
-      EXPECT_THAT(unfit.messages, ElementsAre(level.chapSetFailure));
-      EXPECT_THAT(unfit.trace.back(), testing::EndsWith(reason));
-      EXPECT_THAT(unfit.trace.back() + unfit.err, testing::Not(HasSubstr("hush")));
+      const Outcome run = host(level.Command("auth chap set -N a -S - -l required", adapter));
+      EXPECT_THAT(run.messages, ElementsAre(level.chapSetFailure));
+      EXPECT_THAT(run.trace.back(), testing::EndsWith(reason));
+      EXPECT_THAT(run.trace.back() + run.err, testing::Not(HasSubstr("hush")));
     }
     EXPECT_EQ(host(level.Command("auth chap set -l prohibited", "bare")).result, true);
     EXPECT_THAT(host(level.Command("auth chap set --authname= -S s -l required")).messages,

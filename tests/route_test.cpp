@@ -104,11 +104,10 @@ TEST(RouteAdd, ReadsTheEntry) {
     EXPECT_EQ(List(host, "").result.size(), run.messages.empty() ? 5u : 4u);
   }
   Harness host(kHost);
-  const std::string rest = " -s 10.0.0.0/8 -n nic1 -g ";
-  EXPECT_THAT(Add(host, "-A hba0" + rest + "router").messages,
-              ElementsAre("Unable to parse gateway IP address."));
-  EXPECT_THAT(Add(host, "-A nohba" + rest + "router").messages, ElementsAre(kInvalidAdapter));
-  EXPECT_THAT(Add(host, "-A hba1" + rest + "router").messages, ElementsAre("Unable to find network portal."));
+  const std::string rest = " -s 10.0.0.0/8 -n nic1 -g router";
+  EXPECT_THAT(Add(host, "-A hba0" + rest).messages, ElementsAre("Unable to parse gateway IP address."));
+  EXPECT_THAT(Add(host, "-A nohba" + rest).messages, ElementsAre(kInvalidAdapter));
+  EXPECT_THAT(Add(host, "-A hba1" + rest).messages, ElementsAre("Unable to find network portal."));
   EXPECT_THAT(Add(host, "-A hba0 -n nic1 -g 192.0.2.1 -s 198.51.100.0/24 -c 2").messages,
               ElementsAre("Add route failed."));  // there already
 }
