@@ -62,11 +62,9 @@ TEST(IbftBoot, ImportTakesChapFromTheTableAndTheAdapterByItsMac) {
       "port": 860, "chap": {"uni": {"name": "once", "secret": "x"}, "mutual": {"name": "two", "secret": "y"}}}]})";
   const json required = json::parse(
       R"({"uni": {"inherited": false, "name": "one", "secret": "secret-one-0123", "level": "required"}})");
-  const struct {
-    const char* table;    // what is different in it
-    const char* adapter;  // and in the first adapter
-    json chap;            // of the static target; null where there is none
-  } kCases[] = {
+  // What is different in the table and in the first adapter, and the CHAP of the static target; null without
+  // one.
+  const std::tuple<std::string, std::string, json> cases[] = {
       {R"({"chapType": 0})", "{}", json::object()},
       {R"({"chapType": 1})", "{}", required},
       {R"({"chapType": 0})", kImported, json::object()},
@@ -90,13 +88,13 @@ TEST(IbftBoot, ImportTakesChapFromTheTableAndTheAdapterByItsMac) {
       {R"({"chapType": 0, "macAddress": "nonsense"})", "{}", nullptr},
       {R"({"chapType": 0, "macAddress": ""})", R"({"physicalPortals": []})", json::object()},
   };
-  for (const auto& [table, adapter, chap] : kCases) {
+  for (const auto& [table, adapter, chap] : cases) {
     json description = json::parse(kHost);
     description["nics"] = json::parse(R"([{"name": "nic2", "mac": "02:00:00:00:00:02"}])");
     description["bootTables"][1].update(json::parse(table));
     description["adapters"].erase(1);  // "plain", which cannot take CHAP, and nothing else
     description["adapters"][0].update(json::parse(adapter), true);
-    SCOPED_TRACE(std::string(table) + adapter);
+    SCOPED_TRACE(table + adapter);
     Harness host(description.dump());
     EXPECT_EQ(host("iscsi ibftboot import").result, chap.is_null() ? json() : json(true));
     const json targets = host.Show("/adapters/0/staticTargets");

@@ -206,15 +206,11 @@ TEST(IpconfigGet, SettlesTheName) {
       "IPv6": "fe80::9/64 2001:db8::1/64 2001:db8::2/64 2001:db8::3/64 ", "UseDhcpv4": true,
       "Gateway": "192.0.2.1", "PrimaryDNS": "192.0.2.53", "SecondaryDNS": "2001:db8::53"})"));
 
-  // What GetLogicalNetworkPortals throws decides with the kind of the adapter.
+  // What GetLogicalNetworkPortals throws, if anything, decides with the kind of the adapter. The name is null
+  // where the command fails.
   const std::string notSupported =
       "iScsiLibException: status(80000001): Not supported; Message= IMA_TSR_GetLnpOidList";
-  const struct {
-    const char* options;
-    const char* kind;
-    std::string thrown;  // empty for nothing
-    json name;           // null where the command fails
-  } kCases[] = {
+  const std::tuple<std::string, std::string, std::string, json> cases[] = {
       {"-n nosuch", "independent", "", "nosuch"},
       {"-n ''", "independent", "", ""},
       {"", "dependent", "", ""},
@@ -222,16 +218,15 @@ TEST(IpconfigGet, SettlesTheName) {
       {"", "independent", notSupported + "!", nullptr},
       {"", "dependent", notSupported, nullptr},
   };
-  for (const auto& [options, kind, thrown, name] : kCases) {
+  for (const auto& [options, kind, thrown, name] : cases) {
     json other = host;
     other["adapters"][0]["kind"] = kind;
-    if (std::string(kind) == "dependent") other["adapters"][0].erase("logicalPortals");
+    if (kind == "dependent") other["adapters"][0].erase("logicalPortals");
     if (!thrown.empty()) {
       other["answers"] = {
           {{"operation", "GetLogicalNetworkPortals"}, {"throw", "NodeCtlException"}, {"text", thrown}}};
     }
-    const Outcome run =
-        Harness(other.dump())(std::string("iscsi networkportal ipconfig get -A a0 ") + options);
+    const Outcome run = Harness(other.dump())("iscsi networkportal ipconfig get -A a0 " + options);
     EXPECT_EQ(run.messages.empty() ? run.result[0]["Hostnic"] : json(), name) << options << kind << thrown;
   }
 }

@@ -102,18 +102,14 @@ TEST(PortalLists, PassOverWhatTheyMay) {
   for (const PortalList& list : kLists) {
     const bool all = list.passedOver == nullptr;
     const std::string exact = all ? "whatever" : list.passedOver;
-    const struct {
-      const char* adapter;
-      std::string text;
-      bool passedOver;
-    } kCases[] = {
+    const std::tuple<std::string, std::string, bool> cases[] = {
         {"ind", exact, true},
         {"soft", exact, all},
         {"dep", exact, all},
         {"ind", exact + ".", all},
         {"ind", exact == kNoNics ? kNoPortals : kNoNics, all},
     };
-    for (const auto& [adapter, text, passedOver] : kCases) {
+    for (const auto& [adapter, text, passedOver] : cases) {
       const json answer = {
           {"operation", list.operation}, {"adapter", adapter}, {"throw", "NodeCtlException"}, {"text", text}};
       SCOPED_TRACE(answer.dump());
@@ -121,9 +117,9 @@ TEST(PortalLists, PassOverWhatTheyMay) {
       EXPECT_EQ(run.result.is_array(), passedOver);
       EXPECT_EQ(run.messages, passedOver ? Texts() : Texts{list.failure});
       // The adapter was found, though it shows nothing.
-      const Outcome alone = List(list, std::string("-A ") + adapter, answer.dump());
+      const Outcome alone = List(list, "-A " + adapter, answer.dump());
       EXPECT_EQ(alone.result, passedOver ? json::array() : json());
-      if (passedOver && std::string(adapter) == "ind") {
+      if (passedOver && adapter == "ind") {
         EXPECT_EQ(Names(run), list.others);
       }
     }
@@ -151,11 +147,8 @@ TEST(PhysicalNetworkPortalList, ShowsSpeedsWhole) {
 }
 
 TEST(NetworkPortalBinding, ChecksReportsAndStores) {
-  const struct {
-    const char* line;
-    const char* message;  // null for success
-    const char* call;     // the last one
-  } kCases[] = {
+  // The message, null for success, and the last call.
+  const std::tuple<const char*, const char*, const char*> cases[] = {
       {"add -A none -n ''", "Invalid networkportal input.", ""},
       {"remove -A none -n ''", "Invalid networkportal input.", ""},
       {"add -A dep -n nic1", nullptr, "BindHostnic(dep, \"nic1\", false) = ok"},
@@ -179,7 +172,7 @@ TEST(NetworkPortalBinding, ChecksReportsAndStores) {
        "\"soft\"."},
   };
   Harness host(kHost);
-  for (const auto& [line, message, call] : kCases) {
+  for (const auto& [line, message, call] : cases) {
     SCOPED_TRACE(line);
     const Outcome run = host(std::string("iscsi networkportal ") + line);
     EXPECT_EQ(run.messages, message == nullptr ? Texts() : Texts{message});
@@ -192,11 +185,9 @@ TEST(NetworkPortalBinding, ChecksReportsAndStores) {
 }
 
 TEST(PhysicalParam, GetLabelsItsRowsAndReadsTheAdapter) {
-  const struct {
-    const char* options;
-    const char* phynic;
-  } kCases[] = {{"-A ind", "phy0"}, {"-A ind -n other", "other"}, {"-A ind -n ''", ""}, {"-A bare", ""}};
-  for (const auto& [options, phynic] : kCases) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"-A ind", "phy0"}, {"-A ind -n other", "other"}, {"-A ind -n ''", ""}, {"-A bare", ""}};
+  for (const auto& [options, phynic] : cases) {
     const Outcome run = Harness(kHost)(std::string("iscsi physicalnetworkportal param get ") + options);
     const bool settable = std::string(options).starts_with("-A ind");
     EXPECT_EQ(run.result,
@@ -214,11 +205,8 @@ TEST(PhysicalParam, GetLabelsItsRowsAndReadsTheAdapter) {
 
 TEST(PhysicalParam, SetJudgesAndStores) {
   constexpr char kFailure[] = "Failed to set parameter for physical network portal.";
-  const struct {
-    const char* options;
-    const char* message;  // null for success
-    const char* lastCall;
-  } kCases[] = {
+  // The message, null for success, and the last call.
+  const std::tuple<const char*, const char*, const char*> cases[] = {
       {"-A soft -o MTU -v 9000",
        "Physical Network Portal parameter set is not supported on software or dependent hardware iSCSI "
        "adapter.",
@@ -232,7 +220,7 @@ TEST(PhysicalParam, SetJudgesAndStores) {
       {"-A ind -o ArpRedirect -v -1", nullptr, "SetArpRedirect"},
   };
   Harness host(kHost);
-  for (const auto& [options, message, lastCall] : kCases) {
+  for (const auto& [options, message, lastCall] : cases) {
     SCOPED_TRACE(options);
     const Outcome run = host(std::string("iscsi physicalnetworkportal param set ") + options);
     EXPECT_EQ(run.messages, message == nullptr ? Texts() : Texts{message});
