@@ -1,4 +1,4 @@
-// iscsi adapter discovery: rediscovery and its status, the lists of sendtargets and of static targets.
+// iscsi adapter discovery: the lists of sendtargets and of static targets.
 #include "support/Harness.h"
 
 namespace {
@@ -18,14 +18,6 @@ constexpr char kHost[] = R"({"adapters": [
                       "sendTarget": {"host": "192.0.2.1"}}]},
   {"name": "bare"}]})";
 constexpr char kUnknownAdapter[] = "Invalid adapter specified or unable to get adapter.";
-
-TEST(Discovery, RediscoveryStartsAndTheStatusTells) {
-  Harness host(kHost);
-  EXPECT_EQ(host("iscsi adapter discovery status get -A hba0").result, "Discovery Completed");
-  EXPECT_EQ(host("iscsi adapter discovery rediscover -A hba0").result, "Rediscovery started");
-  EXPECT_EQ(host("iscsi adapter discovery status get -A hba0").result,
-            "Discovery Completed, Some iSCSI Targets failed to login.");
-}
 
 TEST(Discovery, ListsKeepTheirOrderAndShowEachForm) {
   Harness host(kHost);

@@ -6,7 +6,6 @@ namespace {
 
 using nlohmann::json;
 using testing::ElementsAre;
-using testing::IsEmpty;
 using Texts = std::vector<std::string>;
 
 constexpr char kHost[] = R"({
@@ -151,25 +150,22 @@ TEST(NetworkPortalBinding, ChecksReportsAndStores) {
   const std::tuple<const char*, const char*, const char*> cases[] = {
       {"add -A none -n ''", "Invalid networkportal input.", ""},
       {"remove -A none -n ''", "Invalid networkportal input.", ""},
-      {"add -A dep -n nic1", nullptr, "BindHostnic(dep, \"nic1\", false) = ok"},
+      {"add -A dep -n nic1", nullptr, R"(BindHostnic(dep, "nic1", false) = ok)"},
       {"add -A dep -n nic1 -f true", "Unable to bind iscsi port. [force = 1]\n",
-       "BindHostnic(dep, \"nic1\", true) ! NodeCtlException: The NIC \"nic1\" is bound to the adapter "
-       "\"dep\" already."},
+       R"(BindHostnic(dep, "nic1", true) ! NodeCtlException: The NIC "nic1" is bound to the adapter "dep" already.)"},
       {"add -A dep -n nic3 -f false", "Unable to bind iscsi port. [force = 0]\n",
-       "BindHostnic(dep, \"nic3\", false) ! NodeCtlException: The NIC \"nic3\" is not compliant: No uplink."},
-      {"add -A dep -n nic3 -f true", nullptr, "BindHostnic(dep, \"nic3\", true) = ok"},
+       R"(BindHostnic(dep, "nic3", false) ! NodeCtlException: The NIC "nic3" is not compliant: No uplink.)"},
+      {"add -A dep -n nic3 -f true", nullptr, R"(BindHostnic(dep, "nic3", true) = ok)"},
       {"add -A dep -n nic9", "Unable to bind iscsi port. [force = 0]\n",
-       "BindHostnic(dep, \"nic9\", false) ! NodeCtlException: The host has no NIC \"nic9\"."},
+       R"(BindHostnic(dep, "nic9", false) ! NodeCtlException: The host has no NIC "nic9".)"},
       {"add -A ind -n nic1", "Unable to bind iscsi port. [force = 0]\n",
-       "BindHostnic(ind, \"nic1\", false) ! NodeCtlException: The adapter \"ind\" has ports of its own, and "
-       "takes no host NIC."},
+       R"(BindHostnic(ind, "nic1", false) ! NodeCtlException: The adapter "ind" has ports of its own, and takes no host NIC.)"},
       {"remove -A soft -n nic1", "Unable to unbind iscsi port.",
-       "UnbindHostnic(soft, \"nic1\", false) ! NodeCtlException: Active sessions use the NIC \"nic1\"."},
-      {"remove -A soft -n nic1 -f yes", nullptr, "UnbindHostnic(soft, \"nic1\", true) = ok"},
-      {"remove -A soft -n nic2", nullptr, "UnbindHostnic(soft, \"nic2\", false) = ok"},
+       R"(UnbindHostnic(soft, "nic1", false) ! NodeCtlException: Active sessions use the NIC "nic1".)"},
+      {"remove -A soft -n nic1 -f yes", nullptr, R"(UnbindHostnic(soft, "nic1", true) = ok)"},
+      {"remove -A soft -n nic2", nullptr, R"(UnbindHostnic(soft, "nic2", false) = ok)"},
       {"remove -A soft -n nic1 -f yes", "Unable to unbind iscsi port.",
-       "UnbindHostnic(soft, \"nic1\", true) ! NodeCtlException: The NIC \"nic1\" is not bound to the adapter "
-       "\"soft\"."},
+       R"(UnbindHostnic(soft, "nic1", true) ! NodeCtlException: The NIC "nic1" is not bound to the adapter "soft".)"},
   };
   Harness host(kHost);
   for (const auto& [line, message, call] : cases) {

@@ -74,7 +74,6 @@ TEST(Pending, TakesEffectWhenTheAdapterSaysSo) {
       Harness host(HostWith(R"({"applies": {")" + std::string(setting.group) + R"(": ")" + when + R"("}})"));
       const auto shown = [&] { return Field(host, "iscsi " + setting.get, setting.field, setting.option); };
       EXPECT_EQ(shown(), setting.before);
-      const std::string unchanged = host.Show("/adapters/0").dump();
       const Outcome run = host("iscsi " + setting.set);
       const bool asked = when == "reboot" && !setting.silent;
       const bool waits = when == "reboot" || (when == "reset" && setting.silent);
@@ -96,7 +95,6 @@ TEST(Pending, TakesEffectWhenTheAdapterSaysSo) {
       EXPECT_EQ(Reboot(host).result, true);
       EXPECT_EQ(shown(), setting.after);
       EXPECT_EQ(host::Host::Current().Show(true).find("\"pending\""), std::string::npos);
-      EXPECT_NE(host.Show("/adapters/0").dump(), unchanged);
     }
   }
 }

@@ -96,17 +96,15 @@ TEST(ConnectionList, ReadsNothingOfWhatIsFilteredOut) {
 }
 
 TEST(ConnectionList, UnknownDigestLeavesTheCommand) {
-  const Outcome run = Harness(R"({"adapters": [{"name": "a", "targets": [{"name": "t", "sessions": [{
-        "isid": "000000000000", "connections": [{"cid": 0, "dataDigest": 2}]}]}]}]})")(
-      "iscsi session connection list");
+  Harness host(R"({"adapters": [{"name": "a", "targets": [{"name": "t", "sessions": [
+      {"isid": "000000000000", "connections": [{"cid": 0, "dataDigest": 2}]}]}]}]})");
+  const Outcome run = host("iscsi session connection list");
   EXPECT_EQ(run.status, 4);
   EXPECT_THAT(run.failure, testing::HasSubstr("Invalid digest value"));
-  EXPECT_THAT(run.messages, IsEmpty());
-  EXPECT_TRUE(run.result.is_null());
 }
 
 TEST(SessionList, SaysOfUnreadableSessionsThatTheyAreNotSupported) {
-  Harness host(WithAnswers(kHost, R"({"operation": "IMA_GetSessionProperties", "call": 3, "imaStatus": 1})"));
+  Harness host(WithAnswers(kHost, R"({"operation": "IMA_GetSessionProperties", "imaStatus": 1})"));
   EXPECT_THAT(host("iscsi session list").messages, ElementsAre("Feature not supported by this adapters."));
 }
 
