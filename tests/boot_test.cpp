@@ -96,14 +96,16 @@ TEST(IbftBoot, ImportTakesChapFromTheTableAndTheAdapterByItsMac) {
     description["adapters"][0].update(json::parse(adapter), true);
     SCOPED_TRACE(table + adapter);
     Harness host(description.dump());
-    EXPECT_EQ(host("iscsi ibftboot import").result, chap.is_null() ? json() : json(true));
+    const Outcome run = host("iscsi ibftboot import");
+    EXPECT_EQ(run.result, chap.is_null() ? json() : json(true));
+    EXPECT_EQ(run.trace[0].find("secret-"), std::string::npos);
     const json targets = host.Show("/adapters/0/staticTargets");
     ASSERT_EQ(targets.size(), chap.is_null() ? 0u : 1u);
     EXPECT_EQ(targets.empty() ? json() : targets[0]["chap"], chap);
   }
 }
 
-TEST(IbftBoot, FailuresHaveOneText) {
+TEST(IbftBoot, FailuresHaveOneTextAndNoSecret) {
   Harness failing(WithAnswers(kHost, R"({"operation": "GetiScsiBootTables", "throw": "NodeCtlException"})"));
   EXPECT_THAT(failing("iscsi ibftboot get").messages, ElementsAre("Unable to get boot tables."));
   // No table, one that is off, and one without a usable target.
@@ -111,8 +113,9 @@ TEST(IbftBoot, FailuresHaveOneText) {
                             R"([{"table": "primary", "enabled": 1, "chapPwd": "secret-one-0123"}])"}) {
     json host = json::parse(kHost);
     host["bootTables"] = json::parse(table);
-    EXPECT_THAT(Harness(host.dump())("iscsi ibftboot import").messages,
-                ElementsAre("Unable to import IBFT Boot table."));
+    const Outcome run = Harness(host.dump())("iscsi ibftboot import");
+    EXPECT_THAT(run.messages, ElementsAre("Unable to import IBFT Boot table."));
+    EXPECT_EQ(run.trace[0].find("secret-"), std::string::npos);
   }
 }
 

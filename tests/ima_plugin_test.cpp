@@ -27,6 +27,7 @@ TEST(PluginList, SelectsAndNeverPostsNothing) {
       {"", {vendor, "first", "second"}, {}},
       {"-p libb.so", {"first"}, {}},
       {"-p LIBB.SO", {}, {kNoMatch}},
+      {"-p ''", {}, {kNoMatch}},
       {"-A hba0", {vendor}, {}},
       {"-A hba1", {"first"}, {}},
       {"-A hba2", {}, {"Unable to get plugin identifier."}},

@@ -183,6 +183,7 @@ TEST(ParamSet, OptionsAreTestedInOrder) {
     // The message, and whether it comes before the lookup of the adapter.
     const std::tuple<std::string, std::string, bool> cases[] = {
         {" -k LoginTimeout", options, true},
+        {" -k '' -v '' --default=false", options, true},
         {" -k '' -v ''", "Invalid iscsi key input.", true},
         {" -k LoginTimeout -v ''", "Invalid iscsi value input.", true},
         {" -k LoginTimeout --default=false", kFalseDefault, false},
@@ -206,7 +207,7 @@ TEST(ParamSet, OptionsAreTestedInOrder) {
   Harness host(kHost);
   EXPECT_THAT(host(kLevels[0].Command("param set -k LoginTimeout -v 61")).trace.back(),
               HasSubstr("LoginTimeout cannot be set to 61: its range is from 1 to 60."));
-  for (const char* pair : {" -v 1 -I", " -v 1 --default=false", " -I -D"}) {
+  for (const char* pair : {" -v 1 -I", " -v 1 -D", " -I -D"}) {
     EXPECT_THAT(host(kLevels[1].Command("param set -k LoginTimeout") + pair).messages,
                 ElementsAre("Only one options value, inherit, default can be used at once."));
   }
