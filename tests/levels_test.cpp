@@ -359,6 +359,17 @@ TEST(ChapSet, InheritSetsTheMarkOfTheDirectionAlone) {
   }
 }
 
+TEST(ChapSet, ARefusedEntryLeavesTheInheritedOneInForce) {
+  for (const LevelCase& level : kLevels) {
+    if (!level.Inherits()) continue;
+    Harness host(kHost);
+    host(kLevels[0].Command("auth chap set -N top -S secret-top -l required"));
+    EXPECT_EQ(host(level.Command("auth chap set -l required -N a -S '***'")).status, 1);
+    const json row = ChapRow(host, level, "uni");
+    EXPECT_EQ(json({row["Name"], row["Level"], row["Inheritance"]}), json({"top", "required", false}));
+  }
+}
+
 TEST(ChapSet, WhatTheAdapterLacksIsRefusedWithoutTheSecret) {
   for (const LevelCase& level : kLevels) {
     Harness host(kHost);

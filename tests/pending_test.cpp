@@ -119,6 +119,31 @@ TEST(Pending, WhatWaitsCanBeTakenBackAndIsKeptBySetsOfOthers) {
   EXPECT_EQ(host.Show("/adapters/0/parameters/MaxBurstLength/current"), 1024);
 }
 
+TEST(Pending, ParametersThatTheDescriptionDoesNotNameAreTakenBack) {
+  for (const char* line :
+       {"-k LoginTimeout -v 20|-k LoginTimeout -v 15", "-k HeaderDigest -v required|-k HeaderDigest -D"}) {
+    Harness host(HostWith(R"({"applies": {"parameters": "reboot"}})"));
+    const std::string before = host::Host::Current().Show(true);
+    const std::string lines = line;
+    const std::string set = "iscsi adapter param set -A a0 ";
+    for (int time = 0; time < 2; ++time) {
+      EXPECT_THAT(host(set + lines.substr(0, lines.find('|'))).messages, ElementsAre(kReboot)) << line;
+    }
+    EXPECT_THAT(host(set + lines.substr(lines.find('|') + 1)).messages, IsEmpty()) << line;
+    EXPECT_EQ(host::Host::Current().Show(true), before);
+  }
+}
+
+TEST(Pending, AResetThatFailedIsAskedForAgain) {
+  Harness host(WithAnswers(HostWith(R"({"applies": {"parameters": "reset"}})"),
+                           R"({"operation": "ResetAdapter", "throw": "NodeCtlException", "call": 1})"));
+  const std::string set = "iscsi adapter param set -A a0 -k MaxCmds -v 64";
+  EXPECT_EQ(host(set).status, 1);
+  EXPECT_EQ(host.Show("/adapters/0/parameters"), json::object());
+  EXPECT_EQ(host(set).result, true);
+  EXPECT_EQ(host.Show("/adapters/0/parameters/MaxCmds/current"), 64);
+}
+
 // Commands show the addresses in effect, and ask again for what waits.
 TEST(Pending, AddressesAreAddedAndRemovedOnceMore) {
   Harness host(HostWith(R"({"applies": {"network": "reboot"}, "capabilities": {"IPv6 Supported": true},

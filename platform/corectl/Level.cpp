@@ -1,5 +1,6 @@
 #include "corectl/Level.h"
 
+#include <algorithm>
 #include <variant>
 
 #include "host/Description.h"
@@ -66,22 +67,16 @@ std::int64_t CurrentOf(const iScsiParms& parms, const Member& member) {
   return std::visit([&](auto place) { return std::int64_t{(parms.*place).current}; }, member.value);
 }
 
-std::string Path(std::string_view group, std::string_view key) {
-  return std::string(group) + '/' + std::string(key);
-}
 std::string DigestPath(Digest digest) {
-  return Path("parameters", host::kDigests[static_cast<std::size_t>(digest)]);
+  return host::PathOf("parameters", host::kDigests[static_cast<std::size_t>(digest)]);
 }
 /// Where the direction stands in host::kDirections.
 std::size_t IndexOf(int direction) {
   if (direction == ChapUni || direction == ChapMutual) return static_cast<std::size_t>(direction);
   Deny(std::to_string(direction) + " is no direction of CHAP.");
 }
-std::string ChapPath(int direction) { return Path("chap", host::kDirections[IndexOf(direction)]); }
+std::string ChapPath(int direction) { return host::PathOf("chap", host::kDirections[IndexOf(direction)]); }
 
-std::int64_t ValueAt(const host::Record& record, const std::string& path, host::Type type) {
-  return type == host::Type::Boolean ? std::int64_t{record.GetBool(path)} : record.GetInt64(path);
-}
 void SetValueAt(host::Record& record, const std::string& path, host::Type type, std::int64_t value) {
   if (type == host::Type::Boolean) {
     record.Set(path, value != 0);
@@ -173,7 +168,7 @@ std::string Level::ParentText() const {
 
 void Level::RequireCapability(const char* own, const char* below, const std::string& subject) const {
   const std::string capability = HasParent() ? below : own;
-  if (OfAdapter().GetBool(Path("capabilities", capability))) return;
+  if (OfAdapter().GetBool(host::PathOf("capabilities", capability))) return;
   Deny(subject + ": the adapter lacks " + host::Quoted(capability) + ".");
 }
 
@@ -185,11 +180,11 @@ void Level::Ensure(const std::string& path) {
 
 Level::Parameter Level::GetParameter(std::size_t index) const {
   const host::ParameterSpec& spec = host::kParameters[index];
-  const std::string path = Path("parameters", spec.name);
+  const std::string path = host::PathOf("parameters", spec.name);
   const host::Record& adapter = OfAdapter();
   Parameter parameter{spec.value, spec.value, true, true, spec.least, spec.most, false};
   if (adapter.Has(path)) {
-    parameter.standard = ValueAt(adapter, path + "/default", spec.type);
+    parameter.standard = host::ValueAt(adapter, path + "/default", spec.type);
     parameter.settable = adapter.GetBool(path + "/settable");
     parameter.supported = adapter.GetBool(path + "/supported");
     if (spec.type == host::Type::Integer) {
@@ -237,7 +232,7 @@ iScsiParms Level::GetParms() const {
 void Level::SetParameter(std::size_t index, std::int64_t value) {
   const Parameter parameter = GetParameter(index);
   const host::ParameterSpec& spec = host::kParameters[index];
-  const std::string path = Path("parameters", spec.name);
+  const std::string path = host::PathOf("parameters", spec.name);
   if (value != parameter.current) {
     const std::string subject = std::string(spec.name) + " cannot be set to " + std::to_string(value) + ": ";
     if (!parameter.supported) Deny(subject + "the adapter has no such parameter.");
@@ -249,6 +244,8 @@ void Level::SetParameter(std::size_t index, std::int64_t value) {
   }
   if (HasParent()) {
     SetValueAt(Own(), path, spec.type, value);
+  } else if (value == spec.value && !inEffect_.record.Has(path)) {
+    Own().Erase(path);  // what waited has been taken back
   } else if (value != parameter.current) {
     Ensure(path);
     SetValueAt(Own(), path + "/current", spec.type, value);
@@ -258,7 +255,7 @@ void Level::SetParameter(std::size_t index, std::int64_t value) {
 Status Level::SetParms(const iScsiParms& parms) {
   for (std::size_t i = 0; i < kCount; ++i) {
     if (HasParent() && parms.*kMembers[i].inherited) {
-      Own().Erase(Path("parameters", host::kParameters[i].name));
+      Own().Erase(host::PathOf("parameters", host::kParameters[i].name));
     } else {
       SetParameter(i, CurrentOf(parms, kMembers[i]));
     }
@@ -273,12 +270,18 @@ Status Level::SetParms(const iScsiParms& parms) {
       }
     }
     for (const int direction : {ChapUni, ChapMutual}) {
-      MarkChap(ChapPath(direction), parms.*kChapMarks[direction]);
+      MarkChap(direction, parms.*kChapMarks[direction]);
     }
   }
-  // A set that changes nothing asks for nothing, also while something waits.
-  if (Own().Text() == host::Configured(inEffect_).record.Text()) return Status::Success;
-  return StoreParameters();
+  const bool changed = Own().Text() != host::Configured(inEffect_).record.Text();
+  // Where only digests wait, which have had their answer, a set that changes nothing asks for nothing.
+  return changed || DoesParameterWait() ? StoreParameters() : Status::Success;
+}
+
+bool Level::DoesParameterWait() const {
+  return std::any_of(std::begin(host::kParameters), std::end(host::kParameters), [this](const auto& spec) {
+    return host::DoesWait(inEffect_, host::PathOf("parameters", spec.name));
+  });
 }
 
 iScsiDigestType Level::GetDigest(Digest digest) const {
@@ -294,7 +297,12 @@ Status Level::SetDigest(Digest digest, iScsiDigestType value) {
         header ? "Target Level Header Digest Supported" : "Target Level Data Digest Supported",
         (header ? "The header digest cannot be " : "The data digest cannot be ") + std::string(word));
   }
-  Own().Set(DigestPath(digest), word);
+  const std::string path = DigestPath(digest);
+  if (!HasParent() && value == iScsiDigestType::Prohibited && !inEffect_.record.Has(path)) {
+    Own().Erase(path);  // it is what holds without one; what waited has been taken back
+  } else {
+    Own().Set(path, word);
+  }
   return StoreParameters();
 }
 
@@ -302,10 +310,22 @@ bool Level::InheritsChap(const std::string& path) const {
   return !Own().Has(path) || Own().GetBool(path + "/inherited");
 }
 
-void Level::MarkChap(const std::string& path, bool inherited) {
+void Level::MarkChap(int direction, bool inherited) {
+  const std::string path = ChapPath(direction);
   if (InheritsChap(path) == inherited) return;
-  Ensure(path);
+  if (!Own().Has(path)) {
+    const host::ChapEntry holding = host::ChapAt(Holding(), IndexOf(direction));
+    Ensure(path);
+    SetEntry(path, holding.name, holding.secret, host::kDemands[static_cast<std::size_t>(holding.demand)]);
+  }
   Own().Set(path + "/inherited", inherited);
+}
+
+void Level::SetEntry(const std::string& path, const std::string& name, const std::string& secret,
+                     std::string_view level) {
+  Own().Set(path + "/name", name);
+  Own().Set(path + "/secret", secret);
+  Own().Set(path + "/level", level);
 }
 
 void Level::GetChap(iScsiChapParameters& chap, int direction) const {
@@ -328,9 +348,7 @@ void Level::SetChap(const iScsiChapParameters& chap, int direction) {
   const bool inherits = HasParent() && InheritsChap(path);
   Ensure(path);
   if (HasParent()) Own().Set(path + "/inherited", inherits);
-  Own().Set(path + "/name", chap.name);
-  Own().Set(path + "/secret", chap.secret);
-  Own().Set(path + "/level", word);
+  SetEntry(path, chap.name, chap.secret, word);
   Store(host::Effect::Now);
 }
 

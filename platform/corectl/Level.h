@@ -113,8 +113,13 @@ class Level {
 
   Parameter GetParameter(std::size_t index) const;
   void SetParameter(std::size_t index, std::int64_t value);
+  /// True where a value of this place is not in effect yet as it was set, digests aside.
+  bool DoesParameterWait() const;
   bool InheritsChap(const std::string& path) const;
-  void MarkChap(const std::string& path, bool inherited);
+  /// Sets the mark. An entry that no longer comes from a parent, and was never set here, stays as it held.
+  void MarkChap(int direction, bool inherited);
+  void SetEntry(const std::string& path, const std::string& name, const std::string& secret,
+                std::string_view level);
 
   host::Tree& tree_;
   host::Object inEffect_;            // the place as it is in effect

@@ -4,17 +4,13 @@
 
 namespace host {
 
-namespace {
-
 std::int64_t ValueAt(const Record& record, const std::string& path, Type type) {
   return type == Type::Boolean ? std::int64_t{record.GetBool(path)} : record.GetInt64(path);
 }
 
-std::string PathOf(const char* group, std::string_view key) {
+std::string PathOf(std::string_view group, std::string_view key) {
   return std::string(group) + '/' + std::string(key);
 }
-
-}  // namespace
 
 std::int64_t ParameterAt(const Inheritance& levels, std::size_t index, std::size_t* depth) {
   const ParameterSpec& spec = kParameters[index];

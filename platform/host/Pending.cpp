@@ -114,6 +114,13 @@ Object Configured(const Object& object) {
   return configured;
 }
 
+bool DoesWait(const Object& object, const std::string& path) {
+  const auto waitsFor = [&](Effect effect) {
+    return object.record.Has(std::string(kPending) + '/' + std::string(WordOf(effect)) + '/' + path);
+  };
+  return waitsFor(Effect::Reset) || waitsFor(Effect::Reboot);
+}
+
 Status StoreConfigured(Tree& tree, const Object& object, const Record& configured, Effect effect) {
   effect = AskedFor(tree.Answer(), effect);
   const Json& json = object.record.GetJson();

@@ -20,6 +20,9 @@ Effect EffectOf(const Record& adapter, Setting setting);
 /// The object with what waits in it in its record, and no key "pending".
 Object Configured(const Object& object);
 
+/// True where the part of the record at @p path is configured otherwise than it is in effect.
+bool DoesWait(const Object& object, const std::string& path);
+
 /// Stores what makes @p configured out of Configured(@p object): at once, or to wait for @p effect. An answer
 /// of the description decides in place of @p effect where there is one. The status asks for what the object
 /// waits for: for nothing once all its changes have been taken back.
