@@ -115,7 +115,7 @@ TEST(Ima, CallsGiveTheirFailuresAsStatus) {
   };
   EXPECT_EQ(call(host::kRoot), IMA_ERROR_INCORRECT_OBJECT_TYPE);
   EXPECT_EQ(call(999), IMA_ERROR_OBJECT_NOT_FOUND);
-  EXPECT_EQ(host.trace.back(), "IMA_GetLhbaProperties(lhba 999) = 0x80000007");
+  EXPECT_EQ(host.trace.back(), "IMA_GetLhbaProperties(lhba 999) = 0x80000007: The adapter is gone.");
   EXPECT_EQ(ima::StatusOf([] { throw std::bad_alloc(); }), IMA_ERROR_INSUFFICIENT_MEMORY);
 }
 

@@ -170,25 +170,29 @@ bool Host::IsTracing() { return TraceSink() != nullptr || IsTraceWanted(); }
 
 void Host::TraceSuccess(const Call& call, const std::string& outcome) {
   if (!IsTracing()) return;
+  if (IsTraceWanted() && store_ != nullptr) store_->EndReading();  // who reads the trace may keep it waiting
   Trace(call, "= " + (call.style == Call::Style::Ima && outcome == "ok" ? ImaStatusText(0) : outcome));
 }
 
 void Host::Fail(const Call& call) {
-  const auto trace = [&](std::uint32_t imaStatus, const std::string& outcome) {
+  if (store_ != nullptr)
+    store_->EndReading();  // what was read is of no more use, and a report may have to wait
+  const auto trace = [&](std::uint32_t imaStatus, const char* exception, const std::string& text) {
     if (!IsTracing()) return;
-    Trace(call, call.style == Call::Style::Ima ? "= " + ImaStatusText(imaStatus) : "! " + outcome);
+    const std::string outcome =
+        call.style == Call::Style::Ima ? "= " + ImaStatusText(imaStatus) : std::string("! ") + exception;
+    Trace(call, outcome + (text.empty() ? "" : ": " + text));
   };
   const auto fail = [&](const Error& error) {
     const bool coreCtl = error.GetThrown() == Error::Thrown::CoreCtlException ||
                          (error.GetThrown() == Error::Thrown::Usual && call.style == Call::Style::Lookup);
-    trace(error.ImaStatus(),
-          std::string(coreCtl ? "CoreCtlException: " : "NodeCtlException: ") + error.what());
+    trace(error.ImaStatus(), coreCtl ? "CoreCtlException" : "NodeCtlException", error.what());
     throw error;
   };
   try {
     throw;
   } catch (const std::bad_alloc&) {
-    trace(0x80000002u, "std::bad_alloc");
+    trace(0x80000002u, "std::bad_alloc", "");
     throw;
   } catch (const Error& error) {
     fail(Located(error));

@@ -137,7 +137,7 @@ class Host {
   }
 
   static bool IsTracing();
-  static void TraceSuccess(const Call& call, const std::string& outcome);
+  void TraceSuccess(const Call& call, const std::string& outcome);
   /// The error, with the file's name where what is in it makes no sense.
   Error Located(const Error& error);
   /// Traces the exception being handled and throws it on, as an Error or std::bad_alloc.

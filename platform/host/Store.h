@@ -39,7 +39,7 @@ class Store {
   /// The id of the row that was inserted last.
   std::int64_t LastId() const;
   const std::string& GetPath() const { return path_; }
-  /// True between the begin and the end of a transaction.
+  /// True while a Transaction does its work.
   bool IsInTransaction() const { return inTransaction_; }
   /// Ends what a Reading keeps open.
   void EndReading();

@@ -100,20 +100,23 @@ extern "C" IMA_STATUS IMA_GetPhbaDownloadProperties(IMA_OID phbaOid,
 
 extern "C" IMA_STATUS IMA_IsPhbaDownloadFile(IMA_OID phbaOid, const IMA_WCHAR* path,
                                              IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES* properties) {
-  return ima::ReadProperties("IMA_IsPhbaDownloadFile", phbaOid, IMA_OBJECT_TYPE_PHBA, properties,
-                             [&](Tree&, const Object& physical, IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES& filled) {
-                               const ima::FirmwareImage image = ReadImage(physical, path);
-                               filled.imageType = image.type;
-                               ima::SetWide(filled.fileVersion, image.version);
-                               ima::SetWide(filled.description, image.description);
-                               filled.upgrade = image.upgrade;
-                             });
+  const auto call = host::Call::Ima("IMA_IsPhbaDownloadFile", ima::Id(phbaOid),
+                                    {ima::OidArgument(phbaOid), ima::Narrow(path)});
+  return ima::Read(call, [&](Tree& tree) {
+    const ima::FirmwareImage image = ReadImage(ima::Get(tree, phbaOid, IMA_OBJECT_TYPE_PHBA), path);
+    IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES filled{};
+    filled.imageType = image.type;
+    ima::SetWide(filled.fileVersion, image.version);
+    ima::SetWide(filled.description, image.description);
+    filled.upgrade = image.upgrade;
+    *properties = filled;
+  });
 }
 
 extern "C" IMA_STATUS IMA_PhbaDownload(IMA_OID phbaOid, IMA_PHBA_DOWNLOAD_IMAGE_TYPE imageType,
                                        const IMA_WCHAR* path) {
-  const auto call =
-      host::Call::Ima("IMA_PhbaDownload", ima::Id(phbaOid), {ima::OidArgument(phbaOid), imageType});
+  const auto call = host::Call::Ima("IMA_PhbaDownload", ima::Id(phbaOid),
+                                    {ima::OidArgument(phbaOid), imageType, ima::Narrow(path)});
   return ima::Change(call, [&](Tree& tree) {
     const Object physical = ima::Get(tree, phbaOid, IMA_OBJECT_TYPE_PHBA);
     const ima::FirmwareImage image = ReadImage(physical, path);

@@ -115,8 +115,10 @@ extern "C" IMA_STATUS IMA_TSR_GetRouteProperties(IMA_OID routeOid, IMA_TSR_ROUTE
 
 extern "C" IMA_STATUS IMA_TSR_AddRoute(IMA_OID lhbaOid, IMA_TSR_ROUTE_PROPERTIES properties,
                                        IMA_OID* routeOid) {
-  const auto call = host::Call::Ima("IMA_TSR_AddRoute", ima::Id(lhbaOid),
-                                    {ima::OidArgument(lhbaOid), ima::AddressText(properties.destination)});
+  const auto call = host::Call::Ima(
+      "IMA_TSR_AddRoute", ima::Id(lhbaOid),
+      {ima::OidArgument(lhbaOid), ima::AddressText(properties.destination),
+       ima::AddressText(properties.netmask), ima::AddressText(properties.gateway), properties.metric});
   return ima::Change(call, [&](Tree& tree) {
     const Object adapter = ima::Get(tree, lhbaOid, IMA_OBJECT_TYPE_LHBA);
     Judge(properties);

@@ -32,9 +32,13 @@ def sendtargets(host):
     return set(rows)
 
 
-def work(writers, readers, seconds=1.5):
+def with_adapters(count):
     capabilities = {"Name And Alias Settable": True, "Sendtarget Discovery Settable": True}
-    host = Host({"adapters": [{"name": f"hba{number}", "capabilities": capabilities} for number in range(ADAPTERS)]})
+    return Host({"adapters": [{"name": f"hba{number}", "capabilities": capabilities} for number in range(count)]})
+
+
+def work(writers, readers, seconds=1.5):
+    host = with_adapters(ADAPTERS)
     until = time.monotonic() + seconds
 
     def worker(line, number):
@@ -60,6 +64,17 @@ def at_once(host, lines):
         succeeded(finished(process))
 
 
+def unread_trace():
+    """Whoever does not read on keeps one command waiting, and no other."""
+    host = with_adapters(1000)
+    waiting = host.start("--trace iscsi adapter list")
+    check("GetiScsiInterfaces" in waiting.stderr.readline(), "no trace")
+    host.succeed("iscsi adapter set -A hba1 -a other")
+    check(waiting.poll() is None, "all of the trace was written at once")
+    waiting.kill()
+    waiting.communicate()
+
+
 def first_runs(count):
     host = Host()
     at_once(host, [f"{SENDTARGET} add -A hba2 -a 10.0.0.{number}:3260" for number in range(count)])
@@ -82,6 +97,7 @@ else:
     for _ in range(3):
         first_runs(8)
         names_at_once(8)
+    unread_trace()
     work(1, 1)
     work(2, 0)
     work(5, 3)
