@@ -68,6 +68,8 @@ TEST(PlinthOptions, AreReadAsGnuProgramsDo) {
                   {{"--count", "-2147483648"}, "count=-2147483648;\n"},
                   {{"-c+2147483647"}, "count=2147483647;\n"},
                   {{"-l", "a", "--list=b", "-lc", "--list="}, "list=a;list=b;list=c;list=;\n"},
+                  {{"--list="}, "\n"},
+                  {{"--way", ""}, "way=;\n"},
                   {{"--way", "mutual", "--name", "x"}, "name=x;way=mutual;\n"},
                   {{"--secret", "-", "--key=-"}, "secret=hidden;key=uni;\n"},
               },
@@ -78,6 +80,7 @@ TEST(PlinthOptions, AreRefusedInOneLineThatTellsWhatIsRight) {
   const std::vector<std::pair<Arguments, std::string>> cases = {
       {{"--nam", "x"}, "unknown option \"--nam\"; did you mean \"--name\"?"},
       {{"--zzzzzz=hidden"}, "unknown option \"--zzzzzz\"; --help lists the options"},
+      {{"-L", "x"}, "unknown option \"-L\"; did you mean \"-l\"?"},
       {{"-dx"}, "unknown option \"-x\"; --help lists the options"},
       {{"--name\n=x"}, "unknown option \"--name\\n\"; did you mean \"--name\"?"},
       {{"--name"}, "option --name (-n) needs a value"},

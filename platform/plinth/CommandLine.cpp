@@ -150,7 +150,7 @@ class Runner {
     const boost::shared_ptr<CallSpec::Input> input(new RunInput(own, options_.checked));
     const boost::shared_ptr<CallSpec::Output> output(
         new RunOutput(record_, console_.Error(), options_.checked));
-    if (global_.For("trace").truth) setenv("HCLI_TRACE", "1", 1);
+    if (global_.For("trace").given) setenv("HCLI_TRACE", global_.For("trace").truth ? "1" : "0", 1);
     record_.executed = true;
     command.Execute(input, output);
     if (options_.checked) CheckRun(command);

@@ -1,3 +1,5 @@
+#include <algorithm>
+
 #include "plinth/Options.h"
 #include "plinth/OwnCommands.h"
 #include "plinth/Text.h"
@@ -21,10 +23,22 @@ std::vector<Place> Places(const AutoCli::Namespace& root) {
     Place place{path, AutoCli::NodeData::Of(node).children, GlobalParameters()};
     if (auto* command = dynamic_cast<AutoCli::Command*>(&node)) {
       place.parameters = ParametersOf(*command->GetInputSpec());
+      for (Parameter& global : GlobalParameters()) {
+        const auto known = [&](const Parameter& own) { return own.name == global.name; };
+        // The plug-ins are loaded before there is a command.
+        if (global.name == "plugins" || std::any_of(place.parameters.begin(), place.parameters.end(), known))
+          continue;
+        place.parameters.push_back(std::move(global));
+      }
     }
     places.push_back(std::move(place));
   });
   return places;
+}
+
+/// The values that are known of @p parameter, with blanks between them.
+std::string Values(const Parameter& parameter) {
+  return parameter.type == ParameterType::Bool ? "true false" : Join(AllowedValues(parameter), " ");
 }
 
 /// A word of any of the three shells.
@@ -41,33 +55,36 @@ std::string ShellWord(const std::string& text) {
 }
 
 /// The functions that bash and zsh share. The first prints the words that may follow a path; with a second
-/// argument, the values that this option takes there.
+/// argument, the values that are known of this option there, or fails where it takes none.
 std::string SharedFunctions(const std::vector<Place>& places) {
   std::string script = "_hcli_candidates() {\n  case \"$1,$2\" in\n";
   for (const Place& place : places) {
     std::vector<std::string> words;
     for (const AutoCli::Child& child : place.children) words.push_back(child.name);
     for (const Parameter& parameter : place.parameters) {
+      if (MayBeOperand(parameter) && !parameter.allowed.empty()) words.push_back(Values(parameter));
       words.push_back("--" + parameter.name);
-      if (parameter.allowed.empty() && parameter.type != ParameterType::Bool) continue;
+      if (parameter.type == ParameterType::Flag) continue;
       std::string pattern = ShellWord(place.path + ",--" + parameter.name);
       if (!parameter.shortName.empty()) pattern += '|' + ShellWord(place.path + ",-" + parameter.shortName);
-      const std::string values =
-          parameter.allowed.empty() ? "true false" : Join(AllowedValues(parameter), " ");
-      script += "    " + pattern + ") echo " + ShellWord(values) + " ;;\n";
+      script += "    " + pattern + ") echo " + ShellWord(Values(parameter)) + " ;;\n";
     }
     script += "    " + ShellWord(place.path + ",") + ") echo " + ShellWord(Join(words, " ")) + " ;;\n";
   }
-  return script + "  esac\n}\n" + R"sh(_hcli_answer() {
-  local place='' word='' values=''
+  return script + "    *) return 1 ;;\n  esac\n}\n" + R"sh(_hcli_answer() {
+  local place='' option='' word=''
   for word in "$@"; do
     case "$word" in
-      -*) ;;
-      *) if [ -n "$(_hcli_candidates "${place:+$place }$word")" ]; then place="${place:+$place }$word"; fi ;;
+      =) ;;
+      -*) option="$word" ;;
+      *)
+        option=''
+        if _hcli_candidates "${place:+$place }$word" >/dev/null; then place="${place:+$place }$word"; fi
+        ;;
     esac
   done
-  case "$word" in -*) values="$(_hcli_candidates "$place" "$word")" ;; esac
-  echo "${values:-$(_hcli_candidates "$place")}"
+  if [ -n "$option" ] && _hcli_candidates "$place" "$option"; then return; fi
+  _hcli_candidates "$place"
 }
 )sh";
 }
@@ -76,7 +93,8 @@ std::string BashScript(const std::vector<Place>& places) {
   return SharedFunctions(places) + R"sh(_hcli() {
   local words
   words="$(_hcli_answer "${COMP_WORDS[@]:1:COMP_CWORD-1}")"
-  COMPREPLY=($(compgen -W "$words" -- "${COMP_WORDS[COMP_CWORD]}"))
+  # An equals sign is a word of its own.
+  COMPREPLY=($(compgen -W "$words" -- "${COMP_WORDS[COMP_CWORD]#=}"))
 }
 complete -o default -F _hcli hcli
 )sh";
@@ -121,8 +139,9 @@ complete -c hcli -f
       if (!parameter.shortName.empty()) script += " -s " + parameter.shortName;
       script += " -l " + parameter.name;
       // -x keeps file names away where the values are known.
-      if (parameter.type != ParameterType::Flag) script += parameter.allowed.empty() ? " -r" : " -x";
-      if (!parameter.allowed.empty()) script += " -a " + ShellWord(Join(AllowedValues(parameter), " "));
+      const std::string values = Values(parameter);
+      if (parameter.type != ParameterType::Flag) script += values.empty() ? " -r" : " -x";
+      if (!values.empty()) script += " -a " + ShellWord(values);
       script += '\n';
     }
   }

@@ -26,7 +26,8 @@ bool ReadNumber(std::string_view text, int& number) {
 }
 
 void CheckAllowed(const Parameter& parameter, const std::string& text) {
-  if (parameter.allowed.empty()) return;
+  // An empty text stands for an option that was left out, where it may be: so do commands take it.
+  if (parameter.allowed.empty() || (text.empty() && !parameter.required)) return;
   for (const AllowedValue& allowed : parameter.allowed) {
     if (allowed.value == text) return;
   }
@@ -37,10 +38,16 @@ bool TakesNoWord(const Parameter& parameter) { return parameter.type == Paramete
 
 [[noreturn]] void RefuseOption(const std::string& name, const std::vector<OptionTable*>& tables) {
   std::vector<std::string> names;
+  std::string nearest;
   for (const OptionTable* table : tables) {
-    for (const Parameter& parameter : table->Parameters()) names.push_back("--" + parameter.name);
+    for (const Parameter& parameter : table->Parameters()) {
+      names.push_back("--" + parameter.name);
+      // Of the short ones, the same letter in the other case.
+      const std::string& letter = parameter.shortName;
+      if (name.size() == 2 && letter.size() == 1 && (letter[0] ^ name[1]) == ' ') nearest = '-' + letter;
+    }
   }
-  const std::string nearest = name.size() > 2 ? Nearest(name, names) : "";
+  if (name.size() > 2) nearest = Nearest(name, names);
   throw UsageError("unknown option " + Quoted(name) +
                    (nearest.empty() ? "; --help lists the options" : "; did you mean \"" + nearest + "\"?"));
 }

@@ -39,6 +39,7 @@ std::string RunInput::GetString(const std::string& key) const {
 
 void RunInput::GetStringList(const std::string& key, std::vector<std::string>& values) const {
   values = Read(key, ParameterType::StringList).texts;
+  if (values.size() == 1 && values.front().empty()) values.clear();  // given, and given nothing
 }
 
 int RunInput::GetInt(const std::string& key) const { return Read(key, ParameterType::Int).number; }
@@ -48,7 +49,7 @@ bool RunInput::HasParameter(const std::string& key) const { return options_.For(
 
 void RunOutput::ReportError(const std::string& text) {
   record_.messages.push_back(text);
-  error_.Write(text);
+  error_.Write(Visible(text, Lines::Kept));
   if (text.empty() || text.back() != '\n') error_.Write("\n");
   error_.Flush();
 }
