@@ -65,7 +65,7 @@ TEST(ConnectionList, ShowsWhatIsKnown) {
       "MaxRecvDataSegmentLength": 8192, "MaxTransmitDataSegmentLength": 8192, "OFMarker": false,
       "OFMarkerInterval": 0, "ConnectionAddress": "2001:db8::1", "RemoteAddress": "192.0.2.1",
       "LocalAddress": "Not Available", "SessionCreateTime": "06/15/12 14:03:22",
-      "ConnectionCreateTime": "Not Available", "ConnectionStartTime": "12/31/99 23:59:60",
+      "ConnectionCreateTime": "06/31/12 25:00:00", "ConnectionStartTime": "12/31/99 23:59:60",
       "State": "in_login"})"));
   EXPECT_EQ(run.result[1]["ID"], "hba0,t0,00023d000001,65535");
   EXPECT_EQ(run.result[1]["State"], "unknown");

@@ -95,7 +95,9 @@ class SimulatorLoad final : public SimulatorCommand {
 class SimulatorShow final : public SimulatorCommand {
  public:
   SimulatorShow()
-      : SimulatorCommand("Show the simulated host as a description that load reads.", "fetcher") {}
+      : SimulatorCommand(
+            "Show the simulated host as a description, which load reads where it has the secrets.",
+            "fetcher") {}
 
  private:
   void Declare(CallSpec::InputSpec& spec) override {

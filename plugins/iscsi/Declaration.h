@@ -79,6 +79,8 @@ constexpr Parameter StringList(const char* name, char letter, const char* help) 
 }
 /// The adapter that a listing may be limited to.
 constexpr Parameter AdapterFilter() { return String("adapter", 'A', "The iSCSI adapter name."); }
+/// The target that a listing may be limited to.
+constexpr Parameter TargetFilter() { return String("name", 'n', "The iSCSI target name."); }
 /// The adapter that a command works on.
 constexpr Parameter Adapter() { return AdapterFilter().Required(); }
 

@@ -44,6 +44,14 @@ class Filter {
   std::optional<std::string> only_;
 };
 
+// What columns show of the member of a record: its number, or whether it is not 0.
+
+template <auto member>
+inline constexpr auto Number =
+    [](const auto& listed) { return static_cast<long long>(listed.properties.*member); };
+template <auto member>
+inline constexpr auto Is = [](const auto& listed) { return listed.properties.*member != 0; };
+
 /// Each operation visits one level: what passes the filters `adapter`, `name` and `isid` of that level and
 /// those above it. Nothing below an object that does not pass is read. A failed call throws ImaFailure.
 class ImaWalk {

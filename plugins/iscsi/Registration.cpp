@@ -27,7 +27,8 @@ constexpr Node Command(std::string_view path) {
 
 }  // namespace
 
-/// A namespace stands ahead of its children, and siblings stand in the order in which they are shown.
+/// A namespace stands ahead of its children, and siblings stand in the order in which they are shown. The
+/// classes that are named here are those of other files, so this stands in no unnamed namespace.
 static constexpr Node kTree[] = {
     {"iscsi", "Tessaro iSCSI commands."},
     {"iscsi plugin", "Operations that can be performed on iSCSI management plugins"},

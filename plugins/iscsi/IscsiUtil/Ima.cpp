@@ -65,4 +65,11 @@ std::string IsidText(const IMA_INITIATOR_SESSION_ID& isid) {
   return text;
 }
 
+std::optional<IMA_OID> FindLogicalAdapter(const ImaList& adapters, const std::string& name,
+                                          const char* failure, std::size_t size) {
+  return FindIma(adapters, IMA_GetLhbaProperties, failure, [&](const IMA_LHBA_PROPERTIES& properties) {
+    return NarrowText(properties.osDeviceName, size) == name;
+  });
+}
+
 }  // namespace IscsiUtil

@@ -103,9 +103,9 @@ std::optional<IMA_OID> FindIma(const ImaList& objects, IMA_STATUS (*read)(IMA_OI
 // Texts. A size is that of a buffer with its terminator: a text of that many bytes or more is cut, never
 // inside a UTF-8 character.
 
-inline constexpr std::size_t kNameSize = 224;  ///< names of adapters and targets
-inline constexpr std::size_t kDeviceNameSize = 256;
-inline constexpr std::size_t kTextSize = 1024;  ///< all other texts
+inline constexpr std::size_t kNameSize = 224;        ///< names of adapters and targets
+inline constexpr std::size_t kDeviceNameSize = 256;  ///< names of adapters where firmware is concerned
+inline constexpr std::size_t kTextSize = 1024;       ///< all other texts
 
 std::string CutText(std::string text, std::size_t size);
 /// @p wide up to its zero as UTF-8, in any locale. A number that is no character gives "?".
@@ -114,5 +114,9 @@ std::string NarrowText(std::span<const IMA_WCHAR> wide, std::size_t size);
 std::string AddressText(const IMA_IP_ADDRESS& address);
 /// Twelve lower-case hexadecimal digits.
 std::string IsidText(const IMA_INITIATOR_SESSION_ID& isid);
+
+/// The first of the logical @p adapters with this name, which is cut at @p size.
+std::optional<IMA_OID> FindLogicalAdapter(const ImaList& adapters, const std::string& name,
+                                          const char* failure, std::size_t size = kNameSize);
 
 }  // namespace IscsiUtil

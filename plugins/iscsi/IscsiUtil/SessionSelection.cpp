@@ -7,10 +7,8 @@ namespace {
 /// The object that the options select, if it exists. Throws ImaFailure.
 std::optional<IMA_OID> Select(const Plinth::CallSpec::Input& input) {
   const ImaList adapters("Unable to get logical adapter list.", IMA_GetLhbaOidList);
-  const auto adapter = FindIma(adapters, IMA_GetLhbaProperties, "Unable to get logical adapter properties.",
-                               [name = input.GetString("adapter")](const IMA_LHBA_PROPERTIES& properties) {
-                                 return NarrowText(properties.osDeviceName, kNameSize) == name;
-                               });
+  const auto adapter =
+      FindLogicalAdapter(adapters, input.GetString("adapter"), "Unable to get logical adapter properties.");
   if (!adapter || !input.HasParameter("name")) return adapter;
 
   const ImaList targets("Unable to get target list.", IMA_GetTargetOidList, *adapter);

@@ -46,7 +46,7 @@ constexpr Structure kTarget = StructureOf<kColumns>("Target");
 
 constexpr Parameter kParameters[] = {
     AdapterFilter(),
-    String("name", 'n', "The iSCSI target name."),
+    TargetFilter(),
 };
 
 /// Status-Class and Status-Detail of a login response: RFC 7143 section 11.13.5.

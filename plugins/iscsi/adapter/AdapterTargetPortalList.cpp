@@ -24,7 +24,7 @@ constexpr Structure kTargetPortal = StructureOf<kColumns>("TargetPortal");
 
 constexpr Parameter kParameters[] = {
     AdapterFilter(),
-    String("name", 'n', "The iSCSI target name."),
+    TargetFilter(),
 };
 
 }  // namespace

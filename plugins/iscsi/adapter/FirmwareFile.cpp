@@ -5,12 +5,9 @@ namespace {
 
 IMA_OID FindPhysicalAdapter(const std::string& name) {
   for (const IMA_OID& physical : ImaList("Unable to get physical adapter list.", IMA_GetPhbaOidList)) {
-    static constexpr char kNoLogicalAdapters[] = "Unable to get logical adapter list.";
-    const ImaList logicals(kNoLogicalAdapters, IMA_TSR_GetLhbaOidList, physical);
-    const auto named = [&name](const IMA_LHBA_PROPERTIES& properties) {
-      return NarrowText(properties.osDeviceName, IscsiUtil::kDeviceNameSize) == name;
-    };
-    if (FindIma(logicals, IMA_GetLhbaProperties, kNoLogicalAdapters, named)) return physical;
+    static constexpr char kFailure[] = "Unable to get logical adapter list.";
+    const ImaList logicals(kFailure, IMA_TSR_GetLhbaOidList, physical);
+    if (IscsiUtil::FindLogicalAdapter(logicals, name, kFailure, IscsiUtil::kDeviceNameSize)) return physical;
   }
   throw IscsiUtil::ImaFailure{"Invalid adapter provided."};
 }

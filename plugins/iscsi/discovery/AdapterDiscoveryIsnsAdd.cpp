@@ -5,7 +5,7 @@ namespace {
 
 constexpr Parameter kParameters[] = {
     Adapter(),
-    IsnsAddress(kIsnsAddressHelp),
+    IsnsAddress("The iSNS discovery address: <ip/dns>. Required only for static discovery method."),
     IsnsMethod(),
 };
 
@@ -23,7 +23,7 @@ class __attribute__((visibility("default"))) AdapterDiscoveryIsnsAdd
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    const auto server = ReadServer(input, output, "Unable to add iSNS discovery address.");
+    const auto server = ServerFrom(input, output, "Unable to add iSNS discovery address.");
     if (!server) return;
     WithIsnsAdapter(input, output, "Unable to add iSNS discovery address.", [&](iScsiInterface& adapter) {
       adapter.AddIsnsConfig(*server);

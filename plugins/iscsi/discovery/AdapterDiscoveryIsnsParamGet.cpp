@@ -29,7 +29,7 @@ class __attribute__((visibility("default"))) AdapterDiscoveryIsnsParamGet
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    const auto server = ReadServer(input, output, kFailure);
+    const auto server = ServerFrom(input, output, kFailure);
     if (!server) return;
     WithIsnsAdapter(input, output, kFailure,
                     [&](iScsiInterface& adapter) { ShowIsnsParm(adapter.GetIsnsParms(*server), output); });

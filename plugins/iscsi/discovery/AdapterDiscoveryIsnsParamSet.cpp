@@ -40,7 +40,7 @@ class __attribute__((visibility("default"))) AdapterDiscoveryIsnsParamSet
     if (CountIsnsSources(input, kServerPlace.inherits) != 1) {
       return output->ReportError("Only one options value, inherit, default can be used at once.");
     }
-    const auto server = ReadServer(input, output, "Unnable to set isns parameters.");
+    const auto server = ServerFrom(input, output, "Unnable to set isns parameters.");
     if (server) SetIsnsParm(kServerPlace, *server, input, output);
   }
 };

@@ -23,7 +23,7 @@ class __attribute__((visibility("default"))) AdapterDiscoveryIsnsRemove
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    const auto server = ReadServer(input, output, "Failed to remove iSNS discovery address..");
+    const auto server = ServerFrom(input, output, "Failed to remove iSNS discovery address..");
     if (!server) return;
     WithIsnsAdapter(input, output, "Unable to remove iSNS discovery address.", [&](iScsiInterface& adapter) {
       adapter.RemoveIsnsConfig(*server);

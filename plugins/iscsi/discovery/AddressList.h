@@ -11,7 +11,7 @@ constexpr Parameter ListedSendTarget() {
                 "[XX:XX:XX:XX::XX]:port or XX:XX:XX:XX::XX")
       .Required();
 }
-constexpr Parameter ListedTargetName() { return String("name", 'n', "The iSCSI target name.").Required(); }
+constexpr Parameter ListedTargetName() { return TargetFilter().Required(); }
 constexpr Parameter ListedTarget() {
   return String("address", 'a',
                 "The iSCSI target address: <ip/dns[:port]>. IPv6 address can be specified as "

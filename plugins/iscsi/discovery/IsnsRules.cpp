@@ -2,7 +2,7 @@
 
 namespace TessaroCli::IscsiNamespace {
 
-std::optional<iSnsConfig> ReadServer(const InputPtr& input, const OutputPtr& output,
+std::optional<iSnsConfig> ServerFrom(const InputPtr& input, const OutputPtr& output,
                                      const char* addressFailure) {
   const std::string address = input->GetString("address");
   const char* refusal = input->GetString("method") != "static" ? "Only static discovery method supported"

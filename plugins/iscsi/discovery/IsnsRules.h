@@ -14,7 +14,7 @@ using NodeCtl::Storage::iSnsParms;
 
 /// The server that the options `method` and `address` name. Nothing when they name none, which is then
 /// reported, with @p addressFailure behind the reason where the address is malformed.
-std::optional<iSnsConfig> ReadServer(const InputPtr& input, const OutputPtr& output,
+std::optional<iSnsConfig> ServerFrom(const InputPtr& input, const OutputPtr& output,
                                      const char* addressFailure);
 
 /// WithAdapter, where no failure of the lookup gets by: each is an unknown adapter.
@@ -44,8 +44,6 @@ void SetIsnsParm(const IsnsPlace& place, const iSnsConfig& server, const InputPt
                  const OutputPtr& output);
 
 constexpr Parameter IsnsAddress(const char* help) { return String("address", 'a', help); }
-constexpr char kIsnsAddressHelp[] =
-    "The iSNS discovery address: <ip/dns>. Required only for static discovery method.";
 constexpr char kIsnsMethodHelp[] = "The iSNS discovery method: <static/dhcp/slp>. Only static supported.";
 constexpr Parameter IsnsMethod(const char* help = kIsnsMethodHelp) {
   return String("method", 'm', help).Required();

@@ -78,7 +78,10 @@ class PluginList : public CommandFrame<PluginList> {
     const Filter filter(input, "plugin");
     bool found = false;
     for (const IMA_OID& oid : ImaList("Unable to get plugin list.", IMA_GetPluginOidList)) {
-      if (!ExecuteInternalAdd(list, oid, filter)) continue;
+      const auto properties = PropertiesOf(oid);
+      const std::string fileName = BytesOf(properties.fileName);
+      if (!filter.Passes(fileName)) continue;
+      ExecuteInternalAdd(list, properties, fileName);
       found = true;
       if (input.HasParameter("plugin")) break;
     }
@@ -92,18 +95,18 @@ class PluginList : public CommandFrame<PluginList> {
                                    return BytesOf(properties.osDeviceName) == name;
                                  });
     if (!adapter) throw kNoMatch;
-    ExecuteInternalAdd(list,
-                       ReadIma(IMA_GetAssociatedPluginOid, *adapter, "Unable to get plugin identifier."),
-                       Filter(input, "plugin"));
+    const auto properties =
+        PropertiesOf(ReadIma(IMA_GetAssociatedPluginOid, *adapter, "Unable to get plugin identifier."));
+    ExecuteInternalAdd(list, properties, BytesOf(properties.fileName));
   }
 
-  /// Appends the row of the plug-in if it passes.
-  static bool ExecuteInternalAdd(List& list, const IMA_OID& oid, const Filter& filter) {
-    const auto properties = ReadIma(IMA_GetPluginProperties, oid, "Unable to get plugin properties.");
-    const std::string fileName = BytesOf(properties.fileName);
-    if (!filter.Passes(fileName)) return false;
+  static IMA_PLUGIN_PROPERTIES PropertiesOf(const IMA_OID& oid) {
+    return ReadIma(IMA_GetPluginProperties, oid, "Unable to get plugin properties.");
+  }
+
+  static void ExecuteInternalAdd(List& list, const IMA_PLUGIN_PROPERTIES& properties,
+                                 const std::string& fileName) {
     list.Append(NewRow(kPlugin, kColumns, {properties, fileName}));
-    return true;
   }
 };
 

@@ -53,12 +53,10 @@ RouteText ReadRoute(const Plinth::CallSpec::Input& input) {
   return route;
 }
 
-IMA_OID FindLogicalAdapter(const std::string& name) {
+IMA_OID AdapterOf(const Plinth::CallSpec::Input& input) {
   const ImaList adapters(InvalidAdapterMessage, IMA_GetLhbaOidList);
-  const auto adapter = FindIma(adapters, IMA_GetLhbaProperties, InvalidAdapterMessage,
-                               [&name](const IMA_LHBA_PROPERTIES& properties) {
-                                 return NarrowText(properties.osDeviceName, kNameSize) == name;
-                               });
+  const auto adapter =
+      IscsiUtil::FindLogicalAdapter(adapters, input.GetString("adapter"), InvalidAdapterMessage);
   if (!adapter) throw ImaFailure{InvalidAdapterMessage};
   return *adapter;
 }
@@ -69,7 +67,7 @@ void WithRoute(const InputPtr& input, const OutputPtr& output,
                const std::function<void(const IMA_OID& adapter, const RouteText& route)>& steps) {
   ReportingImaFailures(*output, [&] {
     const RouteText route = ReadRoute(*input);
-    steps(FindLogicalAdapter(input->GetString("adapter")), route);
+    steps(AdapterOf(*input), route);
   });
 }
 

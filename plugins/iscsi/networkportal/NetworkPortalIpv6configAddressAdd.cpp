@@ -11,10 +11,11 @@ constexpr Parameter kParameters[] = {
     Adapter(),
     AddressList("An IPv6 address to add in X:X:X::/X format. Multiple addresses can be provided using format "
                 "-a address1 -a address2 -a address3."),
-    Flag("remove-all-existing", 'r',
-         "Remove all existing routable IPv6 addresses before adding the addresses specified by "
-         "--address-list. "
-         "If this flag is passed and --address-list is empty, all existing routable addresses are removed."),
+    Flag(
+        "remove-all-existing", 'r',
+        "Remove all existing routable IPv6 addresses before adding the addresses specified by "
+        "--address-list. If this flag is passed and --address-list is empty, all existing routable addresses "
+        "are removed."),
 };
 
 constexpr AddressTexts kTexts{

@@ -40,7 +40,7 @@ class NetworkPortalIpv6configAddressList : public CommandFrame<NetworkPortalIpv6
       .result = ListOf(kAddress),
   };
 
-  /// Virtual in this class alone: it has a place in the class's binary interface.
+  /// Virtual in this class alone: it has a place in its virtual table, behind those that are inherited.
   virtual StructPtr GetOutputStructure() { return NewPrototype(kAddress); }
 
  private:

@@ -36,8 +36,7 @@ class PhysicalNetworkPortalParamGet : public CommandFrame<PhysicalNetworkPortalP
                   if (adapter.IsSoftwareOrDependent()) {
                     return output->ReportError(
                         "Physical Network Portal parameter get is not supported on software or dependent "
-                        "hardware iSCSI "
-                        "adapter.");
+                        "hardware iSCSI adapter.");
                   }
                   // The parameters are the adapter's: the name is a label and selects nothing.
                   std::string nic = input->GetString("nic");

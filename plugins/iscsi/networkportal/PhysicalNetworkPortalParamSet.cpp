@@ -50,8 +50,7 @@ class PhysicalNetworkPortalParamSet : public CommandFrame<PhysicalNetworkPortalP
                   if (adapter.IsSoftwareOrDependent()) {
                     return output->ReportError(
                         "Physical Network Portal parameter set is not supported on software or dependent "
-                        "hardware iSCSI "
-                        "adapter.");
+                        "hardware iSCSI adapter.");
                   }
                   const iScsiCapabilities capabilities = adapter.GetCapabilities();
                   for (const Option& option : kOptions) {

@@ -5,8 +5,8 @@ namespace {
 
 constexpr Parameter kParameters[] = {
     Adapter(),
-    String("name", 'n', "The iSCSI target name."),
-    SessionToDuplicate(),
+    TargetFilter(),
+    SessionIsid(),
 };
 
 }  // namespace

@@ -5,7 +5,7 @@
 
 namespace TessaroCli::IscsiNamespace {
 
-constexpr Parameter SessionToDuplicate() {
+constexpr Parameter SessionIsid() {
   return String("isid", 's', "The isid of a session to duplicate for login.");
 }
 

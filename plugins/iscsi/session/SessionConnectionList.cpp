@@ -23,14 +23,7 @@ constexpr char kNotAvailable[] = "Not Available";
 constexpr const char* kStates[] = {"free",      "xpt_wait",  "xpt_up",           "in_login",
                                    "logged_in", "in_logout", "logout_requested", "cleanup_wait"};
 
-bool IsWithin(int value, int least, int most) { return value >= least && value <= most; }
-
 std::string TimeText(const IMA_DATETIME& time) {
-  // strftime takes no time that does not exist.
-  const bool exists = IsWithin(time.tm_mon, 0, 11) && IsWithin(time.tm_mday, 1, 31) &&
-                      IsWithin(time.tm_hour, 0, 23) && IsWithin(time.tm_min, 0, 59) &&
-                      IsWithin(time.tm_sec, 0, 60);
-  if (!exists) return kNotAvailable;
   std::tm shown{};
   shown.tm_year = time.tm_year;
   shown.tm_mon = time.tm_mon;
@@ -42,11 +35,6 @@ std::string TimeText(const IMA_DATETIME& time) {
   return std::strftime(text, sizeof text, "%D %T", &shown) == 0 ? kNotAvailable : text;
 }
 
-template <auto member>
-constexpr auto Number =
-    [](const Listed& listed) { return static_cast<long long>(listed.properties.*member); };
-template <auto member>
-constexpr auto Is = [](const Listed& listed) { return listed.properties.*member != 0; };
 template <auto present, auto address>
 constexpr auto Address = [](const Listed& listed) -> std::string {
   return listed.status.*present == 1 ? AddressText(listed.status.*address) : kNotAvailable;
@@ -103,7 +91,7 @@ class SessionConnectionList : public CommandFrame<SessionConnectionList> {
 
   static constexpr Parameter kParameters[] = {
       AdapterFilter(),
-      String("name", 'n', "The iSCSI target name."),
+      TargetFilter(),
       String("isid", 's', "The iSCSI session identifier(ISID)."),
       String("cid", 'c', "The iSCSI connection identifier(CID)."),
   };

@@ -16,18 +16,11 @@ const char* AuthenticationText(IMA_AUTHMETHOD method) {
   }
 }
 
-/// RFC 7143 section 13.14: the length says nothing where neither the target nor the initiator may send
-/// unsolicited data.
+/// RFC 7143 section 13.14: the length says nothing where the initiator may send no unsolicited data.
 std::string FirstBurstLengthText(const IMA_SESSION_PROPERTIES& properties) {
   if (!properties.immediateData && properties.initialR2T) return "Irrelevant";
   return std::to_string(static_cast<int>(properties.firstBurstLength));
 }
-
-template <auto member>
-constexpr auto Number =
-    [](const Session& session) { return static_cast<long long>(session.properties.*member); };
-template <auto member>
-constexpr auto Is = [](const Session& session) { return session.properties.*member != 0; };
 
 using Properties = IMA_SESSION_PROPERTIES;
 
@@ -56,7 +49,7 @@ constexpr Structure kSession = StructureOf<kColumns>("Session");
 
 constexpr Parameter kParameters[] = {
     AdapterFilter(),
-    String("name", 'n', "The iSCSI target name."),
+    TargetFilter(),
     String("isid", 's', "The iSCSI session identifier."),
 };
 

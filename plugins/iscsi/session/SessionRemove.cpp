@@ -6,7 +6,7 @@ namespace {
 constexpr Parameter kParameters[] = {
     Adapter(),
     String("name", 'n', "The name of the target to login to."),
-    SessionToDuplicate(),
+    SessionIsid(),
 };
 
 }  // namespace
