@@ -1,6 +1,7 @@
 #include "support/SweepTable.h"
 
 #include <nlohmann/json.hpp>
+#include <regex>
 
 #include "host/Schema.h"
 
@@ -27,8 +28,7 @@ using Text = std::string;
 constexpr char kUnknownAdapter[] = "Invalid adapter specified or unable to get adapter.";
 const Text kRange =
     "Please make sure parameter input is settable and within MAX/MIN range (integer takes numbers, bool "
-    "takes "
-    "[true/false,yes/no,y/n]).";
+    "takes [true/false,yes/no,y/n]).";
 const Text kUnsetParms = "Unable to set parameters. " + kRange +
                          " Digests will take {prohibited, discouraged, preferred, required} only.";
 constexpr char kNoParms[] = "Failed to get parameter configuration.";
@@ -91,9 +91,43 @@ Text ParmLines(const Text& place) {
          " -k DataDigest --default" + (place == kAdapter ? "" : " | " + place + " -k MaxCmds --inherit");
 }
 
-std::vector<SweptCommand> MakeCommands() {
+struct ExceptionToTheRule {
+  std::string_view command;    ///< a part of its name
+  std::string_view operation;  ///< empty for every call
+  std::string_view thrown;     ///< empty for every failure
+  Behind behind;
+};
+
+constexpr ExceptionToTheRule kExceptions[] = {
+    // A listing of adapters that answers for as many as it can.
+    {"physicalnetworkportal list", "GetPhysicalNetworkPortals", "", Behind::GoesOn},
+    // An adapter with a network stack of its own may lack these calls.
+    {"logicalnetworkportal list", "GetLogicalNetworkPortals", "", Behind::AsksKind},
+    {"logicalnetworkportal list", "GetNicProperties", "", Behind::AsksKind},
+    {"networkportal list", "GetiScsiBoundNicListWithPathStatus", "", Behind::AsksKind},
+    {"networkportal ipconfig get", "GetLogicalNetworkPortals", "", Behind::AsksKind},
+    // "na" stands in the row.
+    {"adapter target list", "IMA_TSR_GetInternalConfigData", "", Behind::GoesOn},
+    {"adapter discovery statictarget list", "IMA_TSR_GetInternalConfigData", "", Behind::GoesOn},
+    // An adapter that cannot tell its routes has none to show.
+    {"RouteList", "IMA_TSR_GetRouteOidList", "", Behind::GoesOn},
+    // What was found is shown in any case.
+    {"plugin list", "", "", Behind::KeepsRows},
+    // An entry without a portal must not stay.
+    {"RouteAdd", "IMA_TSR_AssociateRoute", "", Behind::TakesBack},
+    // Built on statuses alone, it has no handler for what this helper throws.
+    {"adapter discovery statictarget list", "ConvertHostAddress", "", Behind::ToFramework},
+    // For iSNS every failure of the lookup is an unknown adapter. Elsewhere the lookup has a handler for what
+    // lookups throw, and its own failure is none of the work's behind it.
+    {"Isns", "GetScsiInterface", "", Behind::TheRule},
+    {"", "GetScsiInterface", "NodeCtlException", Behind::ToFramework},
+};
+
+}  // namespace
+
+const std::vector<SweptCommand>& Commands() {
   using enum Statuses;
-  return {
+  static const std::vector<SweptCommand> commands = {
       {"plugin list", "| -p libsecond.so | -A ind",
        kWalk + "IMA_GetPluginOidList: Unable to get plugin list. | "
                "IMA_GetPluginProperties: Unable to get plugin properties. | "
@@ -105,9 +139,9 @@ std::vector<SweptCommand> MakeCommands() {
       {"adapter list", "| -A ind", "Unable to list adapters."},
       {"adapter get", kAdapter, "Unable to get adapter information."},
       {"adapter set", "-A ind -n iqn.2026-11.org.example:one -a lab | -A soft -a lab",
-       "Unable to set name or alias.", Shown},
+       "Unable to set name or alias.", nullptr, Shown},
       {"adapter param get", kAdapter, kNoParms},
-      {"adapter param set", ParmLines(kAdapter), kUnsetParms, Shown},
+      {"adapter param set", ParmLines(kAdapter), kUnsetParms, nullptr, Shown},
       {"adapter capabilities get", kAdapter, "Unable to get adapter properties."},
       {"adapter auth chap get", "-A ind | -A ind -d mutual",
        "Failed to get iSCSI CHAP authentication configuration."},
@@ -159,7 +193,7 @@ std::vector<SweptCommand> MakeCommands() {
       {"physicalnetworkportal param get", "-A ind | -A ind -n phy0",
        "Failed to get parameters on physical network portal."},
       {"physicalnetworkportal param set", "-A ind -o MTU -v 9000 | -A ind -o ArpRedirect -v 1",
-       "Failed to set parameter for physical network portal.", Shown},
+       "Failed to set parameter for physical network portal.", nullptr, Shown},
       {"networkportal list", "| -A soft", "Failed to list network portals."},
       {"networkportal add", "-A soft -n nic2", "Unable to bind iscsi port. [force = 0]\n"},
       {"networkportal add", "-A soft -n nic2 -f true", "Unable to bind iscsi port. [force = 1]\n"},
@@ -169,91 +203,46 @@ std::vector<SweptCommand> MakeCommands() {
       {"networkportal ipconfig set",
        "-A ind -e true -i 192.0.2.77 -s 255.255.255.128 -g 192.0.2.2 -x 192.0.2.3 -y 192.0.2.4 | "
        "-A ind -e true -d true | -A ind -e false",
-       "Failed to set IP configuration on network portal. | %REASON%", Gathered},
+       "Failed to set IP configuration on network portal. | %REASON%", nullptr, Gathered},
       {"networkportal ipv6config get", kAdapter,
        "Failed to get IP configuration for network portal. | %REASON%"},
       {"networkportal ipv6config set",
        "-A ind -e true -d true -l true -r true -g 2001:db8:2::9 | -A ind -e false",
-       "Failed to set IPv6 configuration on network portal. | %REASON%", Gathered},
+       "Failed to set IPv6 configuration on network portal. | %REASON%", nullptr, Gathered},
       {"networkportal ipv6config address add",
        "-A ind -a 2001:db8:3::5/64 -a 2001:db8:3::6/64 -r | -A ind -a 2001:db8:3::7/64 | -A ind -r",
-       "Error adding IPv6 address list on network portal | %REASON%", Gathered},
+       "Error adding IPv6 address list on network portal | %REASON%", nullptr, Gathered},
       {"networkportal ipv6config address list", kAdapter, "Unable to list IPv6 Addresses. | %REASON%"},
       {"networkportal ipv6config address remove", "-A ind -a 2001:db8:2::20/64 -a 2001:db8:2::21/64",
-       "Error removing IPv6 address on network portal. | %REASON%", Gathered},
+       "Error removing IPv6 address on network portal. | %REASON%", nullptr, Gathered},
       {"ibftboot get", "", "Unable to get boot tables."},
       {"ibftboot import", "", "Unable to import IBFT Boot table."},
 
       {"AdapterDiscoveryIsnsAdd", "-A ind -m static -a 192.0.2.97",
-       "%REASON% | Unable to add iSNS discovery address.", Ignored, Make<AdapterDiscoveryIsnsAdd>},
-      {"AdapterDiscoveryIsnsList", "| -A ind", "%REASON% | Failed to list isns discovery addresses.", Ignored,
+       "%REASON% | Unable to add iSNS discovery address.", Make<AdapterDiscoveryIsnsAdd>},
+      {"AdapterDiscoveryIsnsList", "| -A ind", "%REASON% | Failed to list isns discovery addresses.",
        Make<AdapterDiscoveryIsnsList>},
-      {"AdapterDiscoveryIsnsParamGet", kServer, kNoIsnsParms, Ignored, Make<AdapterDiscoveryIsnsParamGet>},
+      {"AdapterDiscoveryIsnsParamGet", kServer, kNoIsnsParms, Make<AdapterDiscoveryIsnsParamGet>},
       {"AdapterDiscoveryIsnsParamSet",
        Text(kServer) + " -k PollInterval -v 60 | " + kServer + " -k PollInterval --inherit | " + kServer +
            " -k PollInterval --default",
-       "%REASON% | Unable to set isns parameters. " + kRange, Ignored, Make<AdapterDiscoveryIsnsParamSet>},
-      {"AdapterDiscoveryIsnsRemove", kServer, "%REASON% | Unable to remove iSNS discovery address.", Ignored,
+       "%REASON% | Unable to set isns parameters. " + kRange, Make<AdapterDiscoveryIsnsParamSet>},
+      {"AdapterDiscoveryIsnsRemove", kServer, "%REASON% | Unable to remove iSNS discovery address.",
        Make<AdapterDiscoveryIsnsRemove>},
-      {"AdapterIsnsParamGet", kAdapter, kNoIsnsParms, Ignored, Make<AdapterIsnsParamGet>},
+      {"AdapterIsnsParamGet", kAdapter, kNoIsnsParms, Make<AdapterIsnsParamGet>},
       {"AdapterIsnsParamSet", "-A ind -k PollInterval -v 60 | -A ind -k PollInterval --default",
-       "%REASON% | Unable to set iSNS parameters. " + kRange, Shown, Make<AdapterIsnsParamSet>},
-      {"RouteAdd", "-A ind -s 203.0.113.0/24 -g 192.0.2.1 -n port0", kRoute, Ignored, Make<RouteAdd>},
-      {"RouteList", "| -A ind -n port0", kRoute, Ignored, Make<RouteList>},
-      {"RouteRemove", "-A ind -s 198.51.100.0/24 -g 192.0.2.1 -n port0", kRoute, Ignored, Make<RouteRemove>},
+       "%REASON% | Unable to set iSNS parameters. " + kRange, Make<AdapterIsnsParamSet>, Shown},
+      {"RouteAdd", "-A ind -s 203.0.113.0/24 -g 192.0.2.1 -n port0", kRoute, Make<RouteAdd>},
+      {"RouteList", "| -A ind -n port0", kRoute, Make<RouteList>},
+      {"RouteRemove", "-A ind -s 198.51.100.0/24 -g 192.0.2.1 -n port0", kRoute, Make<RouteRemove>},
   };
-}
-
-struct ExceptionToTheRule {
-  const char* command;    ///< a part of its name
-  const char* operation;  ///< empty for every call
-  const char* thrown;     ///< empty for every failure
-  Behind behind;
-};
-
-constexpr ExceptionToTheRule kExceptions[] = {
-    // A listing of adapters that answers for as many as it can.
-    {"physicalnetworkportal list", "GetPhysicalNetworkPortals", "", Behind::GoesOn},
-    // An adapter with a network stack of its own may lack these calls.
-    {"logicalnetworkportal list", "GetLogicalNetworkPortals", "", Behind::AsksKind},
-    {"logicalnetworkportal list", "GetNicProperties", "", Behind::AsksKind},
-    {"networkportal list", "GetiScsiBoundNicListWithPathStatus", "", Behind::AsksKind},
-    {"networkportal ipconfig get", "GetLogicalNetworkPortals", "", Behind::AsksKind},
-    // "na" stands in the row.
-    {"adapter target list", "IMA_TSR_GetInternalConfigData", "", Behind::GoesOn},
-    {"adapter discovery statictarget list", "IMA_TSR_GetInternalConfigData", "", Behind::GoesOn},
-    // An adapter that cannot tell its routes has none to show.
-    {"RouteList", "IMA_TSR_GetRouteOidList", "", Behind::GoesOn},
-    // What was found is shown in any case.
-    {"plugin list", "", "", Behind::KeepsRows},
-    // An entry without a portal must not stay.
-    {"RouteAdd", "IMA_TSR_AssociateRoute", "", Behind::TakesBack},
-    // Built on statuses alone, it has no handler for what this helper throws.
-    {"adapter discovery statictarget list", "ConvertHostAddress", "", Behind::ToFramework},
-    // For iSNS every failure of the lookup is an unknown adapter. Elsewhere the lookup has a handler for what
-    // lookups throw, and its own failure is none of the work's behind it.
-    {"Isns", "GetScsiInterface", "", Behind::TheRule},
-    {"", "GetScsiInterface", "NodeCtlException", Behind::ToFramework},
-};
-
-}  // namespace
-
-const std::vector<SweptCommand>& Commands() {
-  static const std::vector<SweptCommand> commands = MakeCommands();
   return commands;
 }
 
 Texts Parts(const std::string& text) {
-  Texts parts;
-  for (std::size_t begin = 0; begin <= text.size();) {
-    const std::size_t end = std::min(text.find('|', begin), text.size());
-    std::string part = text.substr(begin, end - begin);
-    part.erase(0, part.find_first_not_of(' '));
-    part.erase(part.find_last_not_of(' ') + 1);
-    parts.push_back(part);
-    begin = end + 1;
-  }
-  return parts;
+  static const std::regex kBar(" *\\| *");
+  const std::string closed = text + '|';
+  return {std::sregex_token_iterator(closed.begin(), closed.end(), kBar, -1), {}};
 }
 
 Texts ReportsOf(const SweptCommand& command, const std::string& operation) {
@@ -263,20 +252,17 @@ Texts ReportsOf(const SweptCommand& command, const std::string& operation) {
   for (std::string text : Parts(command.reports)) {
     if (text.empty() || text.starts_with(isIma ? operation + ": " : "IMA_") != isIma) continue;
     if (isIma) text.erase(0, operation.size() + 2);
-    const std::size_t reason = text.find("%REASON%");
-    if (reason != text.npos) text.replace(reason, 8, kReason);
-    reports.push_back(text);
+    reports.push_back(std::regex_replace(text, std::regex("%REASON%"), kReason));
   }
   return reports;
 }
 
 Behind BehindOf(const SweptCommand& command, const std::string& operation, const std::string& thrown) {
-  const auto fits = [](const char* wanted, const std::string& text) {
-    return *wanted == 0 || text == wanted;
-  };
   for (const ExceptionToTheRule& one : kExceptions) {
-    if (command.name.find(one.command) == command.name.npos) continue;
-    if (fits(one.operation, operation) && fits(one.thrown, thrown)) return one.behind;
+    const bool fits = command.name.find(one.command) != command.name.npos &&
+                      (one.operation.empty() || operation == one.operation) &&
+                      (one.thrown.empty() || thrown == one.thrown);
+    if (fits) return one.behind;
   }
   return Behind::TheRule;
 }
@@ -284,9 +270,8 @@ Behind BehindOf(const SweptCommand& command, const std::string& operation, const
 std::string HostDescription() {
   nlohmann::json host = nlohmann::json::parse(R"({
     "plugins": [{"fileName": "libfirst.so", "vendor": "One"}, {"fileName": "libsecond.so", "vendor": "Two"}],
-    "nics": [{"name": "nic1", "mac": "02:54:53:52:00:01", "ipv4Address": "198.51.100.11",
-              "ipv6Addresses": [{"address": "2001:db8:1::11"}]},
-             {"name": "nic2", "mac": "02:54:53:52:00:02"}],
+    "nics": [{"name": "nic1", "ipv4Address": "198.51.100.11", "ipv6Addresses": [{"address": "2001:db8:1::11"}]},
+             {"name": "nic2"}],
     "bootTables": [{"enabled": 1, "macAddress": "02:54:53:52:01:02", "targetIP": "198.51.100.80",
                     "targetName": "iqn.2026-11.org.example:boot", "initiatorName": "iqn.2026-11.org.example:host",
                     "chapType": 2, "chapName": "boot", "chapPwd": "s3cr3t-boot-password",

@@ -27,8 +27,8 @@ struct SweptCommand {
   /// What is reported, a bar between the texts: of an exception, whose own text %REASON% stands for; behind
   /// the name of an IMA call and a colon, of its failure.
   std::string reports;
-  Statuses statuses = Statuses::Ignored;
   TessaroCli::IscsiNamespace::NodePtr (*make)() = nullptr;  ///< of a class that stands on no path
+  Statuses statuses = Statuses::Ignored;
 };
 
 const std::vector<SweptCommand>& Commands();
