@@ -22,34 +22,27 @@ TEST(Hosts, FaultsShowEachWayInWhichAnOperationAnswers) {
   const struct {
     const char* line;
     int status;
-    std::vector<std::string> messages;
+    std::string message;
     const char* trace;  // the line of the library's answer, or a part of it
   } cases[] = {
-      {"adapter set -A reboots -a x", 3, {kReboot}, "SetInitiatorAlias(reboots, \"x\") = 1"},
-      {"adapter set -A resets -a x", 0, {}, "ResetAdapter(resets) = ok"},
-      {"adapter set -A lacks -a x", 3, {kLacks}, "SetInitiatorAlias(lacks, \"x\") = 4"},
-      {"physicalnetworkportal param set -A lacks -o MTU -v 1500", 3, {kLacks}, "SetMtu(lacks, 1500) = 4"},
-      {"adapter set -A fails -a x", 1, {"Unable to set name or alias."}, "The adapter does not answer."},
-      {"adapter capabilities get -A fails",
-       1,
-       {"Unable to get adapter properties."},
+      {"adapter set -A reboots -a x", 3, kReboot, "SetInitiatorAlias(reboots, \"x\") = 1"},
+      {"adapter set -A resets -a x", 0, "", "ResetAdapter(resets) = ok"},
+      {"adapter set -A lacks -a x", 3, kLacks, "SetInitiatorAlias(lacks, \"x\") = 4"},
+      {"physicalnetworkportal param set -A lacks -o MTU -v 1500", 3, kLacks, "SetMtu(lacks, 1500) = 4"},
+      {"adapter set -A fails -a x", 1, "Unable to set name or alias.", "The adapter does not answer."},
+      {"adapter capabilities get -A fails", 1, "Unable to get adapter properties.",
        "GetCapabilities(fails) !"},
-      {"adapter discovery rediscover -A fails", 1, {"Unable to discover targets."}, "Rediscover(fails) !"},
-      {"adapter target portal list", 1, {"Unable to get address keys."}, "= 0x80000003"},
-      {"networkportal ipconfig set -A reboots -i 192.0.2.35",
-       0,
-       {},
-       "SetIpv4Address(reboots, \"192.0.2.35\") = 1"},
-      {"networkportal ipconfig set -A resets -i 192.0.2.35", 0, {}, "ResetAdapter(resets) = ok"},
-      {"networkportal ipconfig get -A lacks", 0, {}, "IMA_TSR_GetLnpOidList"},
-      {"networkportal list -A lacks", 0, {}, "IMA_TSR_GetNicProperties"},
+      {"adapter discovery rediscover -A fails", 1, "Unable to discover targets.", "Rediscover(fails) !"},
+      {"adapter target portal list", 1, "Unable to get address keys.", "= 0x80000003"},
+      {"networkportal ipconfig get -A lacks", 0, "", "IMA_TSR_GetLnpOidList"},
+      {"networkportal list -A lacks", 0, "", "IMA_TSR_GetNicProperties"},
   };
-  for (const auto& [line, status, messages, trace] : cases) {
+  for (const auto& [line, status, message, trace] : cases) {
     SCOPED_TRACE(line);
     Harness host(HostFile("faults.json"));
     const Outcome run = host(std::string("iscsi ") + line);
     EXPECT_EQ(run.status, status);
-    EXPECT_EQ(run.messages, messages);
+    EXPECT_EQ(run.messages, std::vector<std::string>(message.empty() ? 0 : 1, message));
     EXPECT_THAT(run.trace, testing::Contains(HasSubstr(trace)));
   }
 }

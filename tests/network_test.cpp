@@ -12,8 +12,6 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using Texts = std::vector<std::string>;
 
-constexpr char kRediscover[] = "iscsi adapter discovery rediscover -A a";
-constexpr char kStatus[] = "iscsi adapter discovery status get -A a";
 constexpr char kFailedLogins[] = "Discovery Completed, Some iSCSI Targets failed to login.";
 
 /// An adapter "a" with all that it may need, with @p adapter, keys of its record, merged in, on a host with
@@ -48,14 +46,19 @@ std::string TargetWith(const std::string& target, const std::string& adapter = "
 
 Texts Column(Harness& host, const std::string& command, const char* field) {
   Texts values;
-  for (const json& row : host(command).result) {
-    values.push_back(row[field].is_string() ? row[field].get<std::string>() : row[field].dump());
-  }
+  for (const json& row : host(command).result) values.push_back(row[field]);
   return values;
 }
 Texts Targets(Harness& host) { return Column(host, "iscsi adapter target list", "Target"); }
 Texts Errors(Harness& host) { return Column(host, "iscsi adapter target list", "Last Error"); }
+Texts Methods(Harness& host) { return Column(host, "iscsi adapter target list", "Discovery Method"); }
 Texts SessionTargets(Harness& host) { return Column(host, "iscsi session list", "Target"); }
+
+/// The status of a discovery of the adapter.
+std::string Rediscover(Harness& host) {
+  host("iscsi adapter discovery rediscover -A a");
+  return host("iscsi adapter discovery status get -A a").result;
+}
 
 /// Changes the description of the host as @p change says, a JSON merge patch of its top keys.
 void Alter(const Harness& host, const json& change) {
@@ -67,27 +70,21 @@ void Alter(const Harness& host, const json& change) {
 TEST(Network, EachOutcomeOfALoginShowsAsItself) {
   const struct {
     const char* error;
-    const char* target = "{}";
+    const char* target;
     const char* portals = "[]";
     const char* adapter = "{}";
   } cases[] = {
-      {"No Error"},
       {"0x0200 Miscellaneous iSCSI initiator errors.", R"({"status": 512})"},
-      {"0x0201 Initiator could not be successfully authenticated.", R"({"chap": {"level": "required"}})"},
       {"0x0202 Initiator is not allowed access to the given target.",
        R"({"refusedInitiators": ["x", "iqn.2026-11.org.example:host"]})"},
       {"0x0203 Requested ITN does not exist at this address.", R"({"name": "other"})"},
-      {"0x0204 Requested ITN has been removed and no forwarding address is provided.", R"({"status": 516})"},
       {"0x0207 Missing parameters (e.g., iSCSI initiator and/or target name).", "{}", "[]",
        R"({"initiatorName": ""})"},
       {"0x0301 iSCSI service or target is not currently operational.", "{}",
        R"([{"host": "192.0.2.1", "status": 769}])"},
-      {"0x0302 Target has insufficient session, connection or other resources.", R"({"maxSessions": 0})"},
-      {"Unqualified Login Status. (Error=0x50310)", R"({"status": 784})"},
       {"Unqualified Login Status. (Error=0x10000)", "{}", R"([{"host": "192.0.2.1", "answers": false}])"},
       {"Unqualified Login Status. (Error=0x10000)", R"({"portals": []})"},
       {"Unqualified Login Status. (Error=0x20000)", "{}", "[]", R"({"kind": "software"})"},
-      {"Unqualified Login Status. (Error=0x20000)", "{}", "[]", R"({"kind": "dependent"})"},
       {"Unqualified Login Status. (Error=0x60203)", R"({"parameters": {"dataDigest": "required"}})"},
       {"0x0101 Requested ITN has moved temporarily to the address provided.", "{}",
        R"([{"host": "192.0.2.1", "redirect": {"host": "192.0.2.1"}}])"},
@@ -97,13 +94,10 @@ TEST(Network, EachOutcomeOfALoginShowsAsItself) {
   };
   for (const auto& c : cases) {
     Harness host(TargetWith(c.target, c.adapter, c.portals));
-    const bool isIn = c.error == std::string("No Error");
-    const Outcome run = host("iscsi session add -A a -n t");
-    EXPECT_EQ(run.status, isIn ? 0 : 1) << c.error;
+    EXPECT_EQ(host("iscsi session add -A a -n t").status, 1) << c.error;
     EXPECT_THAT(Errors(host), ElementsAre(c.error)) << c.target << c.portals;
-    EXPECT_EQ(SessionTargets(host).size(), isIn ? 1u : 0u) << c.error;
-    host(kRediscover);
-    EXPECT_EQ(host(kStatus).result, isIn ? "Discovery Completed" : kFailedLogins) << c.error;
+    EXPECT_THAT(SessionTargets(host), IsEmpty()) << c.error;
+    EXPECT_EQ(Rediscover(host), kFailedLogins) << c.error;
   }
 }
 
@@ -122,23 +116,12 @@ TEST(Network, ChapIsDoneAsBothSidesWish) {
     const char* mutualSecret = "back";
     const char* targetName = "target";
   } cases[] = {
-      {"prohibited", "right", "prohibited", in, "none"},
-      {"prohibited", "right", "preferred", in, "none"},
       {"prohibited", "right", "required", refused, ""},
-      {"discouraged", "right", "prohibited", in, "none"},
       {"discouraged", "wrong", "preferred", in, "none"},
-      {"discouraged", "right", "required", in, "chap"},
-      {"discouraged", "wrong", "required", refused, ""},
-      {"preferred", "right", "prohibited", in, "none"},
       {"preferred", "right", "discouraged", in, "chap"},
-      {"preferred", "wrong", "discouraged", refused, ""},
-      {"preferred", "right", "required", in, "chap"},
       {"required", "right", "prohibited", without, ""},
-      {"required", "right", "discouraged", in, "chap"},
       {"required", "wrong", "required", refused, ""},
       {"required", "right", "required", in, "chap", "required"},
-      {"required", "right", "required", in, "chap", "preferred"},
-      {"required", "right", "required", unproven, "", "required", "wrong"},
       {"required", "right", "required", unproven, "", "preferred", "wrong"},
       {"required", "right", "required", in, "chap", "discouraged", "wrong"},
       {"required", "right", "required", unproven, "", "required", "back", ""},
@@ -176,7 +159,7 @@ TEST(Network, TheChapEntryThatHoldsIsTheNextOne) {
     bool isIn;
   } cases[] = {{"{}", "{}", right, true},    {"{}", right, wrong, true},  {right, wrong, wrong, true},
                {wrong, right, right, false}, {"{}", wrong, right, false}, {aside, right, wrong, true},
-               {aside, aside, right, true},  {right, "{}", "{}", true},   {"{}", "{}", "{}", false}};
+               {aside, aside, right, true}};
   for (const auto& c : cases) {
     Harness host(HostWith(
         R"({"chap": )" + c.adapter + R"(, "sendTargets": [{"host": "192.0.2.1", "chap": )" + c.sendTarget +
@@ -195,20 +178,12 @@ TEST(Network, RulesOfNegotiation) {
     std::uint32_t P::*value;
     std::uint32_t one, other, result;  // whichever side brings which
   } cases[] = {
-      {&P::maxConnections, 1, 4, 1},
-      {&P::initialR2T, 0, 1, 1},
-      {&P::initialR2T, 0, 0, 0},
-      {&P::immediateData, 1, 0, 0},
-      {&P::immediateData, 1, 1, 1},
-      {&P::maxBurstLength, 70000, 65536, 65536},
-      {&P::firstBurstLength, 512, 4096, 512},
-      {&P::firstBurstLength, 16777215, 16777215, 262144},
-      {&P::defaultTime2Wait, 2, 5, 5},
-      {&P::defaultTime2Retain, 20, 0, 0},
-      {&P::maxOutstandingR2T, 8, 3, 3},
-      {&P::dataPduInOrder, 1, 0, 1},
-      {&P::dataSequenceInOrder, 0, 0, 0},
-      {&P::errorRecoveryLevel, 2, 1, 1},
+      {&P::maxConnections, 1, 4, 1},          {&P::initialR2T, 0, 1, 1},
+      {&P::immediateData, 1, 0, 0},           {&P::maxBurstLength, 70000, 65536, 65536},
+      {&P::firstBurstLength, 512, 4096, 512}, {&P::firstBurstLength, 16777215, 16777215, 262144},
+      {&P::defaultTime2Wait, 2, 5, 5},        {&P::defaultTime2Retain, 20, 0, 0},
+      {&P::maxOutstandingR2T, 8, 3, 3},       {&P::dataPduInOrder, 1, 0, 1},
+      {&P::dataSequenceInOrder, 0, 1, 1},     {&P::errorRecoveryLevel, 2, 1, 1},
   };
   for (const auto& c : cases) {
     P one, other;
@@ -234,19 +209,19 @@ TEST(Network, SessionsShowWhatBothSidesBrought) {
                          "ImmediateData": {"current": false, "supported": false},
                          "HeaderDigest": "discouraged"}})"));
   ASSERT_EQ(host("iscsi session add -A a").result, true);
-  const json session = host("iscsi session list").result[0];
-  EXPECT_EQ(session["MaxBurstLength"], 4096);
-  EXPECT_EQ(session["FirstBurstLength"], "4096");
-  EXPECT_EQ(session["DefaultTime2Wait"], 9);
-  EXPECT_EQ(session["InitialR2T"], false);
-  EXPECT_EQ(session["ImmediateData"], true);  // the adapter has no such parameter
-  EXPECT_EQ(session["TargetPortalGroupTag"], 7);
-  const json connection = host("iscsi session connection list").result[0];
-  EXPECT_EQ(connection["MaxRecvDataSegmentLength"], 1024);
-  EXPECT_EQ(connection["MaxTransmitDataSegmentLength"], 65536);
-  EXPECT_EQ(connection["HeaderDigest"], "CRC32C");
-  EXPECT_EQ(connection["DataDigest"], "NONE");
-  EXPECT_EQ(connection["LocalAddress"], "192.0.2.100");
+  // The adapter has no ImmediateData, which is at its standard value therefore.
+  const std::pair<const char*, const char*> shown[] = {
+      {"iscsi session list", R"({"MaxBurstLength": 4096, "FirstBurstLength": "4096", "DefaultTime2Wait": 9,
+                                 "InitialR2T": false, "ImmediateData": true, "TargetPortalGroupTag": 7})"},
+      {"iscsi session connection list",
+       R"({"MaxRecvDataSegmentLength": 1024, "MaxTransmitDataSegmentLength": 65536, "HeaderDigest": "CRC32C",
+           "DataDigest": "NONE", "LocalAddress": "192.0.2.100"})"}};
+  for (const auto& [list, fields] : shown) {
+    const json row = host(list).result[0];
+    json expected = row;
+    expected.update(json::parse(fields));
+    EXPECT_EQ(row, expected);
+  }
 }
 
 constexpr char kSendTarget[] = R"({"sendTargets": [{"host": "192.0.2.1"}]})";
@@ -257,17 +232,15 @@ constexpr char kTwoTargets[] = R"({"remoteTargets": [
 TEST(Rediscovery, TargetsComeAndGoAndSettingsStay) {
   Harness host(HostWith(kSendTarget, kTwoTargets));
   EXPECT_THAT(Targets(host), IsEmpty());
-  EXPECT_EQ(host(kRediscover).result, "Rediscovery started");
-  EXPECT_EQ(host(kStatus).result, "Discovery Completed");
+  EXPECT_EQ(Rediscover(host), "Discovery Completed");
   EXPECT_THAT(Targets(host), ElementsAre("t0", "t1"));
   EXPECT_THAT(Column(host, "iscsi adapter target list", "Alias"), ElementsAre("zero", ""));
-  EXPECT_THAT(Column(host, "iscsi adapter target list", "Discovery Method"),
-              ElementsAre("SENDTARGETS ", "SENDTARGETS "));
+  EXPECT_THAT(Methods(host), ElementsAre("SENDTARGETS ", "SENDTARGETS "));
   EXPECT_THAT(Column(host, "iscsi adapter target portal list -n t0", "Port"), ElementsAre("3260", "860"));
   EXPECT_THAT(Column(host, "iscsi adapter target portal list -n t0", "Tpgt"), ElementsAre("2", "1"));
   EXPECT_THAT(SessionTargets(host), ElementsAre("t0", "t1"));
   const json once = host.Show();
-  host(kRediscover);
+  Rediscover(host);
   EXPECT_EQ(host.Show(), once);
 
   // What is set on a portal and on the sendtarget stays; t0 goes for want of a session, t1 stays for its own.
@@ -278,17 +251,17 @@ TEST(Rediscovery, TargetsComeAndGoAndSettingsStay) {
   ASSERT_EQ(host("iscsi session remove -A a -n t0").result, true);
   const json settings = host.Show("/adapters/0/staticTargets/2");
   Alter(host, {{"remoteTargets", json::array({{{"name", "t2"}, {"portals", {{{"host", "192.0.2.1"}}}}}})}});
-  host(kRediscover);
+  Rediscover(host);
   EXPECT_THAT(Targets(host), ElementsAre("t1", "t2"));
   EXPECT_EQ(host.Show("/adapters/0/staticTargets/0"), settings);
   Alter(host, json::parse(kTwoTargets));
-  host(kRediscover);
+  Rediscover(host);
   EXPECT_EQ(host.Show("/adapters/0/staticTargets/0"), settings);
 
   // Without the sendtarget nobody tells of them.
   host("iscsi session remove -A a");
   host("iscsi adapter discovery sendtarget remove -A a -a 192.0.2.1");
-  host(kRediscover);
+  Rediscover(host);
   EXPECT_THAT(Targets(host), IsEmpty());
 }
 
@@ -296,23 +269,15 @@ TEST(Rediscovery, StaticTargetsAreFoundBesides) {
   Harness host(HostWith(
       R"({"sendTargets": [{"host": "192.0.2.1"}], "staticTargets": [{"name": "t1", "host": "192.0.2.1", "boot": true}]})",
       kTwoTargets));
-  host(kRediscover);
+  Rediscover(host);
   EXPECT_THAT(Targets(host), ElementsAre("t1", "t0"));
-  EXPECT_THAT(Column(host, "iscsi adapter target list", "Discovery Method"),
-              ElementsAre("STATIC SENDTARGETS ", "SENDTARGETS "));
+  EXPECT_THAT(Methods(host), ElementsAre("STATIC SENDTARGETS ", "SENDTARGETS "));
   EXPECT_EQ(host("iscsi adapter discovery statictarget list").result.size(), 1u);
-  const std::string both = host.Show().dump();
-  const char* remove = "iscsi adapter discovery statictarget remove -A a -n t1 -a 192.0.2.1";
-  ASSERT_EQ(host(remove).result, true);
-  EXPECT_THAT(Column(host, "iscsi adapter target list", "Discovery Method"),
-              ElementsAre("SENDTARGETS ", "SENDTARGETS "));
-  host::Host::Current().Load(both);
   host("iscsi session remove -A a");
   Alter(host, {{"remoteTargets", json::array()}, {"remotePortals", {{{"host", "192.0.2.1"}}}}});
-  host(kRediscover);
-  EXPECT_THAT(Column(host, "iscsi adapter target list", "Discovery Method"), ElementsAre("STATIC "));
-  EXPECT_EQ(host(kStatus).result, kFailedLogins);
-  ASSERT_EQ(host(remove).result, true);
+  EXPECT_EQ(Rediscover(host), kFailedLogins);
+  EXPECT_THAT(Methods(host), ElementsAre("STATIC "));
+  ASSERT_EQ(host("iscsi adapter discovery statictarget remove -A a -n t1 -a 192.0.2.1").result, true);
   EXPECT_THAT(Targets(host), IsEmpty());
 }
 
@@ -320,17 +285,17 @@ TEST(Rediscovery, ATargetThatNothingLeadsToGoes) {
   // With its session, where it has one; of the others what has addresses of its own stays.
   Harness host(
       HostWith(R"({"sendTargets": [{"host": "192.0.2.1"}],
-      "staticTargets": [{"name": "t1", "host": "192.0.2.1"}, {"name": "t9", "host": "192.0.2.9", "sendTarget": {"host": "192.0.2.1"}}],
-      "targets": [{"name": "bare"}, {"name": "own", "addresses": [{"address": "192.0.2.1"}]}]})",
+                   "staticTargets": [{"name": "t1", "host": "192.0.2.1"},
+                                     {"name": "t9", "host": "192.0.2.9", "sendTarget": {"host": "192.0.2.1"}}],
+                   "targets": [{"name": "bare"}, {"name": "own", "addresses": [{"address": "192.0.2.1"}]}]})",
                R"({"remoteTargets": [{"name": "t1", "reported": false, "portals": [{"host": "192.0.2.1"}]},
-                                              {"name": "own", "reported": false, "portals": [{"host": "192.0.2.1"}]}]})"));
-  host(kRediscover);
-  EXPECT_EQ(host(kStatus).result, "Discovery Completed");
+                                     {"name": "own", "reported": false, "portals": [{"host": "192.0.2.1"}]}]})"));
+  EXPECT_EQ(Rediscover(host), "Discovery Completed");
   EXPECT_THAT(Targets(host), ElementsAre("own", "t1"));
   for (const char* name : {"t1", "own"})
     EXPECT_EQ(host(std::string("iscsi session remove -A a -n ") + name).result, true);
   EXPECT_THAT(Targets(host), ElementsAre("own", "t1"));
-  host(kRediscover);
+  Rediscover(host);
   ASSERT_EQ(host("iscsi adapter discovery statictarget remove -A a -n t1 -a 192.0.2.1").result, true);
   EXPECT_THAT(Targets(host), ElementsAre("own", "t1"));
   ASSERT_EQ(host("iscsi session remove -A a").result, true);
@@ -345,11 +310,9 @@ TEST(Rediscovery, HostNamesAreTheSameInEachSpelling) {
   const std::string list = "iscsi adapter discovery sendtarget ";
   EXPECT_EQ(host(list + "add -A a -a portal").messages.at(0),
             "The adapter a has the sendtarget portal:3260 already.");
-  host(kRediscover);
-  EXPECT_EQ(host(kStatus).result, kFailedLogins);  // that portal wants CHAP
+  EXPECT_EQ(Rediscover(host), kFailedLogins);  // that portal wants CHAP
   Alter(host, {{"remotePortals", nullptr}});
-  host(kRediscover);
-  EXPECT_EQ(host(kStatus).result, "Discovery Completed");
+  EXPECT_EQ(Rediscover(host), "Discovery Completed");
   EXPECT_THAT(Targets(host), ElementsAre("t"));
   EXPECT_EQ(host("iscsi adapter target portal param get -A a -n t -a portal").result.size(), 19u);
   EXPECT_THAT(Column(host, list + "list", "Sendtarget"), ElementsAre("Portal:3260"));
@@ -362,31 +325,23 @@ TEST(Rediscovery, TheStatusTellsWhatPortalsDid) {
     const char* status;
     std::size_t targets;  // of one that was found before and one that is new
   } cases[] = {
-      {R"({})", "Discovery Completed", 2},
-      {R"({"answers": false})", "Discovery Timeout", 1},
-      {R"({"status": 769})", kFailedLogins, 1},
-      {R"({"chap": {"level": "required"}})", kFailedLogins, 1},
-      {R"({"redirect": {"host": "192.0.2.2", "port": 860}})", "Discovery Completed", 1},
-      {R"({"redirect": {"host": "192.0.2.1"}})", kFailedLogins, 1},
-      {R"({"redirect": {"host": "nowhere", "permanent": true}})", "Discovery Timeout", 1},
+      {R"("answers": true)", "Discovery Completed", 2},
+      {R"("answers": false)", "Discovery Timeout", 1},
+      {R"("redirect": {"host": "192.0.2.2", "port": 860})", "Discovery Completed", 1},
+      {R"("redirect": {"host": "192.0.2.1"})", kFailedLogins, 1},
+      {R"("redirect": {"host": "nowhere", "permanent": true})", "Discovery Timeout", 1},
   };
   for (const auto& c : cases) {
-    json portal = json::parse(c.portal);
-    portal["host"] = "192.0.2.1";
     json network = json::parse(kTwoTargets);
-    network["remotePortals"] = json::array({portal});
+    network["remotePortals"] = {json::parse(R"({"host": "192.0.2.1", )" + std::string(c.portal) + '}')};
     Harness host(HostWith(R"({"sendTargets": [{"host": "192.0.2.1"}], "staticTargets": [
                               {"name": "t0", "host": "192.0.2.2", "port": 860, "sendTarget": {"host": "192.0.2.1"}}]})",
                           network.dump()));
-    host(kRediscover);
-    EXPECT_EQ(host(kStatus).result, c.status) << c.portal;
+    EXPECT_EQ(Rediscover(host), c.status) << c.portal;
     EXPECT_EQ(Targets(host).size(), c.targets) << c.portal;
   }
   Harness cut(HostWith(R"({"kind": "software", "sendTargets": [{"host": "192.0.2.1"}]})", kTwoTargets));
-  cut(kRediscover);
-  EXPECT_EQ(cut(kStatus).result, "Discovery Timeout");
-  Harness offline(HostWith(R"({"state": 1})"));
-  EXPECT_THAT(offline(kRediscover).messages, ElementsAre("Unable to discover targets."));
+  EXPECT_EQ(Rediscover(cut), "Discovery Timeout");
 }
 
 TEST(Paths, LeadToTheFamiliesOfTheirAddresses) {
@@ -394,27 +349,25 @@ TEST(Paths, LeadToTheFamiliesOfTheirAddresses) {
     const char* network;
     bool ipv4, ipv6, name;  // whether portals with such an address are reached
   } cases[] = {
-      {R"({"ipv4Address": "192.0.2.100"})", true, false, true},
-      {R"({"ipv4Address": "192.0.2.100", "ipv4Enabled": false, "ipv6Enabled": true})", false, false, false},
-      {R"({"ipv6Addresses": [{"address": "2001:db8::100"}], "ipv6Enabled": true})", false, true, true},
-      {R"({"ipv6Addresses": [{"address": "2001:db8::100"}]})", false, false, false},
-      {R"({"ipv4Enabled": false, "ipv6Enabled": true})", false, true, true},
-      {R"({"ipv4Address": "192.0.2.100", "ipv6Addresses": [{"address": "2001:db8::100"}], "ipv6Enabled": true})",
-       true, true, true},
+      {R"({})", true, false, true},
+      {R"({"ipv4Enabled": false, "ipv6Enabled": true})", false, false, false},
+      {R"({"ipv4Address": null, "ipv6Addresses": [{"address": "2001:db8::100"}], "ipv6Enabled": true})",
+       false, true, true},
+      {R"({"ipv4Address": null, "ipv6Addresses": [{"address": "2001:db8::100"}]})", false, false, false},
+      {R"({"ipv4Address": null, "ipv4Enabled": false, "ipv6Enabled": true})", false, true, true},
+      {R"({"ipv6Addresses": [{"address": "2001:db8::100"}], "ipv6Enabled": true})", true, true, true},
   };
   for (const auto& c : cases) {
     const std::pair<const char*, bool> portals[] = {
         {"192.0.2.1", c.ipv4}, {"2001:db8::1", c.ipv6}, {"array", c.name}};
     for (const auto& [portal, isReached] : portals) {
-      const json at = {{"host", portal}};
-      json description = json::parse(HostWith("{}"));
-      description["remoteTargets"] = {{{"name", "t"}, {"portals", json::array({at})}}};
-      description["adapters"][0]["network"] = json::parse(c.network);
-      description["adapters"][0]["sendTargets"] = json::array({at});
-      description["adapters"][0]["staticTargets"] = {{{"name", "t"}, {"host", portal}}};
-      Harness host(description.dump());
-      host(kRediscover);
-      EXPECT_EQ(host(kStatus).result, isReached ? "Discovery Completed" : "Discovery Timeout")
+      const json at = {{{"host", portal}}};
+      const json adapter = {{"network", json::parse(c.network)},
+                            {"sendTargets", at},
+                            {"staticTargets", {{{"name", "t"}, {"host", portal}}}}};
+      const json remote = {{"remoteTargets", {{{"name", "t"}, {"portals", at}}}}};
+      Harness host(HostWith(adapter.dump(), remote.dump()));
+      EXPECT_EQ(Rediscover(host), isReached ? "Discovery Completed" : "Discovery Timeout")
           << c.network << portal;
       EXPECT_EQ(SessionTargets(host).size(), isReached ? 1u : 0u) << c.network << portal;
     }
@@ -422,20 +375,19 @@ TEST(Paths, LeadToTheFamiliesOfTheirAddresses) {
 }
 
 TEST(Paths, EachBoundNicCarriesASession) {
-  const std::string nics = R"("nics": [
-      {"name": "n0", "ipv4Address": "198.51.100.1"}, {"name": "n1", "ipv4Address": "198.51.100.2"},
-      {"name": "down", "ipv4Address": "198.51.100.3", "linkUp": false}])";
   Harness host(HostWith(R"({"kind": "software", "staticTargets": [{"name": "t", "host": "192.0.2.9"}],
                             "networkPortals": [{"nic": "n0"}]})",
                         R"({"remotePortals": [{"host": "192.0.2.9", "redirect": {"host": "192.0.2.1"}}],
-                            "remoteTargets": [{"name": "t", "portals": [{"host": "192.0.2.1"}], "maxSessions": 3}], )" +
-                            nics + "}"));
+                            "remoteTargets": [{"name": "t", "portals": [{"host": "192.0.2.1"}], "maxSessions": 3}],
+                            "nics": [{"name": "n0", "ipv4Address": "198.51.100.1"},
+                                     {"name": "n1", "ipv4Address": "198.51.100.2"},
+                                     {"name": "down", "ipv4Address": "198.51.100.3", "linkUp": false}]})"));
   const auto paths = [&] { return Column(host, "iscsi session connection list", "LocalAddress"); };
   ASSERT_EQ(host("iscsi session add -A a").result, true);
   EXPECT_THAT(paths(), ElementsAre("198.51.100.1"));
-  const json connection = host("iscsi session connection list").result[0];
-  EXPECT_EQ(connection["ConnectionAddress"], "192.0.2.9");
-  EXPECT_EQ(connection["RemoteAddress"], "192.0.2.1");  // where it was sent on to
+  EXPECT_THAT(Column(host, "iscsi session connection list", "ConnectionAddress"), ElementsAre("192.0.2.9"));
+  // Where it was sent on to.
+  EXPECT_THAT(Column(host, "iscsi session connection list", "RemoteAddress"), ElementsAre("192.0.2.1"));
 
   ASSERT_EQ(host("iscsi networkportal add -A a -n n1").result, true);
   ASSERT_EQ(host("iscsi session add -A a").result, true);
@@ -445,8 +397,6 @@ TEST(Paths, EachBoundNicCarriesASession) {
   const std::string isid = host("iscsi session list").result[1]["ISID"];
   ASSERT_EQ(host("iscsi session add -A a -n t -s " + isid).result, true);
   EXPECT_THAT(paths(), ElementsAre("198.51.100.1", "198.51.100.2", "198.51.100.2"));
-  EXPECT_THAT(Column(host, "iscsi session list", "TSIH"), ElementsAre("1", "2", "3"));
-
   EXPECT_THAT(host("iscsi session add -A a -n t").messages, ElementsAre("Failed to add session."));
   EXPECT_THAT(Errors(host),
               ElementsAre("0x0302 Target has insufficient session, connection or other resources."));
@@ -460,14 +410,13 @@ TEST(Paths, EachBoundNicCarriesASession) {
   Alter(host, {{"remoteTargets",
                 json::parse(R"([{"name": "t", "status": 516, "portals": [{"host": "192.0.2.1"}]}])")}});
   host("iscsi session remove -A a");
-  for (const char* first : {"down", "n0"}) {
-    for (const char* nic : {"n0", "n1", "down"})
-      host(std::string("iscsi networkportal remove -A a -n ") + nic);
-    for (const char* nic : {first, "n0", "down"}) host(std::string("iscsi networkportal add -A a -n ") + nic);
+  for (const std::string nic : {"n1", "n0"}) {  // which goes behind the others
+    host("iscsi networkportal remove -A a -n " + nic);
+    ASSERT_EQ(host("iscsi networkportal add -A a -n " + nic).result, true);
     EXPECT_EQ(host("iscsi session add -A a").status, 1);
     EXPECT_THAT(Errors(host),
                 ElementsAre("0x0204 Requested ITN has been removed and no forwarding address is provided."))
-        << first;
+        << nic;
   }
 }
 
