@@ -8,9 +8,7 @@
 
 #ifdef HCLI_PLUGIN_NODE
 extern "C" __attribute__((visibility("default"))) void AutoCli_RegisterNamespaces(
-    boost::shared_ptr<Plinth::AutoCli::Namespace> parent);
-
-void AutoCli_RegisterNamespaces(boost::shared_ptr<Plinth::AutoCli::Namespace> parent) {
+    boost::shared_ptr<Plinth::AutoCli::Namespace> parent) {
   const auto node = Plinth::AutoCli::Namespace::New();
   node->SetDescription(AS_TEXT(HCLI_PLUGIN_FILE));
   parent->RegisterNamespaceNode(node, AS_TEXT(HCLI_PLUGIN_NODE));
