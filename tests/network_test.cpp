@@ -56,7 +56,7 @@ Texts SessionTargets(Harness& host) { return Column(host, "iscsi session list", 
 
 /// The status of a discovery of the adapter.
 std::string Rediscover(Harness& host) {
-  host("iscsi adapter discovery rediscover -A a");
+  EXPECT_EQ(host("iscsi adapter discovery rediscover -A a").result, "Rediscovery started");
   return host("iscsi adapter discovery status get -A a").result;
 }
 

@@ -159,5 +159,24 @@ TEST(PlinthOptions, AreNotSoughtInValues) {
   unsetenv("HCLI_TRACE");
 }
 
+// Everything that a run may say, with the value given in each place where it could leak.
+TEST(PlinthOptions, NeverShowASensitiveValue) {
+  const auto echo = NewEcho();
+  for (const Arguments& given : {Arguments{"--secret=hidden", "--secret", "x"},
+                                 {"--key", "hidden"},
+                                 {"-khidden"},
+                                 {"--secret=hidden", "--way=x"},
+                                 {"--secret=hidden", "--no-such-option"},
+                                 {"-shidden", "--help"}}) {
+    for (const char* output : {"--output=simple", "--output=json"}) {
+      Arguments arguments = given;
+      arguments.push_back(output);
+      TextConsole console;
+      EXPECT_FALSE(RunCommand(*echo, arguments, console).executed);
+      EXPECT_EQ((console.out.text + console.error.text).find("hidden"), std::string::npos);
+    }
+  }
+}
+
 }  // namespace
 }  // namespace Plinth::Test
