@@ -38,7 +38,8 @@ void ExpectRefused(const std::string& before, const std::string& after, const st
     SCOPED_TRACE(keys);
     const Harness host(R"({"adapters": [{"name": "before"}]})");
     const json shown = host.Show();
-    EXPECT_THAT([&] { host::Host::Current().Load(before + keys + after); },
+    const std::string description = before + keys + after;
+    EXPECT_THAT([&] { host::Host::Current().Load(description); },
                 ThrowsMessage<host::Error>(StartsWith(path + fault)));
     EXPECT_EQ(host.Show(), shown);
   }
