@@ -11,7 +11,7 @@ namespace {
 
 template <class Bytes>
 Bytes Parsed(const std::optional<Bytes>& bytes, const std::string& text, const char* what) {
-  if (!bytes) corectl::Refuse(host::Quoted(text) + " is not " + what + ".");
+  if (!bytes) corectl::RefuseValue(host::Quoted(text) + " is not " + what + ".");
   return *bytes;
 }
 
@@ -38,8 +38,8 @@ std::string Ipv6Address::GetStringAddress() const { return host::FormatIpv6(byte
 
 Ipv6Network::Ipv6Network(const std::string& text) {
   if (!IsValidAddressAndNetmask(text)) {
-    corectl::Refuse(host::Quoted(text) +
-                    " is not an IPv6 address, a slash and a prefix length from 0 to 128.");
+    corectl::RefuseValue(host::Quoted(text) +
+                         " is not an IPv6 address, a slash and a prefix length from 0 to 128.");
   }
   address_ = Ipv6Address(text.substr(0, text.find('/')));
   prefixLength_ = PrefixLength(text);
@@ -48,7 +48,8 @@ Ipv6Network::Ipv6Network(const std::string& text) {
 Ipv6Network::Ipv6Network(const Ipv6Address& address, int prefixLength, Ipv6AddressType type)
     : address_(address), prefixLength_(prefixLength), type_(type) {
   if (prefixLength < 0 || prefixLength > 128) {
-    corectl::Refuse(host::Quoted(std::to_string(prefixLength)) + " is not a prefix length from 0 to 128.");
+    corectl::RefuseValue(host::Quoted(std::to_string(prefixLength)) +
+                         " is not a prefix length from 0 to 128.");
   }
 }
 
@@ -64,7 +65,7 @@ HostAddress::HostAddress(const std::string& text) : text_(text) {
     family_ = AddressFamily::Ipv6;
     text_ = host::FormatIpv6(*bytes);
   } else if (!host::IsHostName(text)) {
-    corectl::Refuse(host::Quoted(text) + " is not an IPv4 address, an IPv6 address or a host name.");
+    corectl::RefuseValue(host::Quoted(text) + " is not an IPv4 address, an IPv6 address or a host name.");
   }
 }
 

@@ -11,7 +11,7 @@ void Throw(const host::Error& error, host::Call::Style style) {
   throw NodeCtl::Lib::NodeCtlException(error.what(), {});
 }
 
-void Refuse(const std::string& text) { throw NodeCtl::Lib::NodeCtlException(text, {}); }
+void RefuseValue(const std::string& text) { throw NodeCtl::Lib::NodeCtlException(text, {}); }
 
 void Deny(const std::string& text) { throw host::Error(host::Error::Kind::Refused, text); }
 

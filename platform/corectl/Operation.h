@@ -10,10 +10,10 @@ namespace corectl {
 /// Throws @p error as the exception that the contract promises for an operation of this style.
 [[noreturn]] void Throw(const host::Error& error, host::Call::Style style);
 
-/// Throws a NodeCtlException of @p text.
-[[noreturn]] void Refuse(const std::string& text);
+/// Refuses what a value is made from, outside any operation: a NodeCtlException of @p text.
+[[noreturn]] void RefuseValue(const std::string& text);
 
-/// Refuses an operation from within its body, for the reason @p text.
+/// Refuses an operation from within its body, for the reason @p text: a host::Error.
 [[noreturn]] void Deny(const std::string& text);
 
 /// Gives @p owned to a caller who deletes the elements.
