@@ -333,7 +333,8 @@ TEST(Rediscovery, TheStatusTellsWhatPortalsDid) {
   };
   for (const auto& c : cases) {
     json network = json::parse(kTwoTargets);
-    network["remotePortals"] = {json::parse(R"({"host": "192.0.2.1", )" + std::string(c.portal) + '}')};
+    network["remotePortals"] =
+        json::array({json::parse(R"({"host": "192.0.2.1", )" + std::string(c.portal) + '}')});
     Harness host(HostWith(R"({"sendTargets": [{"host": "192.0.2.1"}], "staticTargets": [
                               {"name": "t0", "host": "192.0.2.2", "port": 860, "sendTarget": {"host": "192.0.2.1"}}]})",
                           network.dump()));
