@@ -105,6 +105,16 @@ TEST(IbftBoot, ImportTakesChapFromTheTableAndTheAdapterByItsMac) {
   }
 }
 
+TEST(IbftBoot, ImportMovesTheMark) {
+  json description = json::parse(kHost);
+  description["adapters"][0]["staticTargets"] =
+      json::parse(R"([{"name": "iqn.2026-11.org.example:old", "host": "192.0.2.81", "boot": true}])");
+  Harness host(description.dump());
+  EXPECT_EQ(host("iscsi ibftboot import").result, true);
+  EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/boot"), false);
+  EXPECT_EQ(host.Show("/adapters/0/staticTargets/1/boot"), true);
+}
+
 TEST(IbftBoot, FailuresHaveOneTextAndNoSecret) {
   Harness failing(WithAnswers(kHost, R"({"operation": "GetiScsiBootTables", "throw": "NodeCtlException"})"));
   EXPECT_THAT(failing("iscsi ibftboot get").messages, ElementsAre("Unable to get boot tables."));

@@ -135,11 +135,16 @@ bool IsEligible(host::Tree& tree, const host::Object& adapter, const Boot& boot)
          (mac.empty() || HasMac(tree, adapter, mac));
 }
 
-/// The static target of the adapter, marked as the one that the host boots from, with the CHAP of the table
-/// in place of any other.
+/// The static target of the adapter, marked as the only one that the host boots from, with the CHAP of the
+/// table in place of any other.
 std::int64_t AddBootTarget(host::Tree& tree, const host::Object& adapter, const Boot& boot) {
   auto place = LookupPlace(tree, adapter, boot.target);
   if (!place) place = tree.InsertNew(adapter.id, Kind::StaticTarget, PlaceRecord(boot.target));
+  for (host::Object& other : tree.Children(adapter.id, Kind::StaticTarget)) {
+    if (other.id == place->id || !other.record.GetBool("boot")) continue;
+    other.record.Set("boot", false);
+    tree.Update(other);
+  }
   const int chap = boot.table.GetChapType();
   const std::pair<std::string, std::string> entries[] = {
       {boot.table.GetChapName(), boot.table.GetChapPwd()},
