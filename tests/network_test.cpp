@@ -319,6 +319,55 @@ TEST(Rediscovery, HostNamesAreTheSameInEachSpelling) {
   EXPECT_EQ(host(list + "remove -A a -a PORTAL").result, true);
 }
 
+TEST(Rediscovery, ChangesNothingThatHoldsForAStaticTarget) {
+  Harness host(HostWith(R"({"parameters": {"MaxCmds": {"current": 32}},
+      "sendTargets": [{"host": "192.0.2.1", "parameters": {"MaxCmds": 64}}],
+      "staticTargets": [{"name": "t0", "host": "192.0.2.1"}]})",
+                        kTwoTargets));
+  Rediscover(host);
+  EXPECT_THAT(Methods(host), ElementsAre("STATIC SENDTARGETS ", "SENDTARGETS "));
+  for (const auto& [target, current] : {std::pair{"t0", "32"}, {"t1", "64"}}) {
+    const std::string get =
+        std::string("iscsi adapter target portal param get -A a -a 192.0.2.1 -n ") + target;
+    json shown;
+    for (const json& row : host(get).result) {
+      if (row["Name"] == "MaxCmds") shown = row["Current"];
+    }
+    EXPECT_EQ(shown, current) << target;
+  }
+}
+
+TEST(Rediscovery, ASessionThatNoPortalLeadsToIsNoFailedLogin) {
+  Harness host(HostWith(R"({"kind": "dependent", "networkPortals": [{"nic": "n1"}],
+                            "staticTargets": [{"name": "t0", "host": "192.0.2.1"}]})",
+                        R"({"nics": [{"name": "n1"}, {"name": "n2"}],
+                            "remoteTargets": [{"name": "t0", "portals": [{"host": "192.0.2.1"}]}]})"));
+  EXPECT_EQ(host("iscsi session add -A a").result, true);
+  EXPECT_EQ(host("iscsi adapter discovery statictarget remove -A a -n t0 -a 192.0.2.1").result, true);
+  EXPECT_EQ(host("iscsi networkportal add -A a -n n2").result, true);
+  EXPECT_EQ(Rediscover(host), "Discovery Completed");
+  EXPECT_THAT(SessionTargets(host), ElementsAre("t0"));
+}
+
+TEST(Rediscovery, PassesOverPortalsThatTheAdapterCannotBeGiven) {
+  constexpr char kForms[] = R"({"remoteTargets": [
+      {"name": "t0", "portals": [{"host": "192.0.2.1"}, {"host": "2001:db8::1"}, {"host": "portal.example"}]}]})";
+  const std::tuple<const char*, Texts> cases[] = {
+      {"{}", {"192.0.2.1"}},
+      {R"({"IPv6 Supported": true})", {"192.0.2.1", "2001:db8::1"}},
+      {R"({"DNS Based Address Supported": true})", {"192.0.2.1", "portal.example"}},
+  };
+  for (const auto& [capabilities, shown] : cases) {
+    Harness host(HostWith(
+        R"({"sendTargets": [{"host": "192.0.2.1"}], "capabilities": )" + std::string(capabilities) + '}',
+        kForms));
+    Rediscover(host);
+    Texts hosts;
+    for (const json& place : host.Show("/adapters/0/staticTargets")) hosts.push_back(place["host"]);
+    EXPECT_EQ(hosts, shown) << capabilities;
+  }
+}
+
 TEST(Rediscovery, TheStatusTellsWhatPortalsDid) {
   const struct {
     const char* portal;  // what 192.0.2.1 does

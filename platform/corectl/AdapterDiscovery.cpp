@@ -7,22 +7,18 @@ namespace corectl {
 
 namespace {
 
-void Require(const host::Object& adapter, const char* capability, const std::string& what) {
-  if (adapter.record.GetBool(std::string("capabilities/") + capability)) return;
+void Require(const host::Object& adapter, std::string_view capability, const std::string& what) {
+  if (adapter.record.GetBool("capabilities/" + std::string(capability))) return;
   Deny("The adapter " + adapter.name + " takes no " + what + ": it lacks " + host::Quoted(capability) + ".");
 }
 
 /// Refuses an address of a form that the adapter does not take.
 void RequireAddressForm(const host::Object& adapter, const TargetAddress& address) {
-  if (address.host.GetStringAddress().empty()) Deny("The address has no host.");
-  switch (address.host.GetFamily()) {
-    case Network::AddressFamily::Ipv4:
-      break;
-    case Network::AddressFamily::Ipv6:
-      return Require(adapter, "IPv6 Supported", "IPv6 addresses");
-    case Network::AddressFamily::Name:
-      return Require(adapter, "DNS Based Address Supported", "host names");
-  }
+  const std::string host = address.host.GetStringAddress();
+  if (host.empty()) Deny("The address has no host.");
+  const bool isIpv6 = address.host.GetFamily() == Network::AddressFamily::Ipv6;
+  const std::string_view lacked = host::LackedFor(adapter.record, host);
+  if (!lacked.empty()) Require(adapter, lacked, isIpv6 ? "IPv6 addresses" : "host names");
 }
 
 TargetAddress AddressIn(const host::Record& record) {

@@ -6,6 +6,7 @@
 #include "host/Description.h"
 #include "host/Formats.h"
 #include "host/LevelSchema.h"
+#include "host/Targets.h"
 
 namespace corectl {
 
@@ -146,9 +147,8 @@ Level::Level(host::Tree& tree, const host::Object& adapter, const TargetAddress&
 Level::Level(host::Tree& tree, const host::Object& adapter, const StaticTarget& target)
     : tree_(tree), inEffect_(FindPlace(tree, adapter, target)) {
   Extend(inEffect_);
-  if (Own().Has("sendTarget")) {
-    const std::string origin = host::NameOf(host::Kind::SendTarget, Own().GetRecord("sendTarget"));
-    if (const auto parent = tree.Find(adapter.id, host::Kind::SendTarget, origin)) Extend(*parent);
+  if (const std::string name = host::ParentOf(Own()); !name.empty()) {
+    if (const auto parent = tree.Find(adapter.id, host::Kind::SendTarget, name)) Extend(*parent);
   }
   Extend(adapter);
 }

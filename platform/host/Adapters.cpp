@@ -1,5 +1,7 @@
 #include "host/Adapters.h"
 
+#include "host/Formats.h"
+
 namespace host {
 
 bool DoesSoftwareWork(const Record& root) {
@@ -18,6 +20,12 @@ std::vector<Object> IscsiAdapters(Tree& tree) {
   std::erase_if(adapters,
                 [&](const Object& adapter) { return !IsIscsi(adapter) || !IsPresent(tree, adapter); });
   return adapters;
+}
+
+std::string_view LackedFor(const Record& adapter, const std::string& host) {
+  if (ParseIpv4(host)) return {};
+  const std::string_view capability = ParseIpv6(host) ? "IPv6 Supported" : "DNS Based Address Supported";
+  return adapter.GetBool("capabilities/" + std::string(capability)) ? std::string_view() : capability;
 }
 
 }  // namespace host

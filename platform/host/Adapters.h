@@ -19,6 +19,10 @@ bool IsPresent(Tree& tree, const Object& adapter);
 /// The iSCSI adapters that are on the host, in its order.
 std::vector<Object> IscsiAdapters(Tree& tree);
 
+/// The capability that the adapter lacks to be given a portal at @p host, which is an address or a name;
+/// empty where it takes it.
+std::string_view LackedFor(const Record& adapter, const std::string& host);
+
 }  // namespace host
 
 #pragma GCC visibility pop

@@ -5,6 +5,7 @@
 #include <nlohmann/json.hpp>
 #include <set>
 
+#include "host/Adapters.h"
 #include "host/Initiator.h"
 #include "host/Sessions.h"
 
@@ -25,11 +26,6 @@ bool SetDiscovered(Record& target, bool discovered) {
   }
   if (discovered) target.Append("discoveryMethods", Record(Json("sendtargets")));
   return discovered;
-}
-
-/// The name of the sendtarget through which @p place was found; empty for a static target.
-std::string OriginOf(const Record& place) {
-  return place.Has("sendTarget") ? NameOf(Kind::SendTarget, place.GetRecord("sendTarget")) : std::string();
 }
 
 class Discovery {
@@ -72,7 +68,13 @@ class Discovery {
     }
   }
 
-  void Note(const FoundTarget& target, const Object& sendTarget) {
+  /// Portals that the adapter cannot be given are passed over, and what is behind no other.
+  void Note(FoundTarget target, const Object& sendTarget) {
+    const bool known = target.portals.empty();
+    std::erase_if(target.portals, [&](const FoundPortal& portal) {
+      return !LackedFor(adapter_.record, portal.portal.host).empty();
+    });
+    if (target.portals.empty() && !known) return;
     const auto [found, isNew] = found_.emplace(target.name, target);
     if (isNew) inOrder_.push_back(&found->second);
     for (const FoundPortal& portal : target.portals) {

@@ -27,8 +27,9 @@ std::string Now() {
   return text;
 }
 
-/// RFC 7143 section 11.12.5: type 10b in the upper two bits, then 24 bits that were drawn at random, once for
-/// each adapter, and the qualifier that tells the adapter's sessions with a target apart.
+/// RFC 7143 section 11.12.5: type 10b in the upper two bits, then 24 bits that stay with the adapter, as if
+/// they had been drawn at random for it once, and the qualifier that tells the adapter's sessions with a
+/// target apart.
 std::string Isid(const Object& adapter, std::uint16_t qualifier) {
   std::uint32_t drawn = 2166136261u;
   for (const char byte : adapter.name + adapter.record.GetString("uid")) {
@@ -216,10 +217,8 @@ std::vector<Initiator::Place> Initiator::PlacesOf(const KnownTarget& target) con
   std::vector<Place> places;
   for (const Record& record : target.portals) {
     Place place{{record.GetString("host"), record.GetInt64("port")}, {&record}};
-    if (record.Has("sendTarget")) {
-      const auto origin = sendTargets_.find(NameOf(Kind::SendTarget, record.GetRecord("sendTarget")));
-      if (origin != sendTargets_.end()) place.levels.push_back(&origin->second.record);
-    }
+    const auto parent = sendTargets_.find(ParentOf(record));
+    if (parent != sendTargets_.end()) place.levels.push_back(&parent->second.record);
     place.levels.push_back(&adapter_.record);
     places.push_back(std::move(place));
   }
@@ -244,6 +243,7 @@ std::vector<const WayOut*> Initiator::WaysWithout(const std::vector<Object>& ses
 bool Initiator::LoginWhereMissing(KnownTarget& target) {
   std::vector<Object> sessions;
   if (target.object.id != 0) sessions = tree_.Children(target.object.id, Kind::Session);
+  if (!sessions.empty() && PlacesOf(target).empty()) return true;  // nothing is left to log in at
   const std::vector<const WayOut*> ways = WaysWithout(sessions);
   return (ways.empty() && !sessions.empty()) || LoginByEach(target, ways);
 }

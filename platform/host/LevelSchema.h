@@ -144,7 +144,9 @@ inline constexpr Key kStaticTargetKeys[] = {
     kPortKey,
     Integer("portalGroup", "The target portal group tag, where it is known.", 0, 65535).Optional(),
     Boolean("boot", "The host boots from it."),
-    Nested("sendTarget", "The sendtarget through which it was found; it inherits from that one.", kPortalKeys)
+    Nested("sendTarget",
+           "The sendtarget through which it was found; it inherits from that one unless it is static too.",
+           kPortalKeys)
         .Optional(),
     Boolean("static", "It is a static target besides; without a sendTarget it always is one.").Optional(),
     kOverridesKey,

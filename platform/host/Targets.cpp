@@ -84,6 +84,12 @@ bool IsStatic(const Record& portal) {
   return !portal.Has("sendTarget") || (portal.Has("static") && portal.GetBool("static"));
 }
 
+std::string OriginOf(const Record& portal) {
+  return portal.Has("sendTarget") ? NameOf(Kind::SendTarget, portal.GetRecord("sendTarget")) : std::string();
+}
+
+std::string ParentOf(const Record& portal) { return IsStatic(portal) ? std::string() : OriginOf(portal); }
+
 bool HasSession(Tree& tree, const Object& target) { return !tree.ChildIds(target.id, Kind::Session).empty(); }
 
 void ForgetTarget(Tree& tree, const Object& target) {

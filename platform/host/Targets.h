@@ -27,6 +27,11 @@ std::vector<Record> AddressesOf(const KnownTarget& target);
 
 /// Whether the target portal of that record is a static target; one that was found may be one besides.
 bool IsStatic(const Record& portal);
+/// The name of the sendtarget through which the target portal was found; empty where it was not.
+std::string OriginOf(const Record& portal);
+/// The name of the sendtarget that the target portal inherits from. Empty for the adapter, as for each static
+/// target: being found besides changes nothing of what holds for it.
+std::string ParentOf(const Record& portal);
 
 bool HasSession(Tree& tree, const Object& target);
 /// Takes out @p target where no portal leads to it, it has neither a session nor an address of its own, and
