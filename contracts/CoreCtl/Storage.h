@@ -54,9 +54,9 @@ class StorageInfoImpl {
   /// True when the software initiator is switched on; false from DisableSoftwareiScsi on, although it works
   /// until the reboot.
   bool HasSoftwareiScsiEnabled();
-  /// Switches the software initiator on, at once; no change where it is on. Its adapter takes the initiator
-  /// name that the daemon's file has under InitiatorName, if it is valid. @p probe is for the library's own
-  /// use at boot: front ends pass false.
+  /// Switches the software initiator on, at once. Its adapter takes the initiator name that the daemon's file
+  /// has under InitiatorName, if it is valid: at once too, or at the next reboot where it was on. @p probe is
+  /// for the library's own use at boot: front ends pass false.
   void EnableSoftwareiScsi(bool probe);
   /// Switches the software initiator off, effective at the next reboot; no change where it is off.
   void DisableSoftwareiScsi();

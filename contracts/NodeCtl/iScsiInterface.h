@@ -162,11 +162,12 @@ class iScsiInterface : public virtual ScsiInterface {
   // Targets by address. Refused in a new one: no host, an IPv6 address where ipv6Supported is false, and a
   // host name where dnsBasedAddressSupported is false.
 
-  /// Makes @p target known to the adapter; nothing is logged in to. One that is known already, as a static
-  /// target or found by discovery, is refused, as is a name that is no iSCSI name (RFC 7143 section 4.2.7),
-  /// and any where staticDiscoverySettable is false.
+  /// Makes @p target known to the adapter; nothing is logged in to. One that was found by discovery is a
+  /// static target besides from then on. One that is a static target already is refused, as is a name that is
+  /// no iSCSI name (RFC 7143 section 4.2.7), and any where staticDiscoverySettable is false.
   virtual void AddStaticTarget(StaticTarget target) = 0;
-  /// Removes @p target; its sessions stay. One that is not known, or was found by discovery, is refused.
+  /// Removes @p target; its sessions stay. One that was found by discovery besides stays as that alone. One
+  /// that is no static target is refused.
   virtual void RemoveStaticTarget(StaticTarget target) = 0;
   /// All target portals, static ones and those found by discovery, in the adapter's order: each is a key for
   /// the operations of target level. The caller deletes the elements; none is null.
