@@ -45,8 +45,8 @@ class Host {
   auto Change(const Call& call, Body&& body) {
     return Run(call, Transaction::Access::Change, body);
   }
-  /// The same for work that happens outside the database: @p body takes no argument and no transaction is
-  /// open.
+  /// The same for work that happens outside the database: @p body takes no argument and runs in no
+  /// transaction of its own.
   template <class Body>
   auto Outside(const Call& call, Body&& body) {
     return Traced(call, [&] {
