@@ -82,7 +82,7 @@ Record SessionOf(const Agreement& agreement) {
   Record session;
   for (const NegotiationRule& rule : kNegotiationRules) {
     const std::uint32_t value = agreement.values.*rule.value;
-    if (rule.isTruth) {
+    if (rule.IsTruth()) {
       session.Set(rule.key, value != 0);
     } else {
       session.Set(rule.key, std::int64_t{value});

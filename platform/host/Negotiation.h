@@ -17,29 +17,34 @@ struct NegotiationRule {
   std::string_view parameter;  // of the initiator's levels; empty where it always offers the default
   std::uint32_t OperationalParameters::*value;
   Result result;
-  bool isTruth = false;
+  // The range of numbers; a truth value has none.
+  std::int64_t least = 0;
+  std::int64_t most = 0;
+  constexpr bool IsTruth() const { return most == 0; }
 };
 
+inline constexpr std::int64_t kLeastLength = 512;  // bytes, of bursts and data segments
+inline constexpr std::int64_t kMostLength = 16777215;
+
 inline constexpr NegotiationRule kNegotiationRules[] = {
-    {"maxConnections", "", &OperationalParameters::maxConnections, NegotiationRule::Result::Least},
-    {"initialR2T", "InitialR2T", &OperationalParameters::initialR2T, NegotiationRule::Result::Greatest, true},
-    {"immediateData", "ImmediateData", &OperationalParameters::immediateData, NegotiationRule::Result::Least,
-     true},
+    {"maxConnections", "", &OperationalParameters::maxConnections, NegotiationRule::Result::Least, 1, 65535},
+    {"initialR2T", "InitialR2T", &OperationalParameters::initialR2T, NegotiationRule::Result::Greatest},
+    {"immediateData", "ImmediateData", &OperationalParameters::immediateData, NegotiationRule::Result::Least},
     {"maxBurstLength", "MaxBurstLength", &OperationalParameters::maxBurstLength,
-     NegotiationRule::Result::Least},
+     NegotiationRule::Result::Least, kLeastLength, kMostLength},
     {"firstBurstLength", "FirstBurstLength", &OperationalParameters::firstBurstLength,
-     NegotiationRule::Result::Least},
+     NegotiationRule::Result::Least, kLeastLength, kMostLength},
     {"defaultTime2Wait", "DefaultTime2Wait", &OperationalParameters::defaultTime2Wait,
-     NegotiationRule::Result::Greatest},
+     NegotiationRule::Result::Greatest, 0, 3600},
     {"defaultTime2Retain", "DefaultTime2Retain", &OperationalParameters::defaultTime2Retain,
-     NegotiationRule::Result::Least},
+     NegotiationRule::Result::Least, 0, 3600},
     {"maxOutstandingR2T", "MaxOutstandingR2T", &OperationalParameters::maxOutstandingR2T,
-     NegotiationRule::Result::Least},
-    {"dataPduInOrder", "", &OperationalParameters::dataPduInOrder, NegotiationRule::Result::Greatest, true},
+     NegotiationRule::Result::Least, 1, 65535},
+    {"dataPduInOrder", "", &OperationalParameters::dataPduInOrder, NegotiationRule::Result::Greatest},
     {"dataSequenceInOrder", "", &OperationalParameters::dataSequenceInOrder,
-     NegotiationRule::Result::Greatest, true},
+     NegotiationRule::Result::Greatest},
     {"errorRecoveryLevel", "ErrorRecoveryLevel", &OperationalParameters::errorRecoveryLevel,
-     NegotiationRule::Result::Least},
+     NegotiationRule::Result::Least, 0, 2},
 };
 
 /// Whether a thing is done that the initiator offers and the target chooses: the first of the initiator's

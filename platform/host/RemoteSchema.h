@@ -50,11 +50,12 @@ inline constexpr auto kRemoteParameterKeys = [] {
   constexpr OperationalParameters defaults;
   for (std::size_t i = 0; i < count; ++i) {
     const NegotiationRule& rule = kNegotiationRules[i];
-    const Key key = rule.isTruth ? Boolean(rule.key, help) : Unsigned32(rule.key, help);
+    const Key key = rule.IsTruth() ? Boolean(rule.key, help) : Integer(rule.key, help, rule.least, rule.most);
     keys[i] = key.Default(std::int64_t{defaults.*rule.value});
   }
-  keys[count] = Unsigned32("maxRecvDataSegmentLength", "What the target takes, in bytes.")
-                    .Default(std::int64_t{defaults.maxRecvDataSegmentLength});
+  keys[count] =
+      Integer("maxRecvDataSegmentLength", "What the target takes, in bytes.", kLeastLength, kMostLength)
+          .Default(std::int64_t{defaults.maxRecvDataSegmentLength});
   keys[count + 1] = Word("headerDigest",
                          "prohibited: it knows none; required: it takes nothing else; with the others as "
                          "the initiator wishes.",

@@ -21,7 +21,7 @@ OperationalParameters OfferOf(const Record& target) {
   OperationalParameters offer;
   const Record parameters = target.GetRecord("parameters");
   for (const NegotiationRule& rule : kNegotiationRules) {
-    offer.*rule.value = rule.isTruth ? std::uint32_t{parameters.GetBool(rule.key)}
+    offer.*rule.value = rule.IsTruth() ? std::uint32_t{parameters.GetBool(rule.key)}
                                      : static_cast<std::uint32_t>(parameters.GetInt64(rule.key));
   }
   offer.maxRecvDataSegmentLength =
