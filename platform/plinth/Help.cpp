@@ -136,14 +136,24 @@ std::string ResultText(AutoCli::Command& command) {
 std::string CommandHelp(AutoCli::Command& command, const std::string& path) {
   const std::vector<Parameter> parameters = ParametersOf(*command.GetInputSpec());
   std::string usage = "Usage: " + Program(path);
+  std::size_t column = DisplayWidth(usage);
+  const auto add = [&](const std::string& part) {
+    if (column + part.size() > kWidth) {
+      usage += "\n      ";  // the part begins with a blank
+      column = 6;
+    }
+    usage += part;
+    column += part.size();
+  };
   bool optional = false;
   for (const Parameter& parameter : parameters) {
     optional = optional || !parameter.required;
     if (!parameter.required) continue;
     const bool operand = MayBeOperand(parameter);
-    usage += (operand ? " [--" : " --") + parameter.name + (operand ? "]" : "") + Placeholder(parameter);
+    add((operand ? " [--" : " --") + parameter.name + (operand ? "]" : "") + Placeholder(parameter));
   }
-  std::string text = usage + (optional ? " [OPTIONS]\n\n" : "\n\n") + Description(NodeData::Of(command));
+  if (optional) add(" [OPTIONS]");
+  std::string text = usage + "\n\n" + Description(NodeData::Of(command));
   if (!parameters.empty()) text += "Options:\n" + OptionsText(parameters) + '\n';
   text += "hcli --help lists the global options.\n";
   return text + ResultText(command);
