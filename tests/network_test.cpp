@@ -229,6 +229,13 @@ constexpr char kTwoTargets[] = R"({"remoteTargets": [
     {"name": "t0", "alias": "zero", "portals": [{"host": "192.0.2.1", "tag": 2}, {"host": "192.0.2.2", "port": 860}]},
     {"name": "t1", "portals": [{"host": "192.0.2.1"}]}]})";
 
+TEST(Network, ALoginTellsAliasAndPortalGroup) {
+  Harness host(TargetWith(R"({"alias": "disk"})"));
+  EXPECT_EQ(host("iscsi session add -A a").result, true);
+  EXPECT_THAT(Column(host, "iscsi adapter target list", "Alias"), ElementsAre("disk"));
+  EXPECT_THAT(Column(host, "iscsi adapter discovery statictarget list", "TPGT"), ElementsAre("7"));
+}
+
 TEST(Rediscovery, TargetsComeAndGoAndSettingsStay) {
   Harness host(HostWith(kSendTarget, kTwoTargets));
   EXPECT_THAT(Targets(host), IsEmpty());

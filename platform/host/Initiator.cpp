@@ -291,6 +291,17 @@ std::uint32_t Initiator::LoginBy(KnownTarget& target, const WayOut& way) {
   return status;
 }
 
+void Initiator::NoteTag(const KnownTarget& target, const Portal& portal, int tag) {
+  Record key;
+  key.Set("name", target.object.record.GetString("name"));
+  key.Set("host", portal.host);
+  key.Set("port", portal.port);
+  auto place = tree_.Find(adapter_.id, Kind::StaticTarget, NameOf(Kind::StaticTarget, key));
+  if (!place || (place->record.Has("portalGroup") && place->record.GetInt("portalGroup") == tag)) return;
+  place->record.Set("portalGroup", tag);
+  tree_.Update(*place);
+}
+
 std::uint32_t Initiator::LoginAt(KnownTarget& target, const WayOut& way, const Place& place) {
   LoginRequest request;
   static_cast<Request&>(request) = RequestFor(place.levels);
@@ -305,6 +316,8 @@ std::uint32_t Initiator::LoginAt(KnownTarget& target, const WayOut& way, const P
     network_->Logout({request.initiator, request.target, request.isid, answer.tsih});
     return kNoCommonDigest;
   }
+  if (!answer.alias.empty()) target.object.record.Set("alias", answer.alias);
+  if (request.portal == place.portal) NoteTag(target, place.portal, answer.portalGroupTag);
   Record session = SessionOf(*agreement);
   if (!way.name.empty()) session.Set("portal", way.name);
   session.Set("isid", request.isid);

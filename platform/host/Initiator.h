@@ -50,6 +50,8 @@ class Initiator {
 
   bool LoginByEach(KnownTarget& target, const std::vector<const WayOut*>& ways);
   std::uint32_t LoginBy(KnownTarget& target, const WayOut& way);
+  /// Keeps at the place, if the adapter has it, what a login has told of its portal group.
+  void NoteTag(const KnownTarget& target, const Portal& portal, int tag);
   std::uint32_t LoginAt(KnownTarget& target, const WayOut& way, const Place& place);
 
   Tree& tree_;

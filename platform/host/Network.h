@@ -120,6 +120,7 @@ struct SendTargetsAnswer : Answer {
 
 struct LoginAnswer : Answer {
   bool chap = false;  // the initiator was asked who it is
+  std::string alias;  // of the target; empty where it tells none
   int portalGroupTag = 1;
   int tsih = 0;  // other than 0 after a login
   OperationalParameters offer;

@@ -153,6 +153,7 @@ class SimulatedNetwork final : public Network {
     // Fewer than 65535 sessions leave a number free.
     answer.tsih = 1;
     while (tsihs.contains(answer.tsih)) ++answer.tsih;
+    answer.alias = target.GetString("alias");
     answer.offer = OfferOf(target);
     return kDone;
   }
