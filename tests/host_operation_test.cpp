@@ -15,7 +15,6 @@
 #include "ima/Operation.h"
 #include "support/Harness.h"
 
-using CoreCtl::Lib::CoreCtlException;
 using CoreCtl::Storage::iScsiInterfaceImpl;
 using CoreCtl::Storage::StorageInfoImpl;
 using NodeCtl::Lib::NodeCtlException;

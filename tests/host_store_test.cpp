@@ -28,9 +28,11 @@ void SetAlias(const std::string& alias) {
 
 /// A root of its own, with a host that this process makes.
 class HostStore : public testing::Test {
+ public:
+  ~HostStore() override { Host::Use(nullptr); }
+
  protected:
   HostStore() { Host::Use(nullptr); }
-  ~HostStore() override { Host::Use(nullptr); }
 
   std::string File() const { return root_.Path() + "/var/lib/tessaro/host.db"; }
 
