@@ -22,7 +22,7 @@ OperationalParameters OfferOf(const Record& target) {
   const Record parameters = target.GetRecord("parameters");
   for (const NegotiationRule& rule : kNegotiationRules) {
     offer.*rule.value = rule.IsTruth() ? std::uint32_t{parameters.GetBool(rule.key)}
-                                     : static_cast<std::uint32_t>(parameters.GetInt64(rule.key));
+                                       : static_cast<std::uint32_t>(parameters.GetInt64(rule.key));
   }
   offer.maxRecvDataSegmentLength =
       static_cast<std::uint32_t>(parameters.GetInt64("maxRecvDataSegmentLength"));
