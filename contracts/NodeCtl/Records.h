@@ -39,8 +39,8 @@ enum class iScsiPortErrorCodes : std::int32_t { Compliant = 0 };
 enum iScsiChapDirection : int { ChapUni = 0, ChapMutual = 1 };
 
 /// A numeric session parameter, with all members in its unit. The range is that of this adapter, within that
-/// of the standard. Front ends read and write the low 32 bits as a signed number, so no value is above
-/// 2147483647.
+/// of the standard. Front ends read and write the low 32 bits as a signed number: they show a value above
+/// 2147483647 as another one.
 template <class Integer>
 struct iScsiIntegerParm {
   Integer current = 0;       ///< the value at this level, the parent's where it is inherited
