@@ -70,11 +70,11 @@ class Discovery {
 
   /// Portals that the adapter cannot be given are passed over, and what is behind no other.
   void Note(FoundTarget target, const Object& sendTarget) {
-    const bool known = target.portals.empty();
+    const bool hasNone = target.portals.empty();
     std::erase_if(target.portals, [&](const FoundPortal& portal) {
       return !LackedFor(adapter_.record, portal.portal.host).empty();
     });
-    if (target.portals.empty() && !known) return;
+    if (target.portals.empty() && !hasNone) return;
     const auto [found, isNew] = found_.emplace(target.name, target);
     if (isNew) inOrder_.push_back(&found->second);
     for (const FoundPortal& portal : target.portals) {
