@@ -1,17 +1,18 @@
-# hcli_library(NAME SHARED|MODULE|OBJECT [SOURCES FILE...] [LINK TARGET...] [INCLUDE FOLDER...])
+# hcli_library(NAME SHARED|MODULE|OBJECT [SOURCES FILE...] [LINK TARGET...] [SEES FOLDER...] [INCLUDE FOLDER...])
 #
-# Without SOURCES the target is made of every .cpp file in the folder and below it. A MODULE is a plug-in. INCLUDE
-# folders are the target's own: what links a library of the platform sees the contracts only, unless it says more.
+# Without SOURCES the target is made of every .cpp file in the folder and below it. A MODULE is a plug-in. What the
+# target SEES and INCLUDEs is its own: who links it does not get at its headers by that.
 function(hcli_library name kind)
-  cmake_parse_arguments(PARSE_ARGV 2 arg "" "" "SOURCES;LINK;INCLUDE")
+  cmake_parse_arguments(PARSE_ARGV 2 arg "" "" "SOURCES;LINK;SEES;INCLUDE")
   hcli_sources(sources "${arg_SOURCES}")
   add_library(${name} ${kind} ${sources})
   target_include_directories(${name} PRIVATE ${arg_INCLUDE})
+  hcli_see(${name} ${arg_SEES})
   # PUBLIC for objects: what they need is needed by the binary that takes them in.
   if(kind STREQUAL "OBJECT")
-    target_link_libraries(${name} PUBLIC contracts ${arg_LINK})
+    target_link_libraries(${name} PUBLIC Boost::headers ${arg_LINK})
   else()
-    target_link_libraries(${name} PUBLIC contracts PRIVATE ${arg_LINK})
+    target_link_libraries(${name} PRIVATE Boost::headers ${arg_LINK})
   endif()
   set_target_properties(${name} PROPERTIES DEFINE_SYMBOL "")
   target_precompile_headers(${name} REUSE_FROM hcli-precompiled)
@@ -24,17 +25,31 @@ function(hcli_library name kind)
   endif()
 endfunction()
 
-# hcli_program(NAME [SOURCES FILE...] [LINK TARGET...] [INCLUDE FOLDER...]): an executable in bin/. The caller installs it, or does not.
+# hcli_program(NAME [SOURCES FILE...] [LINK TARGET...] [SEES FOLDER...] [INCLUDE FOLDER...]): an executable in bin/. The
+# caller installs it, or does not.
 function(hcli_program name)
-  cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINK;INCLUDE")
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINK;SEES;INCLUDE")
   hcli_sources(sources "${arg_SOURCES}")
   add_executable(${name} ${sources})
   target_include_directories(${name} PRIVATE ${arg_INCLUDE})
+  hcli_see(${name} ${arg_SEES})
   target_link_libraries(${name} PRIVATE ${arg_LINK})
   # The one search path, which holds for what the libraries and plug-ins need as well: with one of its own for each of
   # them, the dynamic linker would look into some eighty folders that do not exist.
   set_target_properties(${name} PROPERTIES INSTALL_RPATH "$ORIGIN/../lib")
   target_link_options(${name} PRIVATE LINKER:--disable-new-dtags)
+endfunction()
+
+# hcli_see(TARGET FOLDER...): each FOLDER, named from the top of the tree, is there for the target to include from, as
+# "host/Host.h" from platform/host; its neighbours are not, so that an include against the layers does not compile.
+function(hcli_see target)
+  foreach(folder IN LISTS ARGN)
+    get_filename_component(name "${folder}" NAME)
+    set(view "${PROJECT_BINARY_DIR}/include/${folder}")
+    file(MAKE_DIRECTORY "${view}")
+    file(CREATE_LINK "${PROJECT_SOURCE_DIR}/${folder}" "${view}/${name}" SYMBOLIC)
+    target_include_directories(${target} PRIVATE "${view}")
+  endforeach()
 endfunction()
 
 # The given files, or else every .cpp file of the current folder and below.
@@ -49,7 +64,7 @@ endfunction()
 function(hcli_precompile)
   file(CONFIGURE OUTPUT "${PROJECT_BINARY_DIR}/precompiled.cpp" CONTENT "")
   add_library(hcli-precompiled OBJECT "${PROJECT_BINARY_DIR}/precompiled.cpp")
-  target_link_libraries(hcli-precompiled PRIVATE contracts)
+  target_link_libraries(hcli-precompiled PRIVATE Boost::headers)
   target_precompile_headers(hcli-precompiled PRIVATE
     <boost/enable_shared_from_this.hpp> <boost/shared_ptr.hpp> <algorithm> <cstdint> <functional> <map> <memory>
     <optional> <set> <stdexcept> <string> <string_view> <utility> <vector>)

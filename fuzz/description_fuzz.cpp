@@ -106,7 +106,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   try {
     host->Load(std::string(reinterpret_cast<const char*>(data), size));
   } catch (const host::Error& error) {
-    fuzz::Require(error.GetKind() == host::Error::Kind::Refused && *error.what() != 0,
+    fuzz::Require(error.GetKind() == host::Error::Kind::Invalid && *error.what() != 0,
                   std::string("not refused: ") + error.what());
     return 0;
   }

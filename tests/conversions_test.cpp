@@ -84,7 +84,7 @@ TEST(Conversions, ImaAddressesGoBothWays) {
       {"::ffff:192.0.2.1", "::ffff:192.0.2.1"},
   };
   for (const auto& [text, shown] : cases) {
-    const IMA_IP_ADDRESS* address = IscsiTools::GetImaIpAddressFromString(text);
+    IMA_IP_ADDRESS* address = IscsiTools::GetImaIpAddressFromString(text);
     ASSERT_NE(address, nullptr) << text;
     EXPECT_EQ(address->ipv4Address, std::strchr(text, ':') == nullptr ? IMA_TRUE : IMA_FALSE) << text;
     EXPECT_STREQ(IscsiTools::GetStringFromImaIpAddress(address), shown);

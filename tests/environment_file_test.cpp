@@ -1,11 +1,16 @@
 #include <CoreCtl/Util.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <unistd.h>
 
+#include <cerrno>
 #include <cstdio>
 #include <filesystem>
 #include <fstream>
 
+#include "host/Error.h"
+#include "host/Files.h"
+#include "support/FailingCall.h"
 #include "support/Harness.h"
 
 using CoreCtl::Util::EnvironmentVarFile;
@@ -95,6 +100,46 @@ TEST_F(EnvironmentFile, RefusesWhatItCannotKeep) {
   // It still holds what was read before.
   file.Save();
   EXPECT_EQ(Contents(), "A=1\n");
+}
+
+// A failure that is seen through to the disk; the file is the old one or the new one, and nothing is beside
+// it.
+TEST_F(EnvironmentFile, AFailedCallIsTold) {
+  const struct {
+    const char* call;
+    int number;
+    int error;
+    std::string reason;
+    const char* contents;
+  } cases[] = {
+      {"fsync", 1, EIO, " cannot be written: Input/output error.", "A=1\n"},
+      {"fsync", 2, EIO, " is in its place, but its folder cannot be synced: Input/output error.", "A=2\n"},
+  };
+  for (const auto& [call, number, error, reason, contents] : cases) {
+    Write("A=1\n");
+    const FailingCall fault(call, number, error);
+    EXPECT_THAT([] { Store("A", "2"); }, ThrowsMessage<NodeCtlException>("The file " + File() + reason));
+    EXPECT_EQ(Contents(), contents) << reason;
+    EXPECT_FALSE(std::filesystem::exists(root_.Path() + "/etc/tessaro/.names.new"));
+  }
+  {
+    const FailingCall fault("fchown", 1, EPERM);
+    EXPECT_THAT(
+        [&] { host::NewFile(File()).SetOwnerAndMode(geteuid() + 1, 0, 0600); },
+        ThrowsMessage<host::Error>(HasSubstr(" cannot be given to its owner: Operation not permitted.")));
+  }
+  {
+    const FailingCall fault("mkdir", 1, EDQUOT);
+    std::filesystem::remove_all(root_.Path() + "/etc");
+    EXPECT_THAT([] { Store("A", "2"); },
+                ThrowsMessage<NodeCtlException>("The folder " + root_.Path() +
+                                                "/etc cannot be made: Disk quota exceeded."));
+  }
+  Write("A=1\n");
+  std::filesystem::remove(File());
+  const FailingCall fault("renameat2", 1, ENOSPC);
+  EXPECT_THAT([&] { host::NewFile(File()).Publish(); },
+              ThrowsMessage<host::Error>(HasSubstr(" cannot be written: No space left on device.")));
 }
 
 }  // namespace

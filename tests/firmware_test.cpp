@@ -19,7 +19,8 @@ constexpr char kHost[] = R"({"softwareIscsi": {"enabled": false}, "adapters": [
    "properties": {"model": "M1", "firmwareVersion": "1.0", "optionRomVersion": "1.0"}},
   {"name": "hba2", "physicalAdapter": "card"},
   {"name": "hba3", "download": {"firmwareSupported": 0}},
-  {"name": "hba4", "download": {"fileSupported": 0}}]})";
+  {"name": "hba4", "download": {"fileSupported": 0}},
+  {"name": "hba5", "download": {"optionRomSupported": 0}}]})";
 
 constexpr char kMagic[] = "ISCSI-ADAPTER-IMAGE 1\n";
 
@@ -56,6 +57,7 @@ TEST(Firmware, ImagesAreShownAndDownloadedByType) {
       {"option rom", "hba1", "OptionRom download not supported.", "1.0 1.0 - "},
       {"all", "hba1", "All download not supported.", "1.0 1.0 - "},
       {"all", "hba3", nullptr, "2.0 2.0 2.0 "},  // one kind is enough
+      {"all", "hba5", nullptr, "2.0 2.0 2.0 "},
       {"option rom", "hba3", nullptr, "- 2.0 - "},
       {"-2147483648", "hba3", "Invalid download file type.", "- - - ", "unknown"},
   };
@@ -104,6 +106,19 @@ TEST(Firmware, GoesToThePhysicalAdapterBehindTheName) {
   // Another model, and an adapter that takes no images.
   EXPECT_THAT(host(image.On("get", "hba3")).messages, ElementsAre("Invalid file provided."));
   EXPECT_THAT(host(any.On("set", "hba4")).messages, ElementsAre("Invalid download file provided."));
+}
+
+TEST(Firmware, TextsAreShownAsLongAsTheRecordHoldsThem) {
+  const auto faces = [](int count) {
+    std::string text;
+    while (count-- > 0) text += "\xf0\x9f\x98\x80";  // four bytes, the most that a character takes
+    return text;
+  };
+  const Image image(std::string(kMagic) + "type: all\nversion: " + faces(40) +
+                    "\ndescription: " + faces(600) + "\nlength: 0\n");
+  const nlohmann::json row = Harness(kHost)(image.On("get", "hba3")).result[0];
+  EXPECT_EQ(row["Version"], faces(31));
+  EXPECT_EQ(row["Description"], faces(511));
 }
 
 TEST(Firmware, TheFileIsNamedInUtf8) {

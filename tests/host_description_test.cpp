@@ -1,6 +1,8 @@
 // Descriptions: what is read, what is refused and where, what is shown.
+#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <cstdlib>
 #include <filesystem>
@@ -49,11 +51,19 @@ TEST(HostDescription, FaultsNameTheirPath) {
   const std::vector<Refusal> documents = {
       {"", "not a JSON document: parse error at line 1, column 1"},
       {"{\n\"adapters\": [,]}", "not a JSON document: parse error at line 2"},
-      {R"({"state": 1e999})", "the document has a number that is too large"},
+      {R"({"adapters": [{"state": 1e999)", "adapters[0].state: the number is too large (line 1, column 25)"},
       {"[]", "expected an object in braces"},
       {R"({"adapters": {}})", "adapters: expected a list"},
-      {R"({"adapter": []})", "adapter: unknown key; did you mean \"adapters\"?"},
-      {R"({"zzzzzzzzzzz": []})", "zzzzzzzzzzz: unknown key"},
+      {R"({"adapter": []})", "unknown key \"adapter\"; did you mean \"adapters\"? (line 1, column 2)"},
+      {"{\n \"zzzzzzz\\nzzzz\": []}", "unknown key \"zzzzzzz\\nzzzz\" (line 2, column 2)"},
+      {"{\"" + std::string(70000, 'x') + "\": 0}",
+       "unknown key \"" + std::string(64, 'x') + "\"... (70000 bytes) (line 1, column 2)"},
+      {R"({"bootTables": [{"chapPwd": "", "hush": ""}]})",
+       "bootTables[0]: unknown key, not shown because it may be a secret (line 1, column 33)"},
+      {R"({"adapters": [{"name": "x", "chap": {"hush": {}}}]})", "adapters[0].chap: unknown key, not shown"},
+      {R"({"nics": [1]})", "nics[0]: expected an object in braces (line 1, column 11)"},
+      {R"({"nics": 12})", "nics: expected a list (line 1, column 10)"},
+      {"{\"nics\": [\n {}]}", "nics[0].name: missing, and required (line 2, column 2)"},
       {R"({"adapters": [{}]})", "adapters[0].name: missing, and required"},
       {R"({"adapters": [{"name": ""}]})", "adapters[0].name: must not be empty"},
       {R"({"adapters": [{"name": 3}]})", "adapters[0].name: expected a text"},
@@ -91,7 +101,7 @@ TEST(HostDescription, FaultsNameTheirPath) {
       {R"("initiatorName": "host1")", ".initiatorName: it must begin with"},
       {R"("pending": {"reboot": {"network": {"mtu": true}}})",
        ".pending.reboot.network.mtu: expected a whole number"},
-      {R"("pending": {"reset": {"name": "a1"}})", ".pending.reset.name: unknown key"},
+      {R"("pending": {"reset": {"name": "a1"}})", ".pending.reset: unknown key \"name\""},
       {R"("pending": {"reset": {"alias": null}})", ".pending.reset.alias: expected a text"},
       {R"("pending": {"reset": {"parameters": {"MaxCmds": {"current": 1}}}})",
        ".pending: parameters.MaxCmds.current: 1 is not from min"},
@@ -140,44 +150,75 @@ TEST(HostDescription, OnlyDefaultsComeOnTopOfWhatWasWritten) {
   for (const auto& [pointer, value] : written.items()) EXPECT_EQ(host.Show(pointer), value) << pointer;
 }
 
+/// Lets the process read standard input from the file, behind its first bytes.
+class StandardInput {
+ public:
+  StandardInput(const std::string& file, off_t taken) : before_(dup(STDIN_FILENO)) {
+    close(STDIN_FILENO);
+    EXPECT_EQ(open(file.c_str(), O_RDONLY), STDIN_FILENO);
+    EXPECT_EQ(lseek(STDIN_FILENO, taken, SEEK_SET), taken);
+  }
+  StandardInput(const StandardInput&) = delete;
+  StandardInput& operator=(const StandardInput&) = delete;
+  ~StandardInput() {
+    dup2(before_, STDIN_FILENO);
+    close(before_);
+  }
+
+ private:
+  int before_;
+};
+
 TEST(HostDescription, Commands) {
   TemporaryRoot root;
   Harness host(R"({"adapters": [{"name": "hba7", "alias": "\u00fc"}]})");
-  const auto load = [&](const std::string& file) {
-    return host("SimulatorLoad", simulator::NewLoad(), file);
-  };
-  const auto shown = host("SimulatorShow", simulator::NewShow(), "--secrets");
+  const auto load = [&](const std::string& file) { return host(simulator::NewLoad(), file); };
+  const auto shown = host(simulator::NewShow(), "--secrets");
   EXPECT_EQ(json::parse(shown.result.get<std::string>()), host.Show());
   const std::string file = root.Path() + "/description.json";
   std::ofstream(file) << R"({"adapters": [{"name": 3}]})";
-  EXPECT_THAT(load(file).messages, ElementsAre(file + ": adapters[0].name: expected a text"));
+  EXPECT_THAT(load(file).messages,
+              ElementsAre(file + ": adapters[0].name: expected a text (line 1, column 24)"));
   const std::string none = root.Path() + "/none";
   EXPECT_THAT(load(none).messages, ElementsAre("There is no file " + none + "."));
+  EXPECT_THAT(load(root.Path()).messages,
+              ElementsAre("The file " + root.Path() + " cannot be read: Is a directory."));
+  EXPECT_THAT(load(file + "/x").messages,
+              ElementsAre("The file " + file + "/x cannot be read: Not a directory."));
+  const std::string large = root.Path() + "/large.json";
+  std::ofstream(large) << "{";
+  std::filesystem::resize_file(large, (std::size_t{1} << 30U) + 1);
+  EXPECT_THAT(
+      load(large).messages,
+      ElementsAre("The file " + large + " has more than 1073741824 bytes, the most that can be read."));
   EXPECT_EQ(host.Show("/adapters/0/name"), "hba7");
-  std::ofstream(file) << R"({"adapters": [{"name": "hba8"}]})";
-  EXPECT_EQ(load(file).result, true);
+  std::ofstream(file) << "taken"
+                      << R"({"adapters": [{"name": "hba8"}]})";
+  {
+    const StandardInput input(file, 5);
+    EXPECT_EQ(load("-").result, true);
+  }
   EXPECT_EQ(host.Show("/adapters/0/name"), "hba8");
-  EXPECT_EQ(host("SimulatorReset", simulator::NewReset(), "").result, true);
+  EXPECT_EQ(host(simulator::NewReset(), "").result, true);
   EXPECT_EQ(host.Show("/adapters/0/name"), "hba0");
   // A host that cannot be used makes each of them fail.
   std::filesystem::create_directories(root.Path() + "/var/lib/tessaro");
   std::ofstream(root.Path() + "/var/lib/tessaro/host.db") << "x";
   host::Host::Use(nullptr);
   const auto refused = HasSubstr("is not a host database");
-  EXPECT_THAT(host("SimulatorReset", simulator::NewReset(), "").messages.at(0), refused);
-  EXPECT_THAT(host("SimulatorShow", simulator::NewShow(), "").messages.at(0), refused);
-  EXPECT_THAT(host("SimulatorReboot", simulator::NewReboot(), "").messages.at(0), refused);
+  EXPECT_THAT(host(simulator::NewReset(), "").messages.at(0), refused);
+  EXPECT_THAT(host(simulator::NewShow(), "").messages.at(0), refused);
+  EXPECT_THAT(host(simulator::NewReboot(), "").messages.at(0), refused);
 }
 
 TEST(HostDescription, DocumentationIsComplete) {
-  const std::string file = ProjectFile("docs/host-description.md");
-  std::ostringstream stream;
-  stream << std::ifstream(file).rdbuf();
-  const std::string text = stream.str();
+  const std::string file = "docs/host-description.md";
+  const std::string text = FileText(file);
   const std::size_t begin = text.find("-->\n\n") + 5;
   ASSERT_GT(begin, 5u) << file;
   const std::string tables = host::SchemaTables();
-  if (std::getenv("HCLI_WRITE_DOCS") != nullptr) std::ofstream(file) << text.substr(0, begin) << tables;
+  if (std::getenv("HCLI_WRITE_DOCS") != nullptr)
+    std::ofstream(ProjectFile(file)) << text.substr(0, begin) << tables;
   EXPECT_TRUE(text.substr(begin) == tables)
       << file << " is not what the schema says; HCLI_WRITE_DOCS=1 writes it anew";
 }

@@ -45,36 +45,19 @@ TEST(HostOperation, TheTraceTellsEachCallAndItsOutcome) {
   adapter->IsSoftwareOrDependent();
   adapter->GetPhysicalHbaProperties();
   EXPECT_THROW(adapter->GetCapabilities(), NodeCtlException);
-  StorageInfoImpl().GetScsiInterface("none");
+  StorageInfoImpl().GetScsiInterface("n\xff\u009b\u00e9");
   StorageInfoImpl().EnableSoftwareiScsi(false);
   EXPECT_EQ(host::Host::Current().Change(
                 host::Call::OnAdapter("SetMtu", "hba0", {host::Argument::Secret(), 9000, true}),
                 [](host::Tree&) { return host::Status::ResetRequired; }),
             host::Status::ResetRequired);
-  EXPECT_THAT(
-      host.trace,
-      ElementsAre("GetScsiInterface(\"hba0\") = ok", R"(SetInitiatorAlias(hba0, "a \"b\"\x01") = 0)",
-                  R"(GetInitiatorAlias(hba0) = "a \"b\"\x01")", "IsSoftwareOrDependent(hba0) = true",
-                  "GetPhysicalHbaProperties(hba0) = ok", "GetCapabilities(hba0) ! NodeCtlException: no\nway",
-                  "GetScsiInterface(\"none\") = null", "EnableSoftwareiScsi(false) = ok",
-                  "SetMtu(hba0, ***, 9000, true) = 2"));
-}
-
-TEST(HostOperation, AnswersAreForTheirOperationAdapterAndCall) {
-  const Harness host(With(R"("answers": [
-      {"operation": "GetAdapterState", "adapter": "hba0", "call": 2, "throw": "NodeCtlException"},
-      {"operation": "GetInitiatorName", "call": 3, "throw": "bad_alloc"},
-      {"operation": "GetScsiInterface", "adapter": "hba1", "call": 2, "throw": "NodeCtlException"}])"));
-  const auto hba0 = Adapter("hba0");
-  const auto hba1 = Adapter("hba1");
-  hba1->GetAdapterState();
-  EXPECT_EQ(static_cast<int>(hba0->GetAdapterState()), 7);
-  EXPECT_THROW(hba0->GetAdapterState(), NodeCtlException);
-  hba0->GetAdapterState();
-  hba0->GetInitiatorName();
-  hba1->GetInitiatorName();
-  EXPECT_THROW(hba0->GetInitiatorName(), std::bad_alloc);
-  EXPECT_THROW(Adapter("hba1"), NodeCtlException);
+  EXPECT_THAT(host.trace,
+              ElementsAre("GetScsiInterface(\"hba0\") = ok", R"(SetInitiatorAlias(hba0, "a \"b\"\x01") = 0)",
+                          R"(GetInitiatorAlias(hba0) = "a \"b\"\x01")", "IsSoftwareOrDependent(hba0) = true",
+                          "GetPhysicalHbaProperties(hba0) = ok",
+                          R"(GetCapabilities(hba0) ! NodeCtlException: no\nway)",
+                          "GetScsiInterface(\"n\\xff\\xc2\\x9b\u00e9\") = null",
+                          "EnableSoftwareiScsi(false) = ok", "SetMtu(hba0, ***, 9000, true) = 2"));
 }
 
 TEST(HostOperation, Adapters) {
@@ -99,6 +82,7 @@ TEST(HostOperation, TheSoftwareAdapterComesAndGoesWithTheInitiator) {
   const Harness host(With(R"("softwareIscsi": {"enabled": false})"));
   StorageInfoImpl().EnableSoftwareiScsi(false);
   EXPECT_EQ(Adapter("hba2")->GetInitiatorName(), "iqn.2001-04.com.example:it");
+  EXPECT_EQ(Adapter("hba2")->GetDriverName(), "tsriscsi_sw");
   auto description = host.Show();
   EXPECT_EQ(description["adapters"].size(), 4u);
   description["softwareIscsi"] = {{"enabled", false}};
@@ -116,6 +100,14 @@ TEST(Ima, CallsGiveTheirFailuresAsStatus) {
   EXPECT_EQ(call(999), IMA_ERROR_OBJECT_NOT_FOUND);
   EXPECT_EQ(host.trace.back(), "IMA_GetLhbaProperties(lhba 999) = 0x80000007: The adapter is gone.");
   EXPECT_EQ(ima::StatusOf([] { throw std::bad_alloc(); }), IMA_ERROR_INSUFFICIENT_MEMORY);
+}
+
+TEST(Ima, APhysicalAdapterIsOneOfIscsi) {
+  const Harness host(With(R"("nics": [])"));  // one adapter is of another kind
+  IMA_OID_LIST* list = nullptr;
+  ASSERT_EQ(IMA_GetPhbaOidList(&list), IMA_STATUS_SUCCESS);
+  EXPECT_EQ(list->oidCount, 2u);
+  IMA_FreeMemory(list);
 }
 
 TEST(Ima, MemoryIsTakenBackOnce) {

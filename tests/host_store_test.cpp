@@ -2,6 +2,7 @@
 #include <CoreCtl/Storage.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <ima/ima.h>
 #include <sqlite3.h>
 #include <sys/stat.h>
 
@@ -10,6 +11,7 @@
 
 #include "host/Description.h"
 #include "host/Error.h"
+#include "host/Files.h"
 #include "host/Host.h"
 #include "support/Harness.h"
 
@@ -49,7 +51,7 @@ TEST_F(HostStore, TheJournalIsItsOwnersAlone) {
     {
       host::Store store(File());
       const host::Transaction change(store, host::Transaction::Access::Change);
-      store.Execute("UPDATE object SET place = -place");
+      store.Execute("UPDATE object SET kind = -kind");
       EXPECT_EQ(stat((File() + "-journal").c_str(), &journal), 0);
     }
     umask(022);
@@ -57,14 +59,21 @@ TEST_F(HostStore, TheJournalIsItsOwnersAlone) {
   }
 }
 
+TEST_F(HostStore, AnEmptyRootIsNotThisMachine) {
+  setenv("HCLI_ROOT", "", 1);  // the path alone: where this fails, a change would be one of this machine
+  EXPECT_THAT([] { host::HostPath("/x"); },
+              ThrowsMessage<host::Error>(testing::StartsWith("HCLI_ROOT is empty: ")));
+}
+
 TEST_F(HostStore, ALockThatStaysIsTold) {
   Host::Current().Show(false);
   host::Store other(File());
   const host::Transaction lock(other, host::Transaction::Access::Change);
-  Host::Current().GetStore().SetPatience(10);
+  const int before = Host::SetPatience(10);
   EXPECT_NO_THROW(Host::Current().Show(true));  // who writes does not keep readers out
   EXPECT_THAT([] { SetAlias("x"); }, ThrowsMessage<NodeCtl::Lib::NodeCtlException>(
                                          HasSubstr(File() + " is locked by another process.")));
+  EXPECT_EQ(Host::SetPatience(before), 10);
 }
 
 TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
@@ -100,7 +109,7 @@ TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
   }
 }
 
-TEST_F(HostStore, WhileAnAdapterIsHeldAllIsReadFromOneState) {
+TEST_F(HostStore, WhileAnAdapterOrAListIsHeldAllIsReadFromOneState) {
   CoreCtl::Storage::StorageInfoImpl info;
   std::unique_ptr<NodeCtl::Storage::ScsiInterface> held(info.GetScsiInterface("hba0"));
   auto& adapter = dynamic_cast<NodeCtl::Storage::iScsiInterface&>(*held);
@@ -108,7 +117,10 @@ TEST_F(HostStore, WhileAnAdapterIsHeldAllIsReadFromOneState) {
   other.SetPatience(0);
   const auto change = [&] {
     host::Transaction transaction(other, host::Transaction::Access::Change);
-    other.Execute("UPDATE object SET record = json_set(record, '$.alias', 'theirs') WHERE name = 'hba0'");
+    host::Tree tree(other);
+    host::Object hba0 = *tree.Find(host::kRoot, host::Kind::Adapter, "hba0");
+    hba0.record.Set("alias", "theirs");
+    tree.Update(hba0);
     transaction.Commit();
   };
   const auto isLocked = ThrowsMessage<host::Error>(HasSubstr("is locked by another process."));
@@ -119,6 +131,14 @@ TEST_F(HostStore, WhileAnAdapterIsHeldAllIsReadFromOneState) {
   EXPECT_THAT(change, isLocked);
   held.reset();
   change();
+  // So it is while a list of the management API is held, until the first of them is given back.
+  IMA_OID_LIST *adapters, *plugins;
+  ASSERT_EQ(IMA_GetLhbaOidList(&adapters), IMA_STATUS_SUCCESS);
+  EXPECT_THAT(change, isLocked);
+  ASSERT_EQ(IMA_GetPluginOidList(&plugins), IMA_STATUS_SUCCESS);
+  EXPECT_EQ(IMA_FreeMemory(adapters), IMA_STATUS_SUCCESS);
+  change();
+  EXPECT_EQ(IMA_FreeMemory(plugins), IMA_STATUS_SUCCESS);
 }
 
 TEST(HostTree, ChildrenKeepTheirOrderAndIdsAreNeverUsedAgain) {
@@ -134,7 +154,8 @@ TEST(HostTree, ChildrenKeepTheirOrderAndIdsAreNeverUsedAgain) {
     const auto adapters = tree.Children(host::kRoot, host::Kind::Adapter);
     ASSERT_EQ(adapters.size(), 2u);
     EXPECT_EQ(adapters[0].name + adapters[1].name, "ac");
-    EXPECT_THROW(tree.InsertNew(host::kRoot, host::Kind::Adapter, record), host::Error);
+    EXPECT_THAT([&] { tree.InsertNew(host::kRoot, host::Kind::Adapter, record); },
+                ThrowsMessage<host::Error>("The adapter \"c\" exists already."));
   });
 }
 

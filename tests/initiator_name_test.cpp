@@ -52,6 +52,7 @@ TEST(InitiatorName, Rules) {
       {"eui.02004567A425678", "16 hexadecimal"},
       {"eui.02004567A425678D0123456789ABCDEF", "16 hexadecimal"},
       {"eui.02004567A425678G", "16 hexadecimal"},
+      {"naa.", "16 hexadecimal"},
       {"naa.52004567ba64678", "16 hexadecimal"},
       {"naa.52004567BA64678D0123456789ABCDEF", "the first of them 6"},
       {"naa.62004567ba64678d", "the first of them 6"},

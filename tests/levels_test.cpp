@@ -1,5 +1,8 @@
 // Session parameters and CHAP entries at the three levels: adapter, sendtarget and target portal.
+#include <CoreCtl/Storage.h>
+
 #include "support/Harness.h"
+#include "support/Words.h"
 
 namespace {
 
@@ -37,14 +40,12 @@ constexpr char kBadCombination[] =
 
 struct LevelCase {
   const char* path;
-  const char* key;    ///< the options that name the place, the adapter aside
-  const char* infix;  ///< in the names of its operations
-  const char* id;
-  const char* parent;
+  const char* key;     ///< the options that name the place, the adapter aside
+  const char* infix;   ///< in the names of its operations
   const char* record;  ///< where the host keeps it
   const char* chapSetFailure;
 
-  bool Inherits() const { return *parent != '\0'; }
+  bool Inherits() const { return *infix != '\0'; }
   std::string Command(const std::string& words, const std::string& adapter = "hba0") const {
     return std::string("iscsi adapter ") + path + words + " -A " + adapter + key;
   }
@@ -52,21 +53,30 @@ struct LevelCase {
     const bool bare = *infix == '\0' && what == "Parms";
     return verb + (bare ? "Adapter" : infix) + what;
   }
-  /// The calls of a setting command behind the lookup of the adapter.
+  /// The calls of a command that sets a parameter.
   Texts ParmCalls(const Texts& stores) const {
     Texts calls = {"GetScsiInterface", "GetCapabilities", Operation("Get", "Parms")};
     for (const std::string& store : stores) calls.push_back(Operation("Set", store));
     return calls;
   }
+  /// The calls of a CHAP command: the lookup and @p words, of which those for the record are made only where
+  /// the level inherits.
+  Texts ChapCalls(const std::string& words) const {
+    Texts calls = {"GetScsiInterface"};
+    for (const std::string& word : SplitWords(words)) {
+      if (!Inherits() && word.ends_with("Parms")) continue;
+      calls.push_back(Operation(word.substr(0, 3), word.substr(3)));
+    }
+    return calls;
+  }
 };
 
 const LevelCase kLevels[] = {
-    {"", "", "", "hba0", "", "/adapters/0", "Failed to set iSCSI CHAP authentication configuration."},
-    {"discovery sendtarget ", " -a 192.0.2.1", "SendTarget", "192.0.2.1:3260", "hba0",
-     "/adapters/0/sendTargets/0", "Failed to set CHAP authentication configuration."},
+    {"", "", "", "/adapters/0", "Failed to set iSCSI CHAP authentication configuration."},
+    {"discovery sendtarget ", " -a 192.0.2.1", "SendTarget", "/adapters/0/sendTargets/0",
+     "Failed to set CHAP authentication configuration."},
     {"target portal ", " -n iqn.2026-11.org.example:t -a [2001:db8::1]:3261", "Target",
-     "iqn.2026-11.org.example:t,[2001:db8::1]:3261", "hba0", "/adapters/0/staticTargets/0",
-     "Unable to set CHAP authentication."},
+     "/adapters/0/staticTargets/0", "Unable to set CHAP authentication."},
 };
 
 json RowOf(const Outcome& run, const std::string& key) {
@@ -74,30 +84,6 @@ json RowOf(const Outcome& run, const std::string& key) {
     if (row["Name"] == key) return row;
   }
   return {};
-}
-
-TEST(ParamGet, ShowsTheWholeTableInOrder) {
-  for (const LevelCase& level : kLevels) {
-    Harness host(kHost);
-    const Outcome run = host(level.Command("param get"));
-    std::string names;
-    for (const json& row : run.result) {
-      names += row["Name"].get<std::string>() + " ";
-      EXPECT_EQ(row["ID"], level.id);
-      EXPECT_EQ(row["Settable"], true) << row;
-      EXPECT_EQ(row["Inherit"], level.Inherits()) << row;
-      EXPECT_EQ(row["Current"], row["Default"]) << row;
-    }
-    EXPECT_EQ(names,
-              "ErrorRecoveryLevel InitialLoginRetryMax InitialR2T FirstBurstLength MaxBurstLength "
-              "MaxRecvDataSegment MaxOutstandingR2T MaxCmds ImmediateData DefaultTime2Retain "
-              "DefaultTime2Wait LoginTimeout LogoutTimeout NoopOutInterval NoopOutTimeout RecoveryTimeout "
-              "DelayedAck HeaderDigest DataDigest ");
-    Texts calls = {"GetScsiInterface", "GetCapabilities", level.Operation("Get", "Parms"),
-                   level.Operation("Get", "HeaderDigest"), level.Operation("Get", "DataDigest")};
-    if (!level.Inherits()) calls.push_back("GetName");
-    EXPECT_EQ(run.Calls(), calls);
-  }
 }
 
 TEST(ParamGet, AllMeansAllTargetsOnlyInBothPlaces) {
@@ -169,11 +155,39 @@ TEST(ParamSet, WhatIsNotOverriddenFollowsTheParent) {
   EXPECT_EQ(current(kLevels[1].Command("param get")), "21");
   EXPECT_EQ(current(found), "21");
   EXPECT_EQ(host(kLevels[1].Command("param set -k LoginTimeout -v 22")).result, true);
+  const std::string& call = host.trace.back();  // each value, or that it is inherited
+  EXPECT_THAT(call, testing::StartsWith(
+                        "SetSendTargetParms(hba0, \"192.0.2.1:3260\", {ErrorRecoveryLevel=inherited, "));
+  EXPECT_THAT(call, HasSubstr(", LoginTimeout=22, LogoutTimeout=inherited, "));
   EXPECT_EQ(current(found), "22");  // by way of the sendtarget through which it was found
   EXPECT_EQ(current(kLevels[2].Command("param get")), "21");
   EXPECT_EQ(RowOf(host(found), "LoginTimeout")["Inherit"], true);
   host("iscsi adapter discovery sendtarget remove -A hba0 -a 192.0.2.1");
   EXPECT_EQ(current(found), "21");
+}
+
+TEST(ParamSet, WritesWhatDiffersFromWhatTheCallerWasGiven) {
+  Harness host(kHost);
+  const auto adapter = [] {
+    return std::unique_ptr<NodeCtl::Storage::iScsiInterface>(dynamic_cast<NodeCtl::Storage::iScsiInterface*>(
+        CoreCtl::Storage::StorageInfoImpl().GetScsiInterface("hba0")));
+  };
+  const auto expect = [&](int loginTimeout, int maxCmds) {
+    const auto found = adapter()->GetAdapterParms();
+    EXPECT_EQ(found.loginTimeout.current, loginTimeout);
+    EXPECT_EQ(found.maxCmds.current, maxCmds);
+  };
+  const auto one = adapter();
+  auto parms = one->GetAdapterParms();
+  host(kLevels[0].Command("param set -k MaxCmds -v 64"));
+  parms.loginTimeout.current = 21;
+  one->SetAdapterParms(parms);
+  expect(21, 64);
+  parms.loginTimeout.current = 15;  // back to what was read, from what was stored
+  one->SetAdapterParms(parms);
+  expect(15, 64);
+  adapter()->SetAdapterParms(parms);  // of one that was not read, all counts
+  expect(15, 128);
 }
 
 TEST(ParamSet, OptionsAreTestedInOrder) {
@@ -246,72 +260,53 @@ json ChapRow(Harness& host, const LevelCase& level, const std::string& direction
   return host(level.Command("auth chap get -d " + direction)).result.at(0);
 }
 
-TEST(ChapGet, ShowsOneDirection) {
-  for (const LevelCase& level : kLevels) {
-    Harness host(kHost);
-    host(level.Command("auth chap set -N alice -S hush-hush-hush -l required"));
-    EXPECT_EQ(host.Show(std::string(level.record) + "/chap/uni/secret"), "hush-hush-hush");
-
-    const json row = ChapRow(host, level, "uni");
-    EXPECT_EQ(row["Direction"], "uni");
-    EXPECT_EQ(row["Name"], "alice");
-    EXPECT_EQ(row["Level"], "required");
-    if (level.Inherits()) {
-      EXPECT_EQ(row["Inheritance"], false);
-      EXPECT_EQ(row["Parent"], level.parent);
-    }
-  }
-  Harness host(kHost);
-  EXPECT_EQ(ChapRow(host, kLevels[0], "uni")["Adapter"], "hba0");
-  EXPECT_EQ(ChapRow(host, kLevels[1], "uni")["Sendtarget"], "192.0.2.1:3260");
-  const json all =
-      host("iscsi adapter target portal auth chap get -A hba0 -n all -a all -d mutual -m chap").result;
-  EXPECT_EQ(all.at(1), json::parse(R"({"TargetName": "iqn.2026-11.org.example:found",
-      "Address": "192.0.2.9:3260", "Method": "chap", "Direction": "mutual", "Name": "none",
-      "Level": "prohibited", "Inheritance": true, "Parent": "192.0.2.1:3260"})"));
-}
-
-/// Sets the level @p wanted, or the default where that is empty, of one direction while uni is at @p uni.
-void CheckChapSet(const LevelCase& level, const std::string& uni, bool mutual, const std::string& wanted) {
-  SCOPED_TRACE(level.path + uni + (mutual ? " mutual " : " uni ") + wanted);
-  json description = json::parse(kHost);
-  description[json::json_pointer(std::string(level.record) + "/chap")] = {
-      {"uni", {{"name", "u"}, {"secret", "secret-u"}, {"level", uni}}},
-      {"mutual", {{"name", "m"}, {"secret", "secret-m"}, {"level", "required"}}}};
-  Harness host(description.dump());
-  const Outcome run = host(level.Command(std::string("auth chap set") + (mutual ? " -d mutual" : "") +
-                                         (wanted.empty() ? " -D" : " -N n -S secret-n -l " + wanted)));
-  const bool off = wanted.empty() || wanted == "prohibited";
-  const char* refusal = !mutual || off         ? nullptr
-                        : wanted != "required" ? kBadLevel
-                        : uni != "required"    ? kBadCombination
-                                               : nullptr;
-  const bool done = refusal == nullptr;
-  Texts calls = {"GetScsiInterface"};
-  if (level.Inherits()) calls.push_back(level.Operation("Get", "Parms"));
-  if (mutual && refusal != kBadLevel) calls.push_back(level.Operation("Get", "ChapParameters"));
-  if (done && level.Inherits()) calls.push_back(level.Operation("Set", "Parms"));
-  if (done) calls.push_back(level.Operation("Set", "ChapParameters"));
-  if (!mutual && off) calls.push_back(level.Operation("Set", "ChapParameters"));
-  EXPECT_EQ(run.Calls(), calls);
-  EXPECT_EQ(run.messages, done ? Texts() : Texts{refusal});
-  EXPECT_EQ(run.result, done ? json(true) : json());
-
-  const json now = off ? json{"none", "none", "prohibited"} : json{"n", "secret-n", wanted};
-  const auto entry = [&](const char* direction) {
-    const json stored = host.Show(std::string(level.record) + "/chap/" + direction);
-    return json{stored["name"], stored["secret"], stored["level"]};
-  };
-  EXPECT_EQ(entry("uni"), mutual ? json({"u", "secret-u", uni}) : now);
-  EXPECT_EQ(entry("mutual"), done && (mutual || off) ? now : json({"m", "secret-m", "required"}));
-}
-
 TEST(ChapSet, DirectionLevelAndTheCurrentUniLevel) {
+  const std::string uni = " -N n -S secret-n -l ";
+  const std::string mutual = " -d mutual" + uni;
+  const json off = {"none", "none", "prohibited"};
+  const json kept = {"m", "secret-m", "required"};
+  constexpr char kStored[] = "GetParms SetParms SetChapParameters";
+  constexpr char kCleared[] = "GetParms SetParms SetChapParameters SetChapParameters";
+  constexpr char kChecked[] = "GetParms GetChapParameters SetParms SetChapParameters";
+  const struct {
+    const char* before;  ///< the level of the uni entry
+    std::string options;
+    json uniNow;  ///< null where it is as before
+    json mutualNow;
+    std::string calls;  ///< behind the lookup; those for the record only where the level inherits
+    Texts messages = {};
+  } cases[] = {
+      {"required", " -D", off, off, kCleared},
+      {"preferred", uni + "prohibited", off, off, kCleared},
+      {"prohibited", uni + "discouraged", {"n", "secret-n", "discouraged"}, kept, kStored},
+      {"required", uni + "preferred", {"n", "secret-n", "preferred"}, kept, kStored},
+      {"discouraged", uni + "required", {"n", "secret-n", "required"}, kept, kStored},
+      {"discouraged", " -d mutual -D", {}, off, kChecked},
+      {"required", mutual + "prohibited", {}, off, kChecked},
+      {"required", mutual + "required", {}, {"n", "secret-n", "required"}, kChecked},
+      {"prohibited", mutual + "required", {}, kept, "GetParms GetChapParameters", {kBadCombination}},
+      {"preferred", mutual + "required", {}, kept, "GetParms GetChapParameters", {kBadCombination}},
+      {"required", mutual + "discouraged", {}, kept, "GetParms", {kBadLevel}},
+      {"required", mutual + "preferred", {}, kept, "GetParms", {kBadLevel}},
+  };
   for (const LevelCase& level : kLevels) {
-    for (const char* uni : {"prohibited", "discouraged", "preferred", "required"}) {
-      for (const char* wanted : {"", "prohibited", "discouraged", "preferred", "required"}) {
-        for (const bool mutual : {false, true}) CheckChapSet(level, uni, mutual, wanted);
-      }
+    for (const auto& [before, options, uniNow, mutualNow, calls, messages] : cases) {
+      SCOPED_TRACE(std::string(level.path) + before + options);
+      json description = json::parse(kHost);
+      description[json::json_pointer(std::string(level.record) + "/chap")] = {
+          {"uni", {{"name", "u"}, {"secret", "secret-u"}, {"level", before}}},
+          {"mutual", {{"name", "m"}, {"secret", "secret-m"}, {"level", "required"}}}};
+      Harness host(description.dump());
+      const Outcome run = host(level.Command("auth chap set" + options));
+      EXPECT_EQ(run.messages, messages);
+      EXPECT_EQ(run.result, messages.empty() ? json(true) : json());
+      EXPECT_EQ(run.Calls(), level.ChapCalls(calls));
+      const auto entry = [&](const char* direction) {
+        const json stored = host.Show(std::string(level.record) + "/chap/" + direction);
+        return json{stored["name"], stored["secret"], stored["level"]};
+      };
+      EXPECT_EQ(entry("uni"), uniNow.is_null() ? json({"u", "secret-u", before}) : uniNow);
+      EXPECT_EQ(entry("mutual"), mutualNow);
     }
   }
 }
@@ -349,8 +344,7 @@ TEST(ChapSet, InheritSetsTheMarkOfTheDirectionAlone) {
     host(level.Command("auth chap set -d mutual -l prohibited"));
     const Outcome uni = host(level.Command("auth chap set --inherit --default=false -N a -S b -l preferred"));
     EXPECT_EQ(uni.result, true);
-    EXPECT_THAT(uni.Calls(), ElementsAre("GetScsiInterface", level.Operation("Get", "Parms"),
-                                         level.Operation("Set", "Parms")));
+    EXPECT_EQ(uni.Calls(), level.ChapCalls("GetParms SetParms"));
     EXPECT_EQ(ChapRow(host, level, "uni")["Name"], "top");
     EXPECT_EQ(ChapRow(host, level, "mutual")["Inheritance"], false);
     EXPECT_EQ(host(level.Command("auth chap set --inherit -d mutual")).result, true);
@@ -361,12 +355,31 @@ TEST(ChapSet, InheritSetsTheMarkOfTheDirectionAlone) {
 
 TEST(ChapSet, ARefusedEntryLeavesTheInheritedOneInForce) {
   for (const LevelCase& level : kLevels) {
-    if (!level.Inherits()) continue;
-    Harness host(kHost);
-    host(kLevels[0].Command("auth chap set -N top -S secret-top -l required"));
-    EXPECT_EQ(host(level.Command("auth chap set -l required -N a -S '***'")).status, 1);
-    const json row = ChapRow(host, level, "uni");
-    EXPECT_EQ(json({row["Name"], row["Level"], row["Inheritance"]}), json({"top", "required", false}));
+    for (const bool hasOld : {false, true}) {
+      if (!level.Inherits()) continue;
+      Harness host(kHost);
+      host(kLevels[0].Command("auth chap set -N top -S secret-top -l required"));
+      if (hasOld) {
+        host(level.Command("auth chap set -l prohibited"));
+        host(level.Command("auth chap set --inherit"));
+      }
+      EXPECT_EQ(host(level.Command("auth chap set -l required -N a -S '***'")).status, 1);
+      const json row = ChapRow(host, level, "uni");
+      EXPECT_EQ(json({row["Name"], row["Level"], row["Inheritance"]}), json({"top", "required", false}));
+      EXPECT_EQ(host.Show(std::string(level.record) + "/chap/uni/secret"), "secret-top");
+    }
+  }
+}
+
+// The command clears the mutual entry itself, in a call of its own that a kill can keep from happening.
+TEST(ChapSet, ProhibitedChapLeavesNoMutualChapBehind) {
+  for (const LevelCase& level : kLevels) {
+    Harness host(WithAnswers(kHost, "{\"operation\": \"" + level.Operation("Set", "ChapParameters") +
+                                        "\", \"throw\": \"NodeCtlException\", \"call\": 4}"));
+    host(level.Command("auth chap set -N u -S secret-u -l required"));
+    host(level.Command("auth chap set -d mutual -N m -S secret-m -l required"));
+    EXPECT_EQ(host(level.Command("auth chap set -l prohibited")).status, 1);
+    EXPECT_EQ(ChapRow(host, level, "mutual")["Level"], "prohibited");
   }
 }
 

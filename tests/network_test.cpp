@@ -44,15 +44,10 @@ std::string TargetWith(const std::string& target, const std::string& adapter = "
       json({{"remoteTargets", json::array({remote})}, {"remotePortals", json::parse(portals)}}).dump());
 }
 
-Texts Column(Harness& host, const std::string& command, const char* field) {
-  Texts values;
-  for (const json& row : host(command).result) values.push_back(row[field]);
-  return values;
-}
-Texts Targets(Harness& host) { return Column(host, "iscsi adapter target list", "Target"); }
-Texts Errors(Harness& host) { return Column(host, "iscsi adapter target list", "Last Error"); }
-Texts Methods(Harness& host) { return Column(host, "iscsi adapter target list", "Discovery Method"); }
-Texts SessionTargets(Harness& host) { return Column(host, "iscsi session list", "Target"); }
+Texts Targets(Harness& host) { return host("iscsi adapter target list").Column("Target"); }
+Texts Errors(Harness& host) { return host("iscsi adapter target list").Column("Last Error"); }
+Texts Methods(Harness& host) { return host("iscsi adapter target list").Column("Discovery Method"); }
+Texts SessionTargets(Harness& host) { return host("iscsi session list").Column("Target"); }
 
 /// The status of a discovery of the adapter.
 std::string Rediscover(Harness& host) {
@@ -144,7 +139,7 @@ TEST(Network, ChapIsDoneAsBothSidesWish) {
     SCOPED_TRACE(adapter.dump() + target.dump());
     host("iscsi session add -A a");
     EXPECT_THAT(Errors(host), ElementsAre(c.outcome));
-    const Texts methods = Column(host, "iscsi session list", "AuthenticationMethod");
+    const Texts methods = host("iscsi session list").Column("AuthenticationMethod");
     EXPECT_EQ(methods, *c.method == 0 ? Texts{} : Texts{c.method});
   }
 }
@@ -232,8 +227,8 @@ constexpr char kTwoTargets[] = R"({"remoteTargets": [
 TEST(Network, ALoginTellsAliasAndPortalGroup) {
   Harness host(TargetWith(R"({"alias": "disk"})"));
   EXPECT_EQ(host("iscsi session add -A a").result, true);
-  EXPECT_THAT(Column(host, "iscsi adapter target list", "Alias"), ElementsAre("disk"));
-  EXPECT_THAT(Column(host, "iscsi adapter discovery statictarget list", "TPGT"), ElementsAre("7"));
+  EXPECT_THAT(host("iscsi adapter target list").Column("Alias"), ElementsAre("disk"));
+  EXPECT_THAT(host("iscsi adapter discovery statictarget list").Column("TPGT"), ElementsAre("7"));
 }
 
 TEST(Rediscovery, TargetsComeAndGoAndSettingsStay) {
@@ -241,10 +236,10 @@ TEST(Rediscovery, TargetsComeAndGoAndSettingsStay) {
   EXPECT_THAT(Targets(host), IsEmpty());
   EXPECT_EQ(Rediscover(host), "Discovery Completed");
   EXPECT_THAT(Targets(host), ElementsAre("t0", "t1"));
-  EXPECT_THAT(Column(host, "iscsi adapter target list", "Alias"), ElementsAre("zero", ""));
+  EXPECT_THAT(host("iscsi adapter target list").Column("Alias"), ElementsAre("zero", ""));
   EXPECT_THAT(Methods(host), ElementsAre("SENDTARGETS ", "SENDTARGETS "));
-  EXPECT_THAT(Column(host, "iscsi adapter target portal list -n t0", "Port"), ElementsAre("3260", "860"));
-  EXPECT_THAT(Column(host, "iscsi adapter target portal list -n t0", "Tpgt"), ElementsAre("2", "1"));
+  EXPECT_THAT(host("iscsi adapter target portal list -n t0").Column("Port"), ElementsAre("3260", "860"));
+  EXPECT_THAT(host("iscsi adapter target portal list -n t0").Column("Tpgt"), ElementsAre("2", "1"));
   EXPECT_THAT(SessionTargets(host), ElementsAre("t0", "t1"));
   const json once = host.Show();
   Rediscover(host);
@@ -322,7 +317,7 @@ TEST(Rediscovery, HostNamesAreTheSameInEachSpelling) {
   EXPECT_EQ(Rediscover(host), "Discovery Completed");
   EXPECT_THAT(Targets(host), ElementsAre("t"));
   EXPECT_EQ(host("iscsi adapter target portal param get -A a -n t -a portal").result.size(), 19u);
-  EXPECT_THAT(Column(host, list + "list", "Sendtarget"), ElementsAre("Portal:3260"));
+  EXPECT_THAT(host(list + "list").Column("Sendtarget"), ElementsAre("Portal:3260"));
   EXPECT_EQ(host(list + "remove -A a -a PORTAL").result, true);
 }
 
@@ -342,6 +337,24 @@ TEST(Rediscovery, ChangesNothingThatHoldsForAStaticTarget) {
     }
     EXPECT_EQ(shown, current) << target;
   }
+}
+
+TEST(Rediscovery, APortalThatSeveralTellOfStaysWithItsOrigin) {
+  Harness host(HostWith(
+      R"({"sendTargets": [{"host": "192.0.2.1"}, {"host": "192.0.2.2"}],
+      "staticTargets": [{"name": "t", "host": "192.0.2.1", "sendTarget": {"host": "192.0.2.2"}}]})",
+      R"({"remoteTargets": [{"name": "t", "portals": [{"host": "192.0.2.1"}, {"host": "192.0.2.2"}]}]})"));
+  const auto origins = [&] {
+    Texts hosts;
+    for (const json& place : host.Show("/adapters/0/staticTargets"))
+      hosts.push_back(place["sendTarget"]["host"]);
+    return hosts;
+  };
+  Rediscover(host);
+  EXPECT_THAT(origins(), ElementsAre("192.0.2.2", "192.0.2.1"));  // of a new one, the first that tells of it
+  host("iscsi adapter discovery sendtarget remove -A a -a 192.0.2.2");
+  Rediscover(host);
+  EXPECT_THAT(origins(), ElementsAre("192.0.2.1", "192.0.2.1"));
 }
 
 TEST(Rediscovery, ASessionThatNoPortalLeadsToIsNoFailedLogin) {
@@ -439,12 +452,12 @@ TEST(Paths, EachBoundNicCarriesASession) {
                             "nics": [{"name": "n0", "ipv4Address": "198.51.100.1"},
                                      {"name": "n1", "ipv4Address": "198.51.100.2"},
                                      {"name": "down", "ipv4Address": "198.51.100.3", "linkUp": false}]})"));
-  const auto paths = [&] { return Column(host, "iscsi session connection list", "LocalAddress"); };
+  const auto paths = [&] { return host("iscsi session connection list").Column("LocalAddress"); };
   ASSERT_EQ(host("iscsi session add -A a").result, true);
   EXPECT_THAT(paths(), ElementsAre("198.51.100.1"));
-  EXPECT_THAT(Column(host, "iscsi session connection list", "ConnectionAddress"), ElementsAre("192.0.2.9"));
+  EXPECT_THAT(host("iscsi session connection list").Column("ConnectionAddress"), ElementsAre("192.0.2.9"));
   // Where it was sent on to.
-  EXPECT_THAT(Column(host, "iscsi session connection list", "RemoteAddress"), ElementsAre("192.0.2.1"));
+  EXPECT_THAT(host("iscsi session connection list").Column("RemoteAddress"), ElementsAre("192.0.2.1"));
 
   ASSERT_EQ(host("iscsi networkportal add -A a -n n1").result, true);
   ASSERT_EQ(host("iscsi session add -A a").result, true);

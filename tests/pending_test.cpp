@@ -26,7 +26,7 @@ std::string HostWith(const std::string& keys) {
   return host.dump();
 }
 
-Outcome Reboot(Harness& host) { return host("SimulatorReboot", simulator::NewReboot(), ""); }
+Outcome Reboot(Harness& host) { return host(simulator::NewReboot(), ""); }
 
 /// What a command shows: a field of its first row, or of the row of a parameter.
 json Field(Harness& host, const std::string& line, const std::string& field, const std::string& option) {
@@ -164,6 +164,15 @@ TEST(Pending, AResetLeavesWhatWaitsForAReboot) {
   EXPECT_EQ(host.Show("/adapters/0/alias"), "");
   EXPECT_EQ(host.Show("/adapters/0/pending"), json::parse(R"({"reboot": {"alias": "lab"}})"));
   EXPECT_EQ(host("iscsi session list").result, json::array());  // the network does not let it in again
+}
+
+TEST(Pending, OfWhatWaitsForBothTheRebootHasTheLastWord) {
+  Harness host(HostWith(R"({"pending": {"reset": {"parameters": {"MaxCmds": {"current": 64}}},
+                                        "reboot": {"parameters": {"MaxCmds": {"current": 32}}}},
+                            "parameters": {"MaxCmds": {"current": 16}}})"));
+  EXPECT_EQ(Field(host, "iscsi adapter param get -A a0", "Current", "MaxCmds"), "32");
+  Reboot(host);
+  EXPECT_EQ(host.Show("/adapters/0/parameters/MaxCmds/current"), 32);
 }
 
 TEST(Pending, InheritanceWaitsToo) {

@@ -58,6 +58,11 @@ TEST(PlinthFormatters, ShowTheSameValuesInTheirForms) {
                {{"--output=table"},
                 "                 MTU  Name\n--------------------  ----------------\n                1500  " +
                     name + "\n\n-9223372036854775807  " + marks + '\n'},
+               {{"--output=csv"},
+                "Name,MTU,Link Up\r\n" + name +
+                    ",1500,true\r\n,,\r\n\"a\nb\t\\x1b\\xff\"\"\\\",-9223372036854775807,false\r\n"},
+               {{"--output=csv", "--no-header", "--fields=Name"},
+                name + "\r\n\"\"\r\n\"a\nb\t\\x1b\\xff\"\"\\\"\r\n"},
                {{"--output", "json"},
                 Document(0, "",
                          R"([{"Name": ")" + name +
@@ -69,7 +74,87 @@ TEST(PlinthFormatters, ShowTheSameValuesInTheirForms) {
   ExpectLines(*NewProbe(MetaString::New("two\nlines\x1b")), {{{}, "two\nlines\\x1b\n"}});
   ExpectLines(*NewProbe(Port("p", 1, true)),
               {{{}, "   Name: p\n   MTU: 1\n   Link Up: true\n"},
-               {{"--output=table"}, "Name  MTU  Link Up\n----  ---  -------\np       1  true\n"}});
+               {{"--output=table"}, "Name  MTU  Link Up\n----  ---  -------\np       1  true\n"},
+               {{"--output=table", "--no-header"}, "p  1  true\n"}});
+}
+
+TEST(PlinthFormatters, FitTablesToTheTerminal) {
+  ASSERT_TRUE(setlocale(LC_CTYPE, "C.UTF-8"));
+  const std::string kanji = "\xe6\xbc\xa2";
+  const auto probe = NewProbe(Ports({Port("iqn.2026-11.org.example:disk", 1234567890123, true),
+                                     Port(kanji + kanji + kanji + kanji + kanji, 1, true)}));
+  const struct {
+    std::size_t columns;
+    std::string first;
+    std::string second;
+  } cases[] = {
+      {0, "iqn.2026-11.org.example:disk", kanji + kanji + kanji + kanji + kanji + std::string(18, ' ')},
+      {49, "iqn.2026-11.org.example:disk", kanji + kanji + kanji + kanji + kanji + std::string(18, ' ')},
+      {37, "iqn.2026\xe2\x80\xa6le:disk", kanji + kanji + kanji + kanji + kanji + std::string(6, ' ')},
+      {29, "iqn.\xe2\x80\xa6isk", kanji + kanji + "\xe2\x80\xa6" + kanji + ' '},
+      {28, "iqn.2026-11.org.example:disk", kanji + kanji + kanji + kanji + kanji + std::string(18, ' ')},
+  };
+  for (const auto& one : cases) {
+    TextConsole console;
+    console.screen = {one.columns, 0};
+    RunCommand(*probe, {"--output=table", "--no-header"}, console);
+    EXPECT_EQ(console.out.text,
+              one.first + "  1234567890123  true\n" + one.second + "              1  true\n");
+  }
+}
+
+TEST(PlinthFormatters, ColourHeadingsAndFailures) {
+  const auto probe = NewProbe(Port("p", 1, true));
+  probe->SetDefaultOutputParameter("header:Port", "%Name%");
+  const std::string colours = "--color=always";
+  ExpectLines(*probe, {{{colours, "--fields=MTU"}, "\x1b[1mp\x1b[0m\n   MTU: 1\n"},
+                       {{colours, "--fields=MTU", "--output=table"}, "\x1b[1mMTU\n\x1b[0m---\n  1\n"},
+                       {{colours, "--fields=MTU", "--output=csv"}, "MTU\r\n1\r\n"},
+                       {{colours, "--output=json", "--version"}, Document(0, "", R"("hcli 0.1.0\n")")}});
+  ExpectLines(*NewProbe(MetaBool::New(true)),
+              {{{colours, "--help"},
+                "\x1b[1mUsage:\x1b[0m hcli\n\nhcli --help lists the global options.\n\n"
+                "\x1b[1mResult:\x1b[0m bool\n"}});
+  TextConsole console;
+  RunCommand(*probe, {colours, "--nope"}, console);
+  EXPECT_EQ(console.error.text, "\x1b[31mhcli: unknown option \"--nope\"; --help lists the options\n\x1b[0m");
+}
+
+TEST(PlinthFormatters, ReadTextsWhereTypesAreWanted) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"0", "0"},
+      {"-65536", "-65536"},
+      {"4294967295", "4294967295"},
+      {"12345678901", R"("12345678901")"},
+      {"007", R"("007")"},
+      {"-0", R"("-0")"},
+      {"-", R"("-")"},
+      {"1.5", R"("1.5")"},
+      {"true", "true"},
+      {"false", "false"},
+      {"True", R"("True")"},
+      {"a ", R"(["a"])"},
+      {"1 true ", R"(["1", "true"])"},
+      {"a b", R"("a b")"},
+      {"a  b ", R"("a  b ")"},
+      {" ", R"(" ")"},
+      {"", R"("")"},
+  };
+  for (const auto& [text, read] : cases) {
+    ExpectLines(*NewProbe(Ports({Port(text, 5, false), PortShape()})),
+                {{{"--typed", "--output=json"},
+                  Document(0, "",
+                           std::string(R"([{"Name": )") + read +
+                               R"(, "MTU": 5, "Link Up": false}, )"
+                               R"({"Name": null, "MTU": null, "Link Up": null}])")}});
+  }
+  ExpectLines(
+      *NewProbe(MetaString::New("7")),
+      {{{"--typed", "--output=json"}, Document(0, "", "\"7\"")},
+       {{"--typed=no"}, "7\n"},
+       {{"--typed", "--output=csv"},
+        "hcli: option --typed: it goes with --output json or --output yaml; other forms have texts alone\n",
+        kUsage}});
 }
 
 TEST(PlinthRun, EndsWithoutAResultAndTellsWhy) {
@@ -155,6 +240,16 @@ TEST(PlinthRun, ResolvesWordsOrTellsWhatIsThere) {
       });
 }
 
+TEST(PlinthRun, ProposesTheNearestOfSeveralNearWords) {
+  const auto root = AutoCli::Namespace::New();
+  for (const char* name : {"connects", "connections", "connector"}) {
+    root->RegisterNamespaceNode(AutoCli::Namespace::New(), name);
+  }
+  ExpectLines(
+      *root,
+      {{{"connectons"}, "hcli: unknown command \"connectons\"; did you mean \"connections\"?\n", kUsage}});
+}
+
 TEST(PlinthRun, GivesOneDocumentHoweverItEnds) {
   const auto root = NewTree();
   const std::pair<Arguments, int> cases[] = {
@@ -163,6 +258,7 @@ TEST(PlinthRun, GivesOneDocumentHoweverItEnds) {
       {{"--nope", "--output=json"}, kUsage},
       {{"--output", "nope", "--output", "json"}, kUsage},
       {{"net", "port", "list", "--output", "json", "--way", "\xff"}, kUsage},
+      {{"net", "part", "list", "--way", "in", "--output", "json"}, kUsage},
       {{"completion", "ksh", "--output=json"}, kUsage},
   };
   for (const auto& [arguments, status] : cases) {
@@ -180,19 +276,21 @@ TEST(PlinthRun, GivesOneDocumentHoweverItEnds) {
   }
 }
 
-TEST(PlinthCatalogue, DescribesTheTreeInItsFixedForm) {
+TEST(PlinthCompletion, TellsFishWhatStandsWhere) {
   TextConsole console;
-  RunCommandLine(*NewTree(), {"catalogue", "--output", "json"}, console);
-  const auto nodes = nlohmann::ordered_json::parse(console.out.text).at("result");
-  ASSERT_EQ(nodes.size(), 5U);
-  EXPECT_EQ(nodes[1].dump(), R"({"path":"net port","kind":"namespace","description":""})");
-  EXPECT_EQ(nodes[2].at("formatter").dump() + nodes[2].at("formatterParameters").dump(),
-            R"("table"{"fields:Port":"Name"})");
-  EXPECT_EQ(
-      nodes[2].at("result").dump(),
-      R"({"kind":"list","sample":"","structure":{"name":"Port","fields":[{"name":"Name","type":"string"},)"
-      R"({"name":"MTU","type":"int"},{"name":"Link Up","type":"bool"}]}})");
-  EXPECT_EQ(nodes[4].at("result").dump(), R"({"kind":"string","sample":"Script","structure":null})");
+  RunCommandLine(*NewTree(), {"completion", "fish"}, console);
+  const auto part = [&](const std::string& from, const std::string& to) {
+    const std::size_t begin = console.out.text.find(from);
+    return console.out.text.substr(begin, console.out.text.find(to) - begin);
+  };
+  EXPECT_EQ(part("complete -c hcli -n '__hcli_at \"net\"'",
+                 "complete -c hcli -n '__hcli_in \"net port list\"' -l output"),
+            "complete -c hcli -n '__hcli_at \"net\"' -a 'port' -d ''\n"
+            "complete -c hcli -n '__hcli_at \"net port\"' -a 'list' -d 'List ports.'\n"
+            "complete -c hcli -n '__hcli_in \"net port list\"' -s w -l way -x -a 'in out'\n"
+            "complete -c hcli -n '__hcli_in \"net port list\"' -l mode\n");
+  EXPECT_EQ(part("complete -c hcli -l fields", "complete -c hcli -l no-header"),
+            "complete -c hcli -l fields -r\n");
 }
 
 TEST(PlinthCheck, TellsWhereAResultDiffers) {
@@ -261,6 +359,35 @@ TEST(PlinthCheck, EndsACheckedRunThatBreaksItsDeclarations) {
     EXPECT_EQ(record.failure, one.status == kFailure ? one.text : "");
     EXPECT_DEATH(RunCommand(*probe, {}, console, {.checked = true}), one.text);
   }
+  probe->body = [](const Input&, Output& output) { Post(output, MetaBool::New(true)); };
+  probe->SetDefaultOutputFormatter("tabel");
+  TextConsole console;
+  EXPECT_EQ(RunCommand(*probe, {}, console, {.checked = false}).status, kSuccess);
+  EXPECT_DEATH(RunCommand(*probe, {}, console, {.checked = true}), "default format \"tabel\" is none");
+}
+
+/// Declares what the framework has not made.
+class ForeignCommand final : public virtual AutoCli::Command {
+ public:
+  boost::shared_ptr<CallSpec::InputSpec> spec;
+
+ private:
+  struct Foreign final : CallSpec::OutputSpec {
+    void SetResultType(boost::shared_ptr<MetaObject>) override {}
+  };
+
+  boost::shared_ptr<CallSpec::InputSpec> GetInputSpecInternal() override { return spec; }
+  boost::shared_ptr<CallSpec::OutputSpec> GetOutputSpecInternal() override {
+    return boost::shared_ptr<CallSpec::OutputSpec>(new Foreign);
+  }
+  void ExecuteInternal(boost::shared_ptr<Input>, boost::shared_ptr<Output>) override {}
+};
+
+TEST(PlinthTree, RefusesWhatItCannotRead) {
+  const boost::shared_ptr<ForeignCommand> command(new ForeignCommand);
+  ExpectLines(*command, {{{}, "hcli: a command declares no InputSpec\n", kFailure}});
+  command->spec = CallSpec::InputSpec::New();
+  ExpectLines(*command, {{{"--help"}, "hcli: a command's OutputSpec was not made by its New()\n", kFailure}});
 }
 
 TEST(PlinthTree, RefusesWhatItCannotHold) {

@@ -1,4 +1,6 @@
 // iscsi software get|set: the switch, and the initiator name that goes with it.
+#include <fstream>
+
 #include "host/Host.h"
 #include "support/Harness.h"
 
@@ -48,10 +50,15 @@ TEST_F(Software, FailuresTellTheReasonAndChangeNothing) {
   EXPECT_THAT(run.messages[0], testing::HasSubstr("nonsense"));
   EXPECT_EQ(NameFile(), "");
   EXPECT_EQ(host("iscsi software get").result, false);
-  Harness failing(
-      WithAnswers(kOff, R"({"operation": "HasSoftwareiScsiEnabled", "throw": "NodeCtlException"})"));
-  EXPECT_THAT(failing("iscsi software get").messages,
-              ElementsAre("Unable to get Software iSCSI information."));
+}
+
+TEST_F(Software, ANameFileThatCannotBeLookedAtIsNotTakenForNone) {
+  std::ofstream(root_.Path() + "/etc") << "no folder";
+  Harness host(R"({"adapters": [{"name": "hba0", "kind": "software", "capabilities": {
+      "Name And Alias Settable": true}}]})");
+  EXPECT_EQ(host("iscsi adapter set -A hba0 -n iqn.2026-11.org.example:x").status, 1);
+  EXPECT_THAT(host.trace.back(),
+              testing::HasSubstr("initiatorname.iscsi cannot be opened: Not a directory."));
 }
 
 TEST_F(Software, TheNameGivenLastHoldsFromTheNextStartOn) {

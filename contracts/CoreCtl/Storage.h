@@ -33,8 +33,8 @@ class StorageInfoImpl {
   ~StorageInfoImpl();
 
   /// The storage adapter @p name, iSCSI or not; null where there is none. The name is compared exactly. The
-  /// caller deletes it; it stays usable without this object. Every failure of this lookup is a
-  /// CoreCtl::Lib::CoreCtlException.
+  /// caller deletes it; it stays usable without this object. To front ends every failure of this lookup, of
+  /// whichever type, is an adapter that cannot be had.
   NodeCtl::Storage::ScsiInterface* GetScsiInterface(const std::string& name);
   /// All iSCSI adapters, in the host's order; none is no error. The caller deletes each element; an element
   /// may be null.

@@ -46,8 +46,6 @@ class Ipv6Address {
   std::string GetStringAddress() const;
   /// In network order.
   const std::array<std::uint8_t, 16>& GetBytes() const { return bytes_; }
-  /// True inside fe80::/10 (RFC 4291 section 2.5.6).
-  bool IsLinkLocal() const { return bytes_[0] == 0xfe && (bytes_[1] & 0xc0) == 0x80; }
   friend bool operator==(const Ipv6Address&, const Ipv6Address&) = default;
 
  private:

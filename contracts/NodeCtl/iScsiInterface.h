@@ -227,9 +227,10 @@ class iScsiInterface : public virtual ScsiInterface {
   // number is refused. A level that the adapter does not support, or that is none, is refused. Name and
   // secret have from 1 to 255 bytes, unless the level is Prohibited. Front ends clear an entry with name
   // "none", secret "none" and that level. Setting an entry leaves it to the marks chapInherited and
-  // mutualChapInherited of the session parameters whether it holds. A reading operation fills in name and
-  // level, of the entry that holds after inheritance; all else of @p chap, the secret too, stays as it came.
-  // Where none was ever set the name is "none" and the level Prohibited.
+  // mutualChapInherited of the session parameters whether it holds. Prohibiting CHAP clears the mutual entry
+  // of the same place with it, and mutual CHAP is refused where CHAP is prohibited. A reading operation fills
+  // in name and level, of the entry that holds after inheritance; all else of @p chap, the secret too, stays
+  // as it came. Where none was ever set the name is "none" and the level Prohibited.
   virtual void SetChapParameters(iScsiChapParameters chap, int direction) = 0;
   virtual void SetTargetChapParameters(StaticTarget target, iScsiChapParameters chap, int direction) = 0;
   virtual void SetSendTargetChapParameters(TargetAddress address, iScsiChapParameters chap,
@@ -267,12 +268,14 @@ class iScsiInterface : public virtual ScsiInterface {
   /// The MTU of the adapter in bytes.
   virtual int GetMtu() = 0;
 
-  // Whole parameter sets. What is read can be written back. A value that is changed to one out of its range,
-  // or where it is not settable, is refused with a text that tells key, value and range. Only current values
-  // and marks of @p parms count. Below the adapter a value with its mark of inheritance is not stored, and
-  // the parent's holds from then on; without the mark it is stored here. Of digests and CHAP entries the
-  // marks alone pass, and CHAP ones always take effect at once. The adapter has no parent: its marks are
-  // false, and ignored.
+  // Whole parameter sets. What is read can be written back; stored is what differs from what this object has
+  // handed out or stored last, so that a change that somebody else has made in between stays. A value that is
+  // changed to one out of its range, or where it is not settable, is refused with a text that tells key,
+  // value and range. Only current values and marks of @p parms count. Below the adapter a value with its mark
+  // of inheritance is not stored, and the parent's holds from then on; without the mark it is stored here. Of
+  // digests and CHAP entries the marks alone pass, and CHAP ones always take effect at once. Clearing one of
+  // CHAP makes the entry that was inherited the place's own, in the stead of any that it had, until another
+  // is set. The adapter has no parent: its marks are false, and ignored.
   virtual iScsiStatus SetAdapterParms(iScsiParms parms) = 0;
   virtual iScsiParms GetAdapterParms() = 0;
   virtual iScsiStatus SetTargetParms(StaticTarget target, iScsiParms parms) = 0;

@@ -73,8 +73,8 @@ class Command : public virtual NamespaceNode {
  protected:
   Command();
 
-  /// The formatter that shows the result unless the user names another: "simple", "table" or "json". Without
-  /// the call, and for a name that is none, it is "simple".
+  /// The formatter that shows the result unless the user names another, such as "table". Without the call,
+  /// and for a name that is none (a fault in a checked build), it is "simple".
   void SetDefaultOutputFormatter(const std::string& name);
   /// A setting of the formatter; a later call for @p key replaces an earlier one. "fields" or "fields:TYPE"
   /// is the fields to show, separated by commas, in order; "header:TYPE" the heading of each structure of the

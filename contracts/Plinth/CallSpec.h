@@ -136,8 +136,8 @@ class Output {
   Output& operator=(const Output&) = delete;
   virtual ~Output();
 
-  /// Shows @p text to the user at once, with a line break behind it where it ends in none. Any number of
-  /// texts may be reported, with or without a result.
+  /// Shows @p text to the user when the run has ended, with a line break behind it where it ends in none. Any
+  /// number of texts may be reported, with or without a result.
   virtual void ReportError(const std::string& text) = 0;
   /// Posts the result, shared with the caller; it fits the OutputSpec and is not null. Called at most once a
   /// run.

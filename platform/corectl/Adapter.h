@@ -5,6 +5,8 @@
 
 #include <CoreCtl/Storage.h>
 
+#include <map>
+
 #include "corectl/Operation.h"
 #include "host/Adapters.h"
 #include "host/Pending.h"
@@ -37,8 +39,11 @@ namespace Network = NodeCtl::Network;
 
 using host::Status;
 
-/// How many interface objects were handed out and are not deleted yet: for tests.
+#ifdef HCLI_CHECKED
+/// How many interface objects were handed out and are not deleted yet. The libraries that are installed have
+/// no such call.
 __attribute__((visibility("default"))) std::size_t LiveInterfaces();
+#endif
 
 /// The name of one adapter, and how operations on it run. Each interface object has one.
 class AdapterRef {
@@ -104,6 +109,9 @@ class OtherAdapter final : public ScsiInterface {
  private:
   AdapterRef ref_;
 };
+
+/// The parameters of places as a caller knows them: as they were last handed out to it, or stored by it.
+using GivenParms = std::map<std::string, iScsiParms>;
 
 /// An iSCSI adapter.
 class Adapter final : public CoreCtl::Storage::iScsiInterfaceImpl {
@@ -205,6 +213,7 @@ class Adapter final : public CoreCtl::Storage::iScsiInterfaceImpl {
   }
 
   AdapterRef ref_;
+  GivenParms given_;
 };
 
 }  // namespace corectl

@@ -9,13 +9,14 @@ namespace {
 
 void Require(const host::Object& adapter, std::string_view capability, const std::string& what) {
   if (adapter.record.GetBool("capabilities/" + std::string(capability))) return;
-  Deny("The adapter " + adapter.name + " takes no " + what + ": it lacks " + host::Quoted(capability) + ".");
+  Deny(Why::NotSupported,
+       "The adapter " + adapter.name + " takes no " + what + ": it lacks " + host::Quoted(capability) + ".");
 }
 
 /// Refuses an address of a form that the adapter does not take.
 void RequireAddressForm(const host::Object& adapter, const TargetAddress& address) {
   const std::string host = address.host.GetStringAddress();
-  if (host.empty()) Deny("The address has no host.");
+  if (host.empty()) Deny(Why::Invalid, "The address has no host.");
   const bool isIpv6 = address.host.GetFamily() == Network::AddressFamily::Ipv6;
   const std::string_view lacked = host::LackedFor(adapter.record, host);
   if (!lacked.empty()) Require(adapter, lacked, isIpv6 ? "IPv6 addresses" : "host names");
@@ -64,9 +65,11 @@ void Adapter::RemoveStaticTarget(StaticTarget target) {
   ref_.Change("RemoveStaticTarget", {PlaceText(target)}, [&](host::Tree& tree, const host::Object& adapter) {
     host::Object found = FindPlace(tree, adapter, target);
     if (!host::IsStatic(found.record)) {
-      Deny(PlaceText(target) + " is no static target: it was found through the " + "sendtarget " +
-           PortalText(found.record.GetString("sendTarget/host"), found.record.GetInt64("sendTarget/port")) +
-           ".");
+      Deny(Why::WrongState, PlaceText(target) + " is no static target: it was found through the " +
+                                "sendtarget " +
+                                PortalText(found.record.GetString("sendTarget/host"),
+                                           found.record.GetInt64("sendTarget/port")) +
+                                ".");
     }
     if (found.record.Has("sendTarget")) {
       found.record.Erase("static");

@@ -1,4 +1,5 @@
 #include "corectl/Adapter.h"
+#include "corectl/Members.h"
 #include "host/Formats.h"
 #include "host/Restart.h"
 
@@ -10,83 +11,82 @@ constexpr std::size_t kAliasLimit = 255;
 
 std::size_t liveInterfaces = 0;
 
-constexpr std::pair<const char*, std::string iScsiPhysicalHbaProperties::*> kPropertyTexts[] = {
-    {"properties/vendor", &iScsiPhysicalHbaProperties::vendor},
-    {"properties/model", &iScsiPhysicalHbaProperties::model},
-    {"properties/description", &iScsiPhysicalHbaProperties::description},
-    {"properties/serialNumber", &iScsiPhysicalHbaProperties::serialNumber},
-    {"properties/hardwareVersion", &iScsiPhysicalHbaProperties::hardwareVersion},
-    {"properties/asicVersion", &iScsiPhysicalHbaProperties::asicVersion},
-    {"properties/firmwareVersion", &iScsiPhysicalHbaProperties::firmwareVersion},
-    {"properties/optionRomVersion", &iScsiPhysicalHbaProperties::optionRomVersion},
-    {"properties/driverName", &iScsiPhysicalHbaProperties::driverName},
-    {"properties/driverVersion", &iScsiPhysicalHbaProperties::driverVersion},
+constexpr Member<iScsiPhysicalHbaProperties> kPropertyMembers[] = {
+    {"vendor", &iScsiPhysicalHbaProperties::vendor},
+    {"model", &iScsiPhysicalHbaProperties::model},
+    {"description", &iScsiPhysicalHbaProperties::description},
+    {"serialNumber", &iScsiPhysicalHbaProperties::serialNumber},
+    {"hardwareVersion", &iScsiPhysicalHbaProperties::hardwareVersion},
+    {"asicVersion", &iScsiPhysicalHbaProperties::asicVersion},
+    {"firmwareVersion", &iScsiPhysicalHbaProperties::firmwareVersion},
+    {"optionRomVersion", &iScsiPhysicalHbaProperties::optionRomVersion},
+    {"driverName", &iScsiPhysicalHbaProperties::driverName},
+    {"driverVersion", &iScsiPhysicalHbaProperties::driverVersion},
+    {"tcpProtocolSupported", &iScsiPhysicalHbaProperties::tcpProtocolSupported},
+    {"bidirectionalTransfersSupported", &iScsiPhysicalHbaProperties::bidirectionalTransfersSupported},
+    {"maximumCdbLength", &iScsiPhysicalHbaProperties::maximumCdbLength},
+    {"canBeNic", &iScsiPhysicalHbaProperties::canBeNic},
+    {"isNic", &iScsiPhysicalHbaProperties::isNic},
+    {"isInitiator", &iScsiPhysicalHbaProperties::isInitiator},
+    {"isTarget", &iScsiPhysicalHbaProperties::isTarget},
+    {"usingTcpOffloadEngine", &iScsiPhysicalHbaProperties::usingTcpOffloadEngine},
+    {"usingIscsiOffloadEngine", &iScsiPhysicalHbaProperties::usingIscsiOffloadEngine},
 };
 
-constexpr std::pair<const char*, ExtendedBool iScsiPhysicalHbaProperties::*> kPropertyBools[] = {
-    {"properties/bidirectionalTransfersSupported",
-     &iScsiPhysicalHbaProperties::bidirectionalTransfersSupported},
-    {"properties/canBeNic", &iScsiPhysicalHbaProperties::canBeNic},
-    {"properties/isNic", &iScsiPhysicalHbaProperties::isNic},
-    {"properties/isInitiator", &iScsiPhysicalHbaProperties::isInitiator},
-    {"properties/isTarget", &iScsiPhysicalHbaProperties::isTarget},
-    {"properties/usingTcpOffloadEngine", &iScsiPhysicalHbaProperties::usingTcpOffloadEngine},
-    {"properties/usingIscsiOffloadEngine", &iScsiPhysicalHbaProperties::usingIscsiOffloadEngine},
+constexpr Member<iScsiCapabilities> kCapabilityMembers[] = {
+    {"ISnS Settable", &iScsiCapabilities::iSnsSettable},
+    {"SLP Settable", &iScsiCapabilities::slpSettable},
+    {"Static Discovery Settable", &iScsiCapabilities::staticDiscoverySettable},
+    {"Sendtarget Discovery Settable", &iScsiCapabilities::sendTargetDiscoverySettable},
+    {"Authorization Method Settable", &iScsiCapabilities::authorizationMethodSettable},
+    {"CHAP Authorization Supported", &iScsiCapabilities::chapAuthorizationSupported},
+    {"SRP Authorization Supported", &iScsiCapabilities::srpAuthorizationSupported},
+    {"KRB5 Authorization Supported", &iScsiCapabilities::krb5AuthorizationSupported},
+    {"SPKM1 Authorization Supported", &iScsiCapabilities::spkm1AuthorizationSupported},
+    {"SPKM2 Authorization Supported", &iScsiCapabilities::spkm2AuthorizationSupported},
+    {"Mutual Authentication Supported", &iScsiCapabilities::mutualAuthenticationSupported},
+    {"Target Level Authentication Supported", &iScsiCapabilities::targetLevelAuthenticationSupported},
+    {"Target Level Mutual Authentication Supported",
+     &iScsiCapabilities::targetLevelMutualAuthenticationSupported},
+    {"Adapter Header Digest Supported", &iScsiCapabilities::adapterHeaderDigestSupported},
+    {"Target Level Header Digest Supported", &iScsiCapabilities::targetLevelHeaderDigestSupported},
+    {"Adapter Data Digest Supported", &iScsiCapabilities::adapterDataDigestSupported},
+    {"Target Level Data Digest Supported", &iScsiCapabilities::targetLevelDataDigestSupported},
+    {"ARP Redirect Settable", &iScsiCapabilities::arpRedirectSettable},
+    {"MTU Settable", &iScsiCapabilities::mtuSettable},
+    {"Delayed Ack Settable", &iScsiCapabilities::delayedAckSettable},
+    {"IPv6 Supported", &iScsiCapabilities::ipv6Supported},
+    {"DNS Based Address Supported", &iScsiCapabilities::dnsBasedAddressSupported},
+    {"Inheritance Supported", &iScsiCapabilities::inheritanceSupported},
+    {"IPv4 Enable Settable", &iScsiCapabilities::ipv4EnableSettable},
+    {"IP Configuration Method Settable", &iScsiCapabilities::ipConfigurationMethodSettable},
+    {"Subnet Mask Setttable", &iScsiCapabilities::subnetMaskSettable},
+    {"Default Gateway Settable", &iScsiCapabilities::defaultGatewaySettable},
+    {"IPv6 Enable Settable", &iScsiCapabilities::ipv6EnableSettable},
+    {"IPv6 Prefix Length Settable", &iScsiCapabilities::ipv6PrefixLengthSettable},
+    {"IPv6 DHCP Configuration Method Settable", &iScsiCapabilities::ipv6DhcpConfigurationMethodSettable},
+    {"IPv6 Linklocal Auto Configuration Method Settable",
+     &iScsiCapabilities::ipv6LinkLocalAutoConfigurationMethodSettable},
+    {"IPv6 Router Advertisement Configuration Method Settable",
+     &iScsiCapabilities::ipv6RouterAdvertisementConfigurationMethodSettable},
+    {"IPv6 Default Gateway Settable", &iScsiCapabilities::ipv6DefaultGatewaySettable},
+    {"Primary DNS Settable", &iScsiCapabilities::primaryDnsSettable},
+    {"Secondary DNS Settable", &iScsiCapabilities::secondaryDnsSettable},
+    {"Name And Alias Settable", &iScsiCapabilities::nameAndAliasSettable},
 };
-
-/// In the order of host::kCapabilities.
-constexpr bool iScsiCapabilities::*kCapabilityMembers[] = {
-    &iScsiCapabilities::iSnsSettable,
-    &iScsiCapabilities::slpSettable,
-    &iScsiCapabilities::staticDiscoverySettable,
-    &iScsiCapabilities::sendTargetDiscoverySettable,
-    &iScsiCapabilities::authorizationMethodSettable,
-    &iScsiCapabilities::chapAuthorizationSupported,
-    &iScsiCapabilities::srpAuthorizationSupported,
-    &iScsiCapabilities::krb5AuthorizationSupported,
-    &iScsiCapabilities::spkm1AuthorizationSupported,
-    &iScsiCapabilities::spkm2AuthorizationSupported,
-    &iScsiCapabilities::mutualAuthenticationSupported,
-    &iScsiCapabilities::targetLevelAuthenticationSupported,
-    &iScsiCapabilities::targetLevelMutualAuthenticationSupported,
-    &iScsiCapabilities::adapterHeaderDigestSupported,
-    &iScsiCapabilities::targetLevelHeaderDigestSupported,
-    &iScsiCapabilities::adapterDataDigestSupported,
-    &iScsiCapabilities::targetLevelDataDigestSupported,
-    &iScsiCapabilities::arpRedirectSettable,
-    &iScsiCapabilities::mtuSettable,
-    &iScsiCapabilities::delayedAckSettable,
-    &iScsiCapabilities::ipv6Supported,
-    &iScsiCapabilities::dnsBasedAddressSupported,
-    &iScsiCapabilities::inheritanceSupported,
-    &iScsiCapabilities::ipv4EnableSettable,
-    &iScsiCapabilities::ipConfigurationMethodSettable,
-    &iScsiCapabilities::subnetMaskSettable,
-    &iScsiCapabilities::defaultGatewaySettable,
-    &iScsiCapabilities::ipv6EnableSettable,
-    &iScsiCapabilities::ipv6PrefixLengthSettable,
-    &iScsiCapabilities::ipv6DhcpConfigurationMethodSettable,
-    &iScsiCapabilities::ipv6LinkLocalAutoConfigurationMethodSettable,
-    &iScsiCapabilities::ipv6RouterAdvertisementConfigurationMethodSettable,
-    &iScsiCapabilities::ipv6DefaultGatewaySettable,
-    &iScsiCapabilities::primaryDnsSettable,
-    &iScsiCapabilities::secondaryDnsSettable,
-    &iScsiCapabilities::nameAndAliasSettable,
-};
-static_assert(std::size(kCapabilityMembers) == std::size(host::kCapabilities));
-
-std::string CapabilityPath(std::string_view name) { return "capabilities/" + std::string(name); }
 
 /// Refuses a new name or alias where the adapter has none to set.
 void RequireNameSettable(const host::Object& adapter) {
-  if (adapter.record.GetBool(CapabilityPath("Name And Alias Settable"))) return;
-  throw host::Error(host::Error::Kind::Refused, "The name and the alias of the adapter " +
-                                                    host::Quoted(adapter.name) + " are not settable.");
+  if (adapter.record.GetBool("capabilities/Name And Alias Settable")) return;
+  throw host::Error(host::Error::Kind::NotSettable, "The name and the alias of the adapter " +
+                                                        host::Quoted(adapter.name) + " are not settable.");
 }
 
 }  // namespace
 
+#ifdef HCLI_CHECKED
 std::size_t LiveInterfaces() { return liveInterfaces; }
+#endif
 
 AdapterRef::AdapterRef(std::string name) : name_(std::move(name)) { ++liveInterfaces; }
 AdapterRef::~AdapterRef() { --liveInterfaces; }
@@ -122,14 +122,13 @@ bool Adapter::IsSoftwareOrDependent() {
 void Adapter::ResetAdapter() {
   ref_.Change("ResetAdapter", {},
               [](host::Tree& tree, const host::Object& adapter) { host::Reset(tree, adapter); });
+  host::CallLog::Current().WasReset(ref_.Name());
 }
 
 iScsiCapabilities Adapter::GetCapabilities() {
   return ref_.Read("GetCapabilities", [](host::Tree&, const host::Object& adapter) {
     iScsiCapabilities capabilities;
-    for (std::size_t i = 0; i < std::size(kCapabilityMembers); ++i) {
-      capabilities.*kCapabilityMembers[i] = adapter.record.GetBool(CapabilityPath(host::kCapabilities[i]));
-    }
+    Fill(capabilities, kCapabilityMembers, adapter.record.GetRecord("capabilities"));
     return capabilities;
   });
 }
@@ -137,12 +136,7 @@ iScsiCapabilities Adapter::GetCapabilities() {
 iScsiPhysicalHbaProperties Adapter::GetPhysicalHbaProperties() {
   return ref_.Read("GetPhysicalHbaProperties", [](host::Tree&, const host::Object& adapter) {
     iScsiPhysicalHbaProperties properties;
-    for (const auto& [path, member] : kPropertyTexts) properties.*member = adapter.record.GetString(path);
-    for (const auto& [path, member] : kPropertyBools) {
-      properties.*member = static_cast<ExtendedBool>(adapter.record.GetWord(path, host::kExtendedBools));
-    }
-    properties.tcpProtocolSupported = adapter.record.GetBool("properties/tcpProtocolSupported");
-    properties.maximumCdbLength = adapter.record.GetInt("properties/maximumCdbLength");
+    Fill(properties, kPropertyMembers, adapter.record.GetRecord("properties"));
     return properties;
   });
 }
@@ -164,8 +158,8 @@ Adapter::iScsiStatus Adapter::SetInitiatorAlias(const std::string& alias) {
   return Configure("SetInitiatorAlias", {alias}, Setting::Identity, [&](host::Object& adapter) {
     RequireNameSettable(adapter);
     if (alias.size() > kAliasLimit) {
-      throw host::Error(host::Error::Kind::Refused, "The alias has " + std::to_string(alias.size()) +
-                                                        " bytes, and at most 255 are allowed.");
+      throw host::Error(host::Error::Kind::OutOfRange, "The alias has " + std::to_string(alias.size()) +
+                                                           " bytes, and at most 255 are allowed.");
     }
     adapter.record.Set("alias", alias);
   });

@@ -29,10 +29,10 @@ iSnsParms ParmsAt(const host::Record& record, const std::string& prefix) {
 void StoreValue(host::Record& record, const std::string& prefix, const iSnsParms& parms) {
   const iSnsParms before = ParmsAt(record, prefix);
   if (parms.current == before.current) return;
-  if (!before.valid || !before.settable) Deny("PollInterval is not settable.");
+  if (!before.valid || !before.settable) Deny(Why::NotSettable, "PollInterval is not settable.");
   if (parms.current < before.min || parms.current > before.max) {
-    Deny("PollInterval " + std::to_string(parms.current) + " is not from " + std::to_string(before.min) +
-         " to " + std::to_string(before.max) + ".");
+    Deny(Why::OutOfRange, "PollInterval " + std::to_string(parms.current) + " is not from " +
+                              std::to_string(before.min) + " to " + std::to_string(before.max) + ".");
   }
   record.Set(Path(prefix, "current"), parms.current);
 }
@@ -48,7 +48,7 @@ iSnsParms AdapterParms(const host::Object& adapter) {
 host::Record ServerRecord(const iSnsConfig& config) {
   const auto method = static_cast<std::size_t>(config.method);
   if (method >= std::size(host::kIsnsMethods))
-    Deny("There is no iSNS discovery method " + std::to_string(method) + ".");
+    Deny(Why::Invalid, "There is no iSNS discovery method " + std::to_string(method) + ".");
   host::Record record;
   record.Set("method", host::kIsnsMethods[method]);
   record.Set("address", config.address.GetStringAddress());
@@ -66,14 +66,15 @@ std::optional<host::Object> LookupServer(host::Tree& tree, const host::Object& a
 host::Object FindServer(host::Tree& tree, const host::Object& adapter, const iSnsConfig& config) {
   auto server = LookupServer(tree, adapter, config);
   if (!server) {
-    Deny("The adapter " + Quoted(adapter.name) + " has no iSNS server " + Quoted(ServerText(config)) + ".");
+    Deny(Why::NotFound,
+         "The adapter " + Quoted(adapter.name) + " has no iSNS server " + Quoted(ServerText(config)) + ".");
   }
   return *std::move(server);
 }
 
 void RequireIsnsSettable(const host::Object& adapter) {
   if (adapter.record.GetBool("capabilities/ISnS Settable")) return;
-  Deny("The iSNS servers of the adapter " + Quoted(adapter.name) + " are not settable.");
+  Deny(Why::NotSettable, "The iSNS servers of the adapter " + Quoted(adapter.name) + " are not settable.");
 }
 
 }  // namespace
@@ -82,10 +83,11 @@ void Adapter::AddIsnsConfig(const iSnsConfig& config) {
   ref_.Change("AddIsnsConfig", {ServerText(config)}, [&](host::Tree& tree, const host::Object& adapter) {
     RequireIsnsSettable(adapter);
     if (LookupServer(tree, adapter, config)) {
-      Deny("The adapter " + Quoted(adapter.name) + " has the iSNS server " + Quoted(ServerText(config)) +
-           " already.");
+      Deny(Why::Exists, "The adapter " + Quoted(adapter.name) + " has the iSNS server " +
+                            Quoted(ServerText(config)) + " already.");
     }
-    if (config.method != iSnsDiscoveryMethod::Static) Deny("Only static iSNS servers can be added.");
+    if (config.method != iSnsDiscoveryMethod::Static)
+      Deny(Why::NotSupported, "Only static iSNS servers can be added.");
     tree.InsertNew(adapter.id, Kind::IsnsServer, ServerRecord(config));
   });
 }

@@ -35,29 +35,29 @@ constexpr char kAddresses[] = "network/ipv6Addresses";
 /// Refuses a change of @p what where the adapter lacks the capability to set it.
 void RequireSettable(const host::Object& adapter, const char* capability, const char* what) {
   if (adapter.record.GetBool(std::string("capabilities/") + capability)) return;
-  Deny(std::string(what) + " of the adapter " + Quoted(adapter.name) + " is not settable.");
+  Deny(Why::NotSettable, std::string(what) + " of the adapter " + Quoted(adapter.name) + " is not settable.");
 }
 
 void RequireIpv6(const host::Object& adapter) {
   if (adapter.record.GetBool("capabilities/IPv6 Supported")) return;
-  Deny("The adapter " + Quoted(adapter.name) + " does not support IPv6.");
+  Deny(Why::NotSupported, "The adapter " + Quoted(adapter.name) + " does not support IPv6.");
 }
 
 void RequireStaticIpv4(const host::Object& adapter, const char* what) {
   if (!adapter.record.GetBool("network/useDhcpv4")) return;
-  Deny(std::string(what) + " of the adapter " + Quoted(adapter.name) +
-       " comes from DHCP. Switch DHCPv4 off first.");
+  Deny(Why::WrongState, std::string(what) + " of the adapter " + Quoted(adapter.name) +
+                            " comes from DHCP. Switch DHCPv4 off first.");
 }
 
 host::Ipv4Bytes RequireIpv4(const std::string& text) {
   const auto bytes = host::ParseIpv4(text);
-  if (!bytes) Deny(Quoted(text) + " is not an IPv4 address.");
+  if (!bytes) Deny(Why::Invalid, Quoted(text) + " is not an IPv4 address.");
   return *bytes;
 }
 
 host::Ipv6Bytes RequireIpv6Address(const std::string& text) {
   const auto bytes = host::ParseIpv6(text);
-  if (!bytes) Deny(Quoted(text) + " is not an IPv6 address.");
+  if (!bytes) Deny(Why::Invalid, Quoted(text) + " is not an IPv6 address.");
   return *bytes;
 }
 
@@ -73,11 +73,13 @@ bool IsLinkLocal(const host::Ipv6Bytes& bytes) { return bytes[0] == 0xfe && (byt
 
 /// Refuses what no single interface can have as its own address, or as that of a neighbour.
 void RequireUnicast(const std::string& text, const host::Ipv4Bytes& bytes) {
-  if (bytes[0] == 0 || bytes[0] == 127 || bytes[0] >= 224) Deny(Quoted(text) + " is not a unicast address.");
+  if (bytes[0] == 0 || bytes[0] == 127 || bytes[0] >= 224)
+    Deny(Why::Invalid, Quoted(text) + " is not a unicast address.");
 }
 void RequireUnicast(const std::string& text, const host::Ipv6Bytes& bytes) {
   const bool tiny = std::all_of(bytes.begin(), bytes.end() - 1, [](int byte) { return byte == 0; });
-  if (bytes[0] == 0xff || (tiny && bytes[15] <= 1)) Deny(Quoted(text) + " is not a unicast address.");
+  if (bytes[0] == 0xff || (tiny && bytes[15] <= 1))
+    Deny(Why::Invalid, Quoted(text) + " is not a unicast address.");
 }
 
 /// An IPv6 address of the adapter, by its place in the list.
@@ -100,12 +102,13 @@ void AddIpv6Address(host::Record& record, const host::Record& inEffect, const st
   if (const std::string place = FindIpv6Address(record, bytes); !place.empty()) {
     const bool waits = FindIpv6Address(inEffect, bytes).empty();
     if (waits && record.GetInt(place + "/prefixLength") == prefixLength) return;
-    Deny("The adapter has the address " + Quoted(text) + " already.");
+    Deny(Why::Exists, "The adapter has the address " + Quoted(text) + " already.");
   }
   const bool linkLocal = IsLinkLocal(bytes);
   if (record.GetBool(linkLocal ? "network/useLinkLocalAutoConfiguration"
                                : "network/useRouterAdvertisement")) {
-    Deny(Quoted(text) + (linkLocal ? " is link-local, and that address is configured automatically."
+    Deny(Why::WrongState,
+         Quoted(text) + (linkLocal ? " is link-local, and that address is configured automatically."
                                    : " is routable, and those addresses come from router advertisements."));
   }
   int routableStatic = 0;
@@ -113,13 +116,14 @@ void AddIpv6Address(host::Record& record, const host::Record& inEffect, const st
     const std::string& other = record.GetString(AddressPath(i) + "/address");
     const host::Ipv6Bytes otherBytes = RequireIpv6Address(other);
     if (linkLocal && IsLinkLocal(otherBytes)) {
-      Deny("The adapter has the link-local address " + Quoted(other) + " already, and takes only one.");
+      Deny(Why::TooMany,
+           "The adapter has the link-local address " + Quoted(other) + " already, and takes only one.");
     }
     if (!IsLinkLocal(otherBytes) && record.GetInt(AddressPath(i) + "/type") == 0) ++routableStatic;
   }
   const int limit = record.GetInt("network/ipv6MaxStaticAddresses");
   if (!linkLocal && limit != -1 && routableStatic >= limit) {
-    Deny("The adapter takes at most " + std::to_string(limit) + " static routable addresses.");
+    Deny(Why::TooMany, "The adapter takes at most " + std::to_string(limit) + " static routable addresses.");
   }
   host::Record added;
   added.Set("address", host::FormatIpv6(bytes));
@@ -133,11 +137,11 @@ void RemoveIpv6Address(host::Record& record, const host::Record& inEffect, const
   const std::string configured = FindIpv6Address(record, bytes);
   const host::Record& known = configured.empty() ? inEffect : record;
   const std::string place = FindIpv6Address(known, bytes);
-  if (place.empty()) Deny("The adapter does not have the address " + Quoted(text) + ".");
+  if (place.empty()) Deny(Why::NotFound, "The adapter does not have the address " + Quoted(text) + ".");
   const int length = known.GetInt(place + "/prefixLength");
   if (length != prefixLength) {
-    Deny("The prefix of the address " + Quoted(text) + " has " + std::to_string(length) + " bits, not " +
-         std::to_string(prefixLength) + ".");
+    Deny(Why::NotFound, "The prefix of the address " + Quoted(text) + " has " + std::to_string(length) +
+                            " bits, not " + std::to_string(prefixLength) + ".");
   }
   if (!configured.empty()) record.Erase(configured);
 }
@@ -170,7 +174,7 @@ void SetDnsServer(host::Object& adapter, const DnsServer& server, const std::str
   if (adapter.record.GetString(server.path) == address) return;
   RequireSettable(adapter, server.capability, server.what);
   if (!address.empty() && !host::ParseIpv4(address) && !host::ParseIpv6(address)) {
-    Deny(Quoted(address) + " is not an IP address.");
+    Deny(Why::Invalid, Quoted(address) + " is not an IP address.");
   }
   adapter.record.Set(server.path, address);
 }
@@ -216,7 +220,8 @@ Adapter::iScsiStatus Adapter::SetIpv4SubnetMask(const std::string& mask) {
     RequireSettable(adapter, "Subnet Mask Setttable", "The subnet mask");
     RequireStaticIpv4(adapter, "The subnet mask");
     if (!IsMask(Number(RequireIpv4(mask)))) {
-      Deny(Quoted(mask) + " is not a subnet mask: its one bits must stand in front of its zero bits.");
+      Deny(Why::Invalid,
+           Quoted(mask) + " is not a subnet mask: its one bits must stand in front of its zero bits.");
     }
     adapter.record.Set("network/ipv4Netmask", mask);
   });
@@ -233,8 +238,8 @@ Adapter::iScsiStatus Adapter::SetIpv4Gateway(const Network::Ipv4Address& gateway
       const std::string& netmask = adapter.record.GetString("network/ipv4Netmask");
       const std::uint32_t mask = Number(RequireIpv4(netmask));
       if (mask == 0 || ((Number(gateway.GetBytes()) ^ Number(RequireIpv4(address))) & mask) != 0) {
-        Deny("The gateway " + Quoted(text) + " is not in the subnet of the address " + Quoted(address) +
-             " with the mask " + Quoted(netmask) + ".");
+        Deny(Why::WrongState, "The gateway " + Quoted(text) + " is not in the subnet of the address " +
+                                  Quoted(address) + " with the mask " + Quoted(netmask) + ".");
       }
     }
     adapter.record.Set("network/gateway", text);
@@ -263,14 +268,15 @@ Adapter::iScsiStatus Adapter::SetIpv6Address(const std::string& address, int pre
   const auto set = [&](host::Object& adapter, const host::Object& inEffect) {
     RequireIpv6(adapter);
     if (!adapter.record.GetBool("network/ipv6Enabled")) {
-      Deny("IPv6 is disabled on the adapter " + Quoted(adapter.name) + ".");
+      Deny(Why::WrongState, "IPv6 is disabled on the adapter " + Quoted(adapter.name) + ".");
     }
     const host::Ipv6Bytes bytes = RequireIpv6Address(address);
     const int fixedLength = adapter.record.GetInt("network/ipv6PrefixLength");
     if (prefixLength < 0 || prefixLength > 128 || (add && fixedLength != -1 && prefixLength != fixedLength)) {
-      Deny("The prefix length " + std::to_string(prefixLength) + " is not " +
-           (fixedLength == -1 ? "from 0 to 128."
-                              : std::to_string(fixedLength) + ", the only one of the adapter."));
+      Deny(Why::OutOfRange,
+           "The prefix length " + std::to_string(prefixLength) + " is not " +
+               (fixedLength == -1 ? "from 0 to 128."
+                                  : std::to_string(fixedLength) + ", the only one of the adapter."));
     }
     (add ? AddIpv6Address : RemoveIpv6Address)(adapter.record, inEffect.record, address, bytes, prefixLength);
   };
@@ -281,7 +287,7 @@ Adapter::iScsiStatus Adapter::SetIpv6ConfigMethod(const int& method, bool enable
   return Configure("SetIpv6ConfigMethod", {method, enable}, Setting::Network, [&](host::Object& adapter) {
     RequireIpv6(adapter);
     if (method < 1 || method > static_cast<int>(std::size(kConfigMethods))) {
-      Deny("There is no IPv6 configuration method " + std::to_string(method) + ".");
+      Deny(Why::Invalid, "There is no IPv6 configuration method " + std::to_string(method) + ".");
     }
     const ConfigMethod& known = kConfigMethods[method - 1];
     RequireSettable(adapter, known.capability, known.what);
@@ -304,7 +310,7 @@ Adapter::iScsiStatus Adapter::SetIpVersionEnabled(int version, bool enable) {
       RequireIpv6(adapter);
       RequireSettable(adapter, "IPv6 Enable Settable", "Use of IPv6");
     } else {
-      Deny("There is no IP version " + std::to_string(version) + ".");
+      Deny(Why::Invalid, "There is no IP version " + std::to_string(version) + ".");
     }
     adapter.record.Set(version == 4 ? "network/ipv4Enabled" : "network/ipv6Enabled", enable);
   });
@@ -329,8 +335,8 @@ Adapter::iScsiStatus Adapter::SetMtu(int mtu) {
     const int min = adapter.record.GetInt("network/mtuMin");
     const int max = adapter.record.GetInt("network/mtuMax");
     if (mtu < min || mtu > max) {
-      Deny("The MTU " + std::to_string(mtu) + " is not from " + std::to_string(min) + " to " +
-           std::to_string(max) + ".");
+      Deny(Why::OutOfRange, "The MTU " + std::to_string(mtu) + " is not from " + std::to_string(min) +
+                                " to " + std::to_string(max) + ".");
     }
     adapter.record.Set("network/mtu", mtu);
   });

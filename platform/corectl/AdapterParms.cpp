@@ -4,18 +4,33 @@ namespace corectl {
 
 namespace {
 
+/// The key of a place in GivenParms; the adapter's is empty.
 template <class... Key>
-iScsiParms GetParms(const AdapterRef& adapter, host::Operation operation, const Key&... key) {
-  return adapter.Read(operation, {host::Argument(PlaceText(key))...},
-                      OnLevel([](const Level& level) { return level.GetParms(); }, key...));
+std::string PlaceOf(const Key&... key) {
+  return (std::string() + ... + PlaceText(key));
 }
 
 template <class... Key>
-Adapter::iScsiStatus SetParms(const AdapterRef& adapter, host::Operation operation, const iScsiParms& parms,
-                              const Key&... key) {
-  const auto set = [&](Level& level) { return level.SetParms(parms); };
-  return static_cast<Adapter::iScsiStatus>(adapter.Change(
-      operation, {host::Argument(PlaceText(key))..., ShownParms(parms)}, OnLevel(set, key...)));
+iScsiParms GetParms(const AdapterRef& adapter, host::Operation operation, GivenParms& given,
+                    const Key&... key) {
+  iScsiParms parms = adapter.Read(operation, {host::Argument(PlaceText(key))...},
+                                  OnLevel([](const Level& level) { return level.GetParms(); }, key...));
+  given[PlaceOf(key...)] = parms;
+  return parms;
+}
+
+template <class... Key>
+Adapter::iScsiStatus SetParms(const AdapterRef& adapter, host::Operation operation, GivenParms& given,
+                              const iScsiParms& parms, const Key&... key) {
+  const std::string place = PlaceOf(key...);
+  const auto known = given.find(place);
+  const auto set = [&](Level& level) {
+    return level.SetParms(parms, known == given.end() ? level.GetParms() : known->second);
+  };
+  const Status status =
+      adapter.Change(operation, {host::Argument(PlaceText(key))..., ShownParms(parms)}, OnLevel(set, key...));
+  if (status != Status::NotSupported) given[place] = parms;
+  return static_cast<Adapter::iScsiStatus>(status);
 }
 
 template <class... Key>
@@ -69,18 +84,20 @@ iScsiDigestType Adapter::GetSendTargetDataDigest(TargetAddress address) {
 }
 
 Adapter::iScsiStatus Adapter::SetAdapterParms(iScsiParms parms) {
-  return SetParms(ref_, "SetAdapterParms", parms);
+  return SetParms(ref_, "SetAdapterParms", given_, parms);
 }
-iScsiParms Adapter::GetAdapterParms() { return GetParms(ref_, "GetAdapterParms"); }
+iScsiParms Adapter::GetAdapterParms() { return GetParms(ref_, "GetAdapterParms", given_); }
 Adapter::iScsiStatus Adapter::SetTargetParms(StaticTarget target, iScsiParms parms) {
-  return SetParms(ref_, "SetTargetParms", parms, target);
+  return SetParms(ref_, "SetTargetParms", given_, parms, target);
 }
-iScsiParms Adapter::GetTargetParms(StaticTarget target) { return GetParms(ref_, "GetTargetParms", target); }
+iScsiParms Adapter::GetTargetParms(StaticTarget target) {
+  return GetParms(ref_, "GetTargetParms", given_, target);
+}
 Adapter::iScsiStatus Adapter::SetSendTargetParms(TargetAddress address, iScsiParms parms) {
-  return SetParms(ref_, "SetSendTargetParms", parms, address);
+  return SetParms(ref_, "SetSendTargetParms", given_, parms, address);
 }
 iScsiParms Adapter::GetSendTargetParms(TargetAddress address) {
-  return GetParms(ref_, "GetSendTargetParms", address);
+  return GetParms(ref_, "GetSendTargetParms", given_, address);
 }
 
 }  // namespace corectl

@@ -52,7 +52,8 @@ constexpr Member<iScsiPnpProperties> kPhysicalMembers[] = {
 /// Refuses as an adapter without the call @p call does.
 void RequireCall(const host::Object& adapter, const char* supported, const char* call) {
   if (adapter.record.GetBool(supported)) return;
-  Deny(std::string("iScsiLibException: status(80000001): Not supported; Message= ") + call);
+  Deny(Why::NotSupported,
+       std::string("iScsiLibException: status(80000001): Not supported; Message= ") + call);
 }
 void RequireNicProperties(const host::Object& adapter) {
   RequireCall(adapter, "network/nicPropertiesSupported", "IMA_TSR_GetNicProperties");
@@ -98,7 +99,8 @@ void Adapter::GetNicProperties(iScsiNicProperties& nic, std::vector<iScsiNicProp
         if (tree.Find(host::kRoot, Kind::Nic, name)) return NicOf(tree, name);
         const auto portal = tree.Find(adapter.id, Kind::LogicalPortal, name);
         if (!portal)
-          Deny("The adapter " + Quoted(adapter.name) + " does not know the NIC " + Quoted(name) + ".");
+          Deny(Why::NotFound,
+               "The adapter " + Quoted(adapter.name) + " does not know the NIC " + Quoted(name) + ".");
         iScsiNicProperties properties;
         properties.name = name;
         properties.mac = MacAt(portal->record, "mac");
@@ -140,18 +142,20 @@ void Adapter::GetLogicalNetworkPortals(std::vector<iScsiLnpProperties>& portals)
 void Adapter::BindHostnic(const std::string& nic, bool force) {
   ref_.Change("BindHostnic", {nic, force}, [&](host::Tree& tree, const host::Object& adapter) {
     if (adapter.record.GetString("kind") == "independent") {
-      Deny("The adapter " + Quoted(adapter.name) + " has ports of its own, and takes no host NIC.");
+      Deny(Why::NotSupported,
+           "The adapter " + Quoted(adapter.name) + " has ports of its own, and takes no host NIC.");
     }
     const auto found = tree.Find(host::kRoot, Kind::Nic, nic);
-    if (!found) Deny("The host has no NIC " + Quoted(nic) + ".");
+    if (!found) Deny(Why::NotFound, "The host has no NIC " + Quoted(nic) + ".");
     if (!force && ComplianceOf(found->record) != iScsiPortErrorCodes::Compliant) {
       std::string reason = found->record.GetString("nonCompliantMessage");
       const std::string& remedy = found->record.GetString("nonCompliantRemedy");
       if (!remedy.empty()) reason += (reason.ends_with('.') ? " " : ". ") + remedy;
-      Deny("The NIC " + Quoted(nic) + " is not compliant: " + reason);
+      Deny(Why::WrongState, "The NIC " + Quoted(nic) + " is not compliant: " + reason);
     }
     if (tree.Find(adapter.id, Kind::NetworkPortal, nic)) {
-      Deny("The NIC " + Quoted(nic) + " is bound to the adapter " + Quoted(adapter.name) + " already.");
+      Deny(Why::Exists,
+           "The NIC " + Quoted(nic) + " is bound to the adapter " + Quoted(adapter.name) + " already.");
     }
     host::Record portal;
     portal.Set("nic", nic);
@@ -163,10 +167,11 @@ void Adapter::UnbindHostnic(const std::string& nic, bool force) {
   ref_.Change("UnbindHostnic", {nic, force}, [&](host::Tree& tree, const host::Object& adapter) {
     const auto portal = tree.Find(adapter.id, Kind::NetworkPortal, nic);
     if (!portal)
-      Deny("The NIC " + Quoted(nic) + " is not bound to the adapter " + Quoted(adapter.name) + ".");
+      Deny(Why::NotFound,
+           "The NIC " + Quoted(nic) + " is not bound to the adapter " + Quoted(adapter.name) + ".");
     const std::vector<host::Object> sessions = host::SessionsOver(tree, adapter, nic);
     if (!force && (!sessions.empty() || host::IsDescribedAsUsed(*portal))) {
-      Deny("Active sessions use the NIC " + Quoted(nic) + ".");
+      Deny(Why::InUse, "Active sessions use the NIC " + Quoted(nic) + ".");
     }
     for (const host::Object& session : sessions) host::LogoutSession(tree, session);
     tree.Remove(portal->id);

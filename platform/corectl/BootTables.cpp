@@ -83,15 +83,16 @@ constexpr int kChapTypes = 3;
 Boot ReadBoot(host::Tree& tree) {
   Boot boot{.table = ReadTable(tree, host::kBootTableNames[0]), .target = {}};
   const iScsiBootTable& table = boot.table;
-  if (table.GetEnabled() == 0) Deny("The host has no primary boot table that is enabled.");
+  if (table.GetEnabled() == 0) Deny(Why::NotFound, "The host has no primary boot table that is enabled.");
   RequireInitiatorName(table.GetTargetName());
   const Network::HostAddress server(table.GetTargetIP());
   if (server.GetFamily() == Network::AddressFamily::Name) {
-    Deny("The boot table's target address " + host::Quoted(table.GetTargetIP()) + " is not an IP address.");
+    Deny(Why::Invalid,
+         "The boot table's target address " + host::Quoted(table.GetTargetIP()) + " is not an IP address.");
   }
   if (table.GetChapType() < 0 || table.GetChapType() >= kChapTypes) {
-    Deny("The boot table's CHAP type " + std::to_string(table.GetChapType()) + " is not from 0 to " +
-         std::to_string(kChapTypes - 1) + ".");
+    Deny(Why::Invalid, "The boot table's CHAP type " + std::to_string(table.GetChapType()) +
+                           " is not from 0 to " + std::to_string(kChapTypes - 1) + ".");
   }
   if (table.GetChapType() > 0) {
     RequireChapEntry(table.GetChapName(), table.GetChapPwd(), "The boot table's CHAP");
@@ -195,8 +196,9 @@ void StorageInfoImpl::MountiScsiBootLun(bool addTarget, bool login) {
                   [&](const host::Object& adapter) { return !corectl::IsEligible(tree, adapter, boot); });
     if (adapters.empty()) {
       corectl::Deny(
+          corectl::Why::NotFound,
           "No dependent adapter that is online can take the boot target " + corectl::PlaceText(boot.target) +
-          (boot.table.GetMacAddress().empty() ? "." : " of the NIC " + boot.table.GetMacAddress() + "."));
+              (boot.table.GetMacAddress().empty() ? "." : " of the NIC " + boot.table.GetMacAddress() + "."));
     }
     for (const host::Object& adapter : adapters) {
       if (!addTarget) continue;

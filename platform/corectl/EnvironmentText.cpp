@@ -14,7 +14,7 @@ constexpr std::string_view kNeedNoQuotes =
     "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789_-.,:/@%+=";
 constexpr std::string_view kIdentifier = "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ_0123456789";
 
-[[noreturn]] void Refuse(const std::string& text) { throw host::Error(host::Error::Kind::Refused, text); }
+[[noreturn]] void Refuse(const std::string& text) { throw host::Error(host::Error::Kind::Invalid, text); }
 
 std::size_t IdentifierLength(std::string_view text) {
   if (text.empty() || (text[0] >= '0' && text[0] <= '9')) return 0;
@@ -69,8 +69,9 @@ std::string InQuotes(const std::string& value) {
 
 EnvironmentText::Line EnvironmentText::ParseLine(std::string_view text, std::size_t number) {
   const auto refuse = [number](const char* what) {
-    Refuse("line " + std::to_string(number) + ": " + what +
-           ", expected NAME=VALUE, a comment or an empty line");
+    throw host::Error(
+        host::Error::Kind::DamagedFile,
+        "line " + std::to_string(number) + ": " + what + ", expected NAME=VALUE, a comment or an empty line");
   };
   Line line;
   std::size_t begin = std::min(text.find_first_not_of(kBlanks), text.size());

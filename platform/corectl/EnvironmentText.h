@@ -11,7 +11,7 @@ namespace corectl {
 class EnvironmentText {
  public:
   /// Takes in a whole file. A line that is no comment, not empty and no assignment is a host::Error
-  /// (Refused), and the object then stays as it was.
+  /// (DamagedFile), and the object then stays as it was.
   void Parse(std::string_view text);
   /// Replaces the value of every assignment to @p name, or adds one at the end. Refuses, as a host::Error, a
   /// name that is no shell identifier and a value that no line can hold.

@@ -3,6 +3,7 @@
 #include "corectl/EnvironmentText.h"
 #include "corectl/Operation.h"
 #include "host/Files.h"
+#include "host/Rehearsal.h"
 
 namespace CoreCtl::Util {
 
@@ -43,6 +44,9 @@ void EnvironmentVarFile::Save() {
     const std::string path = host::HostPath(state_->path);
     struct stat old;
     const bool exists = host::IsRegularFile("The file", path, old);
+    if (host::Rehearsal* rehearsal = host::Rehearsal::Current()) {
+      return rehearsal->WriteFile(path, state_->text.Text());
+    }
     host::MakeFoldersFor(path);
     host::NewFile file(path);
     file.Write(state_->text.Text());

@@ -1,9 +1,14 @@
 #include <CoreCtl/Exception.h>
 
+#include "host/CallLog.h"
+
 namespace NodeCtl::Lib {
 
 NodeCtlException::NodeCtlException(std::string message, NoticeMessage notice)
-    : message_(std::move(message)), notice_(std::move(notice)) {}
+    : message_(std::move(message)), notice_(std::move(notice)) {
+  // Front ends make them too, for values that they cannot convert.
+  host::CallLog::Current().Refused(message_);
+}
 NodeCtlException::NodeCtlException(const NodeCtlException&) = default;
 NodeCtlException& NodeCtlException::operator=(const NodeCtlException&) = default;
 NodeCtlException::~NodeCtlException() = default;

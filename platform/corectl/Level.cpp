@@ -21,51 +21,54 @@ using NodeCtl::Storage::iScsiIntegerParm;
 constexpr std::size_t kCount = std::size(host::kParameters);
 
 /// Where a parameter stands in the contract's record.
-struct Member {
+struct Parm {
+  std::string_view name;
   std::variant<iScsiIntegerParm<std::int32_t> iScsiParms::*, iScsiIntegerParm<std::int64_t> iScsiParms::*,
                iScsiBoolParm iScsiParms::*>
       value;
   bool iScsiParms::*inherited;
 };
 
-/// In the order of host::kParameters.
-constexpr Member kMembers[kCount] = {
-    {&iScsiParms::errorRecoveryLevel, &iScsiParms::errorRecoveryLevelInherited},
-    {&iScsiParms::initialLoginRetryMax, &iScsiParms::initialLoginRetryMaxInherited},
-    {&iScsiParms::initialR2T, &iScsiParms::initialR2TInherited},
-    {&iScsiParms::firstBurstLength, &iScsiParms::firstBurstLengthInherited},
-    {&iScsiParms::maxBurstLength, &iScsiParms::maxBurstLengthInherited},
-    {&iScsiParms::maxRecvDataSegment, &iScsiParms::maxRecvDataSegmentInherited},
-    {&iScsiParms::maxOutstandingR2T, &iScsiParms::maxOutstandingR2TInherited},
-    {&iScsiParms::maxCmds, &iScsiParms::maxCmdsInherited},
-    {&iScsiParms::immediateData, &iScsiParms::immediateDataInherited},
-    {&iScsiParms::defaultTime2Retain, &iScsiParms::defaultTime2RetainInherited},
-    {&iScsiParms::defaultTime2Wait, &iScsiParms::defaultTime2WaitInherited},
-    {&iScsiParms::loginTimeout, &iScsiParms::loginTimeoutInherited},
-    {&iScsiParms::logoutTimeout, &iScsiParms::logoutTimeoutInherited},
-    {&iScsiParms::noopOutInterval, &iScsiParms::noopOutIntervalInherited},
-    {&iScsiParms::noopOutTimeout, &iScsiParms::noopOutTimeoutInherited},
-    {&iScsiParms::recoveryTimeout, &iScsiParms::recoveryTimeoutInherited},
-    {&iScsiParms::delayedAck, &iScsiParms::delayedAckInherited},
+constexpr Parm kParms[] = {
+    {"ErrorRecoveryLevel", &iScsiParms::errorRecoveryLevel, &iScsiParms::errorRecoveryLevelInherited},
+    {"InitialLoginRetryMax", &iScsiParms::initialLoginRetryMax, &iScsiParms::initialLoginRetryMaxInherited},
+    {"InitialR2T", &iScsiParms::initialR2T, &iScsiParms::initialR2TInherited},
+    {"FirstBurstLength", &iScsiParms::firstBurstLength, &iScsiParms::firstBurstLengthInherited},
+    {"MaxBurstLength", &iScsiParms::maxBurstLength, &iScsiParms::maxBurstLengthInherited},
+    {"MaxRecvDataSegment", &iScsiParms::maxRecvDataSegment, &iScsiParms::maxRecvDataSegmentInherited},
+    {"MaxOutstandingR2T", &iScsiParms::maxOutstandingR2T, &iScsiParms::maxOutstandingR2TInherited},
+    {"MaxCmds", &iScsiParms::maxCmds, &iScsiParms::maxCmdsInherited},
+    {"ImmediateData", &iScsiParms::immediateData, &iScsiParms::immediateDataInherited},
+    {"DefaultTime2Retain", &iScsiParms::defaultTime2Retain, &iScsiParms::defaultTime2RetainInherited},
+    {"DefaultTime2Wait", &iScsiParms::defaultTime2Wait, &iScsiParms::defaultTime2WaitInherited},
+    {"LoginTimeout", &iScsiParms::loginTimeout, &iScsiParms::loginTimeoutInherited},
+    {"LogoutTimeout", &iScsiParms::logoutTimeout, &iScsiParms::logoutTimeoutInherited},
+    {"NoopOutInterval", &iScsiParms::noopOutInterval, &iScsiParms::noopOutIntervalInherited},
+    {"NoopOutTimeout", &iScsiParms::noopOutTimeout, &iScsiParms::noopOutTimeoutInherited},
+    {"RecoveryTimeout", &iScsiParms::recoveryTimeout, &iScsiParms::recoveryTimeoutInherited},
+    {"DelayedAck", &iScsiParms::delayedAck, &iScsiParms::delayedAckInherited},
 };
-static_assert(
-    [] {
-      for (std::size_t i = 0; i < kCount; ++i) {
-        const host::ParameterSpec& spec = host::kParameters[i];
-        if (kMembers[i].value.index() != (spec.type == host::Type::Boolean ? 2 : spec.isLong ? 1 : 0))
-          return false;
-      }
-      return true;
-    }(),
-    "a parameter has another type in the contract's record");
-/// In the order of host::kDigests.
-constexpr bool iScsiParms::*kDigestMarks[] = {&iScsiParms::headerDigestInherited,
-                                              &iScsiParms::dataDigestInherited};
-/// In the order of host::kDirections.
-constexpr bool iScsiParms::*kChapMarks[] = {&iScsiParms::chapInherited, &iScsiParms::mutualChapInherited};
+constexpr bool IsOf(const Parm& parm, const host::ParameterSpec& spec) {
+  const bool isTruth = spec.type == host::Type::Boolean;
+  return parm.name == spec.name && parm.value.index() == (isTruth ? 2u : spec.isLong ? 1u : 0u);
+}
+static_assert(std::ranges::equal(kParms, host::kParameters, IsOf),
+              "the parameters of the host and those of the contract's record differ");
 
-std::int64_t CurrentOf(const iScsiParms& parms, const Member& member) {
-  return std::visit([&](auto place) { return std::int64_t{(parms.*place).current}; }, member.value);
+/// Where the record has the mark of what is no parameter in it.
+struct Mark {
+  std::string_view name;
+  bool iScsiParms::*inherited;
+};
+constexpr Mark kDigestMarks[] = {{"HeaderDigest", &iScsiParms::headerDigestInherited},
+                                 {"DataDigest", &iScsiParms::dataDigestInherited}};
+constexpr Mark kChapMarks[] = {{"uni", &iScsiParms::chapInherited},
+                               {"mutual", &iScsiParms::mutualChapInherited}};
+static_assert(std::ranges::equal(kDigestMarks, host::kDigests, {}, &Mark::name));
+static_assert(std::ranges::equal(kChapMarks, host::kDirections, {}, &Mark::name));
+
+std::int64_t CurrentOf(const iScsiParms& parms, const Parm& parm) {
+  return std::visit([&](auto place) { return std::int64_t{(parms.*place).current}; }, parm.value);
 }
 
 std::string DigestPath(Digest digest) {
@@ -74,7 +77,7 @@ std::string DigestPath(Digest digest) {
 /// Where the direction stands in host::kDirections.
 std::size_t IndexOf(int direction) {
   if (direction == ChapUni || direction == ChapMutual) return static_cast<std::size_t>(direction);
-  Deny(std::to_string(direction) + " is no direction of CHAP.");
+  Deny(Why::Invalid, std::to_string(direction) + " is no direction of CHAP.");
 }
 std::string ChapPath(int direction) { return host::PathOf("chap", host::kDirections[IndexOf(direction)]); }
 
@@ -95,7 +98,7 @@ template <class Demand>
 std::string_view WordOf(Demand demand, const char* what) {
   const auto index = static_cast<std::size_t>(demand) - 1;
   if (index < std::size(host::kDemands)) return host::kDemands[index];
-  Deny(std::to_string(static_cast<int>(demand)) + " is no level of " + what + ".");
+  Deny(Why::Invalid, std::to_string(static_cast<int>(demand)) + " is no level of " + what + ".");
 }
 
 }  // namespace
@@ -104,12 +107,14 @@ void RequireChapEntry(const std::string& name, const std::string& secret, const 
   for (const std::string* text : {&name, &secret}) {
     std::string subject = whose + (text == &name ? " name" : " secret");
     const std::string fault = host::StorableFault(*text);
-    if (!fault.empty()) Deny(subject.append(" ").append(fault).append("."));
+    if (!fault.empty()) Deny(Why::Invalid, subject.append(" ").append(fault).append("."));
     if (text->empty() || text->size() > 255) {
-      Deny(subject + " has " + std::to_string(text->size()) + " bytes, and from 1 to 255 are allowed.");
+      Deny(Why::OutOfRange,
+           subject + " has " + std::to_string(text->size()) + " bytes, and from 1 to 255 are allowed.");
     }
   }
-  if (secret == host::kMask) Deny(whose + " secret is ***, which stands for a secret that is not shown.");
+  if (secret == host::kMask)
+    Deny(Why::Invalid, whose + " secret is ***, which stands for a secret that is not shown.");
 }
 
 std::string PortalText(const std::string& host, std::int64_t port) {
@@ -169,7 +174,7 @@ std::string Level::ParentText() const {
 void Level::RequireCapability(const char* own, const char* below, const std::string& subject) const {
   const std::string capability = HasParent() ? below : own;
   if (OfAdapter().GetBool(host::PathOf("capabilities", capability))) return;
-  Deny(subject + ": the adapter lacks " + host::Quoted(capability) + ".");
+  Deny(Why::NotSupported, subject + ": the adapter lacks " + host::Quoted(capability) + ".");
 }
 
 void Level::Ensure(const std::string& path) {
@@ -216,15 +221,15 @@ iScsiParms Level::GetParms() const {
           value.settable = parameter.settable;
           value.valid = parameter.supported;
         },
-        kMembers[i].value);
-    parms.*kMembers[i].inherited = parameter.inherited;
+        kParms[i].value);
+    parms.*kParms[i].inherited = parameter.inherited;
   }
   parms.parent = ParentText();
   for (const Digest digest : {Digest::Header, Digest::Data}) {
-    parms.*kDigestMarks[static_cast<int>(digest)] = HasParent() && !Own().Has(DigestPath(digest));
+    parms.*kDigestMarks[static_cast<int>(digest)].inherited = HasParent() && !Own().Has(DigestPath(digest));
   }
   for (const int direction : {ChapUni, ChapMutual}) {
-    parms.*kChapMarks[direction] = HasParent() && InheritsChap(ChapPath(direction));
+    parms.*kChapMarks[direction].inherited = HasParent() && InheritsChap(ChapPath(direction));
   }
   return parms;
 }
@@ -235,11 +240,11 @@ void Level::SetParameter(std::size_t index, std::int64_t value) {
   const std::string path = host::PathOf("parameters", spec.name);
   if (value != parameter.current) {
     const std::string subject = std::string(spec.name) + " cannot be set to " + std::to_string(value) + ": ";
-    if (!parameter.supported) Deny(subject + "the adapter has no such parameter.");
-    if (!parameter.settable) Deny(subject + "it is not settable.");
+    if (!parameter.supported) Deny(Why::NotSupported, subject + "the adapter has no such parameter.");
+    if (!parameter.settable) Deny(Why::NotSettable, subject + "it is not settable.");
     if (value < parameter.least || value > parameter.most) {
-      Deny(subject + "its range is from " + std::to_string(parameter.least) + " to " +
-           std::to_string(parameter.most) + ".");
+      Deny(Why::OutOfRange, subject + "its range is from " + std::to_string(parameter.least) + " to " +
+                                std::to_string(parameter.most) + ".");
     }
   }
   if (HasParent()) {
@@ -252,28 +257,39 @@ void Level::SetParameter(std::size_t index, std::int64_t value) {
   }
 }
 
-Status Level::SetParms(const iScsiParms& parms) {
+Status Level::SetParms(const iScsiParms& parms, const iScsiParms& given) {
+  // What a place sets itself; nothing where it inherits.
+  const auto own = [this](const iScsiParms& record, const Parm& parm) -> std::optional<std::int64_t> {
+    if (HasParent() && record.*parm.inherited) return {};
+    return CurrentOf(record, parm);
+  };
   for (std::size_t i = 0; i < kCount; ++i) {
-    if (HasParent() && parms.*kMembers[i].inherited) {
-      Own().Erase(host::PathOf("parameters", host::kParameters[i].name));
+    const std::optional<std::int64_t> value = own(parms, kParms[i]);
+    if (value == own(given, kParms[i])) continue;
+    if (value) {
+      SetParameter(i, *value);
     } else {
-      SetParameter(i, CurrentOf(parms, kMembers[i]));
+      Own().Erase(host::PathOf("parameters", kParms[i].name));
     }
   }
   if (HasParent()) {
+    const auto isChanged = [&](const Mark& mark) { return parms.*mark.inherited != given.*mark.inherited; };
     for (const Digest digest : {Digest::Header, Digest::Data}) {
+      const Mark& mark = kDigestMarks[static_cast<int>(digest)];
       const std::string path = DigestPath(digest);
-      if (parms.*kDigestMarks[static_cast<int>(digest)]) {
+      if (!isChanged(mark)) continue;
+      if (parms.*mark.inherited) {
         Own().Erase(path);
       } else if (!Own().Has(path)) {
         Own().Set(path, WordOf(GetDigest(digest), "digests"));
       }
     }
     for (const int direction : {ChapUni, ChapMutual}) {
-      MarkChap(direction, parms.*kChapMarks[direction]);
+      const Mark& mark = kChapMarks[direction];
+      if (isChanged(mark)) MarkChap(direction, parms.*mark.inherited);
     }
   }
-  const bool changed = Own().Text() != host::Configured(inEffect_).record.Text();
+  const bool changed = Own() != host::Configured(inEffect_).record;
   // Where only digests wait, which have had their answer, a set that changes nothing asks for nothing.
   return changed || DoesParameterWait() ? StoreParameters() : Status::Success;
 }
@@ -313,7 +329,7 @@ bool Level::InheritsChap(const std::string& path) const {
 void Level::MarkChap(int direction, bool inherited) {
   const std::string path = ChapPath(direction);
   if (InheritsChap(path) == inherited) return;
-  if (!Own().Has(path)) {
+  if (!inherited) {
     const host::ChapEntry holding = host::ChapAt(Holding(), IndexOf(direction));
     Ensure(path);
     SetEntry(path, holding.name, holding.secret, host::kDemands[static_cast<std::size_t>(holding.demand)]);
@@ -344,11 +360,18 @@ void Level::SetChap(const iScsiChapParameters& chap, int direction) {
         mutual ? "Target Level Mutual Authentication Supported" : "Target Level Authentication Supported",
         (mutual ? "Mutual CHAP cannot be " : "CHAP cannot be ") + std::string(word));
     RequireChapEntry(chap.name, chap.secret, "The CHAP");
+    if (mutual && host::ChapAt(Holding(), ChapUni).demand == host::Demand::Prohibited) {
+      Deny(Why::WrongState, "Mutual CHAP cannot be " + std::string(word) + " while CHAP is prohibited.");
+    }
   }
   const bool inherits = HasParent() && InheritsChap(path);
   Ensure(path);
   if (HasParent()) Own().Set(path + "/inherited", inherits);
   SetEntry(path, chap.name, chap.secret, word);
+  const std::string mutualPath = ChapPath(ChapMutual);
+  if (direction == ChapUni && chap.level == iScsiChapType::Prohibited && Own().Has(mutualPath)) {
+    SetEntry(mutualPath, "none", "none", word);
+  }
   Store(host::Effect::Now);
 }
 
@@ -359,12 +382,10 @@ host::Argument ShownParms(const iScsiParms& parms) {
       text += (text.empty() ? "{" : ", ") + std::string(key) + "=" + (inherited ? "inherited" : value);
     }
   };
-  for (std::size_t i = 0; i < kCount; ++i) {
-    const Member& member = kMembers[i];
-    add(host::kParameters[i].name, parms.*member.inherited, std::to_string(CurrentOf(parms, member)));
+  for (const Parm& parm : kParms) {
+    add(parm.name, parms.*parm.inherited, std::to_string(CurrentOf(parms, parm)));
   }
-  for (std::size_t i = 0; i < std::size(host::kDigests); ++i)
-    add(host::kDigests[i], parms.*kDigestMarks[i], "");
+  for (const Mark& mark : kDigestMarks) add(mark.name, parms.*mark.inherited, "");
   add("CHAP", parms.chapInherited, "");
   add("mutual CHAP", parms.mutualChapInherited, "");
   return host::Argument::Plain(text + "}");

@@ -67,9 +67,10 @@ class Level {
   Level(host::Tree& tree, const host::Object& adapter, const StaticTarget& target);
 
   iScsiParms GetParms() const;
-  /// Takes over values and marks; an Error, and no change, where a changed value cannot be set. Defaults,
-  /// ranges and the like are not looked at.
-  Status SetParms(const iScsiParms& parms);
+  /// Takes over the values and marks in which @p parms differs from @p given, the record that it was made
+  /// from: what another process has set in between stays. An Error, and no change, where a changed value
+  /// cannot be set. Defaults, ranges and the like are not looked at.
+  Status SetParms(const iScsiParms& parms, const iScsiParms& given);
 
   iScsiDigestType GetDigest(Digest digest) const;
   Status SetDigest(Digest digest, iScsiDigestType value);
@@ -77,6 +78,8 @@ class Level {
   /// Fills in name and level of the entry that holds.
   void GetChap(iScsiChapParameters& chap, int direction) const;
   /// Stores the entry of this place; whether it is the one that holds is up to the mark in the parameters.
+  /// Mutual CHAP goes with CHAP: prohibiting CHAP clears the mutual entry of the place too, and one that asks
+  /// for more is refused where CHAP is prohibited.
   void SetChap(const iScsiChapParameters& chap, int direction);
 
  private:
@@ -116,7 +119,8 @@ class Level {
   /// True where a value of this place is not in effect yet as it was set, digests aside.
   bool DoesParameterWait() const;
   bool InheritsChap(const std::string& path) const;
-  /// Sets the mark. An entry that no longer comes from a parent, and was never set here, stays as it held.
+  /// Sets the mark. Where the parent's entry no longer holds, a copy of it does until an entry is set: what
+  /// was set here before it held is forgotten.
   void MarkChap(int direction, bool inherited);
   void SetEntry(const std::string& path, const std::string& name, const std::string& secret,
                 std::string_view level);

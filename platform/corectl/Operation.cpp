@@ -13,6 +13,6 @@ void Throw(const host::Error& error, host::Call::Style style) {
 
 void RefuseValue(const std::string& text) { throw NodeCtl::Lib::NodeCtlException(text, {}); }
 
-void Deny(const std::string& text) { throw host::Error(host::Error::Kind::Refused, text); }
+void Deny(Why why, const std::string& text) { throw host::Error(why, text); }
 
 }  // namespace corectl

@@ -13,8 +13,9 @@ namespace corectl {
 /// Refuses what a value is made from, outside any operation: a NodeCtlException of @p text.
 [[noreturn]] void RefuseValue(const std::string& text);
 
+using Why = host::Error::Kind;
 /// Refuses an operation from within its body, for the reason @p text: a host::Error.
-[[noreturn]] void Deny(const std::string& text);
+[[noreturn]] void Deny(Why why, const std::string& text);
 
 /// Gives @p owned to a caller who deletes the elements.
 template <class T>
@@ -24,19 +25,28 @@ std::vector<T*> HandOut(std::vector<std::unique_ptr<T>> owned) {
   return handedOut;
 }
 
-/// How an operation runs at the host's choke point: Read, Change or Outside.
-#define CORECTL_RUN(how)                            \
-  template <class Body>                             \
-  auto how(const host::Call& call, Body&& body) {   \
-    try {                                           \
-      return host::Host::Current().how(call, body); \
-    } catch (const host::Error& error) {            \
-      Throw(error, call.style);                     \
-    }                                               \
+/// What @p work gives; a host failure as the exception of an operation of this style.
+template <class Work>
+auto WithExceptions(host::Call::Style style, Work work) {
+  try {
+    return work();
+  } catch (const host::Error& error) {
+    Throw(error, style);
   }
-CORECTL_RUN(Read)
-CORECTL_RUN(Change)
-CORECTL_RUN(Outside)
-#undef CORECTL_RUN
+}
+
+// How operations run at the host's choke point.
+template <class Body>
+auto Read(const host::Call& call, Body&& body) {
+  return WithExceptions(call.style, [&] { return host::Host::Current().Read(call, body); });
+}
+template <class Body>
+auto Change(const host::Call& call, Body&& body) {
+  return WithExceptions(call.style, [&] { return host::Host::Current().Change(call, body); });
+}
+template <class Body>
+auto Outside(const host::Call& call, Body&& body) {
+  return WithExceptions(call.style, [&] { return host::Host::Current().Outside(call, body); });
+}
 
 }  // namespace corectl

@@ -61,20 +61,25 @@ host::Object InsertSoftwareAdapter(host::Tree& tree) {
 }
 
 /// Gives the software initiator its configured name, at once where it starts now, which it then does. A name
-/// that was given to the adapter itself after the file was written stays.
-void NameSoftware(host::Tree& tree, bool starts) {
+/// that was given to the adapter itself after the file was written stays. Gives the adapters whose name
+/// waits.
+std::vector<std::string> NameSoftware(host::Tree& tree, bool starts) {
   const std::optional<std::string> name = ConfiguredInitiatorName();
   const bool isUsable = name && host::IscsiNameFault(*name).empty();
   std::vector<host::Object> adapters = Adapters(tree);
   std::erase_if(adapters,
                 [](const host::Object& adapter) { return adapter.record.GetString("kind") != "software"; });
   if (adapters.empty() && starts) adapters.push_back(InsertSoftwareAdapter(tree));
+  std::vector<std::string> waiting;
   for (host::Object& adapter : adapters) {
     if (isUsable && HeedNameFile(adapter)) {
-      ConfigureName(tree, adapter, *name, starts ? host::Effect::Now : host::Effect::Reboot);
+      const Status status =
+          ConfigureName(tree, adapter, *name, starts ? host::Effect::Now : host::Effect::Reboot);
+      if (status == Status::RebootRequired) waiting.push_back(adapter.name);
     }
     if (starts) host::Start(tree, tree.Get(adapter.id, host::Kind::Adapter));
   }
+  return waiting;
 }
 
 }  // namespace
@@ -82,13 +87,13 @@ void NameSoftware(host::Tree& tree, bool starts) {
 void RequireInitiatorName(const std::string& name) {
   const std::string fault = host::IscsiNameFault(name);
   if (fault.empty()) return;
-  throw host::Error(host::Error::Kind::Refused,
+  throw host::Error(host::Error::Kind::Invalid,
                     host::Quoted(name) + " is not a valid iSCSI name: " + fault + ".");
 }
 
 bool HeedNameFile(host::Object& adapter) {
   struct stat file;
-  if (stat(host::HostPath(kInitiatorNameFile).c_str(), &file) != 0) return false;
+  if (!host::IsRegularFile("The file", host::HostPath(kInitiatorNameFile), file)) return false;
   // Each writing makes a new file.
   const std::string writing = std::to_string(file.st_ino) + ' ' + std::to_string(file.st_mtim.tv_sec) + '.' +
                               std::to_string(file.st_mtim.tv_nsec);
@@ -146,24 +151,29 @@ bool StorageInfoImpl::HasSoftwareiScsiEnabled() {
 }
 
 void StorageInfoImpl::EnableSoftwareiScsi(bool probe) {
-  Change(Call::OnHost("EnableSoftwareiScsi", {probe}), [](host::Tree& tree) {
+  std::vector<std::string> waiting;
+  Change(Call::OnHost("EnableSoftwareiScsi", {probe}), [&](host::Tree& tree) {
     host::Object root = corectl::Root(tree);
     const bool works = host::DoesSoftwareWork(root.record);
     root.record.Set("softwareIscsi/enabled", true);
     root.record.Set("softwareIscsi/rebootPending", false);
     tree.Update(root);
-    corectl::NameSoftware(tree, !works);
+    waiting = corectl::NameSoftware(tree, !works);
   });
+  for (const std::string& adapter : waiting) host::CallLog::Current().Waits(adapter, host::Effect::Reboot);
 }
 
 void StorageInfoImpl::DisableSoftwareiScsi() {
-  Change(Call::OnHost("DisableSoftwareiScsi"), [](host::Tree& tree) {
+  bool waits = false;
+  Change(Call::OnHost("DisableSoftwareiScsi"), [&](host::Tree& tree) {
     host::Object root = corectl::Root(tree);
     if (!root.record.GetBool("softwareIscsi/enabled")) return;
     root.record.Set("softwareIscsi/enabled", false);
     root.record.Set("softwareIscsi/rebootPending", true);
     tree.Update(root);
+    waits = true;
   });
+  if (waits) host::CallLog::Current().Waits("the software initiator", host::Effect::Reboot);
 }
 
 bool iScsiUtil::CheckInitiatorName(const std::string& name) {
@@ -189,8 +199,9 @@ NodeCtl::Network::HostAddress iScsiUtil::ConvertHostAddress(const IMA_HOST_ID& h
     }
   }
   return corectl::Outside(Call::OnHost("ConvertHostAddress", {text.value_or("")}), [&] {
-    if (!text || !host::HostFault(*text).empty()) {
-      throw host::Error(host::Error::Kind::Refused, "The record names no host by address or by name.");
+    const bool isAddress = hostId.hostnameInUse == IMA_FALSE;
+    if (!isAddress && (!text || !host::HostFault(*text).empty())) {
+      throw host::Error(host::Error::Kind::Invalid, "The record names no host by address or by name.");
     }
     return NodeCtl::Network::HostAddress(*text);
   });

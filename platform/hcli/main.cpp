@@ -1,3 +1,5 @@
+#include <stdlib.h>
+#include <sys/auxv.h>
 #include <unistd.h>
 
 #include <climits>
@@ -8,13 +10,22 @@
 
 namespace {
 
-/// Relative to the program, so that an installed tree may be moved.
-std::string PluginFolder() {
+/// Where the program lies, or "" where nothing tells.
+std::string ProgramPath() {
   char path[PATH_MAX];
   const ssize_t length = readlink("/proc/self/exe", path, sizeof path);
-  std::string folder(path, length > 0 ? static_cast<std::size_t>(length) : 0);
-  folder.erase(folder.find_last_of('/') + 1);
-  return folder + "../lib/hcli/plugins";
+  if (length > 0) return std::string(path, static_cast<std::size_t>(length));
+  // Without /proc: by the name that the kernel was given.
+  const auto* name = reinterpret_cast<const char*>(getauxval(AT_EXECFN));
+  return name && realpath(name, path) ? path : "";
+}
+
+/// Relative to the program, so that an installed tree may be moved; "" where it cannot be found.
+std::string PluginFolder() {
+  std::string path = ProgramPath();
+  if (path.empty()) return "";
+  path.erase(path.find_last_of('/') + 1);
+  return path + "../lib/hcli/plugins";
 }
 
 }  // namespace

@@ -1,26 +1,44 @@
 /// Host descriptions: a whole host as one JSON document.
 ///
-/// A description with a fault is refused whole, as an Error (Refused) whose text begins with the path of the
-/// fault: `adapters[1].capabilities.MTU Settable: expected true or false`.
+/// A description with a fault is refused whole, as an Error (Invalid) that says where it is:
+/// `adapters[1].capabilities.MTU Settable: expected true or false (line 40, column 25)`.
 #pragma once
 
+#include <cstddef>
 #include <string>
 #include <string_view>
+#include <vector>
 
+#include "host/Record.h"
 #include "host/Schema.h"
 
 #pragma GCC visibility push(default)
 
 namespace host {
 
-class Record;
 class Tree;
 
 /// What is shown in place of a secret; no secret is that.
 inline constexpr std::string_view kMask = "***";
 
-/// Replaces all that is in @p tree by what @p text describes.
-void LoadDescription(Tree& tree, const std::string& text);
+/// One object of a description, right by itself and in its place.
+struct DescribedObject {
+  Kind kind = Kind::Host;
+  std::size_t parent = 0;  // its number in the description; the host's own is 0
+  std::size_t place = 0;   // among the children of the parent that are of the same kind, from 0
+  std::size_t offset = 0;  // in the text
+  Record record;
+};
+
+/// The objects in the order in which they begin: the host, and each behind its parent.
+using Description = std::vector<DescribedObject>;
+
+/// What @p text describes. What is no part of a host is refused where it begins, so that neither memory nor
+/// depth is ever more than a host of this size takes.
+Description ReadDescription(const std::string& text);
+
+/// Replaces all that is in @p tree by what @p description has.
+void LoadDescription(Tree& tree, Description description);
 
 /// The description of @p tree, which LoadDescription reads into an equal one. Without @p secrets, they are
 /// masked, and LoadDescription refuses it.

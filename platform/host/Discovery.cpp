@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <map>
-#include <nlohmann/json.hpp>
 #include <set>
 
 #include "host/Adapters.h"
@@ -24,7 +23,7 @@ bool SetDiscovered(Record& target, bool discovered) {
     if (!discovered) target.Erase(path);
     return !discovered;
   }
-  if (discovered) target.Append("discoveryMethods", Record(Json("sendtargets")));
+  if (discovered) target.Append("discoveryMethods", "sendtargets");
   return discovered;
 }
 
@@ -38,7 +37,7 @@ class Discovery {
     for (const FoundTarget* target : inOrder_) Take(*target);
     for (const Told& told : told_) Take(told);
     Forget();
-    if (!LoginAdapter(tree_, adapter_)) Fail(kCompletedWithFailures);
+    if (LoginAdapter(tree_, adapter_)) Fail(kCompletedWithFailures);
     return outcome_;
   }
 

@@ -11,7 +11,7 @@ namespace host {
 /// there is no session yet and keeps the discovery status. What was set on a portal stays as long as the
 /// portal is known. A portal that was found and is told of no more goes, and with its last portal the target;
 /// those of a sendtarget that did not answer stay, and so do those of a target that has sessions. An Error
-/// (Refused) when the adapter is not online.
+/// (WrongState) when the adapter is not online.
 void Rediscover(Tree& tree, const Object& adapter);
 }  // namespace host
 

@@ -4,45 +4,64 @@
 #include <cstdint>
 #include <stdexcept>
 #include <string>
+#include <string_view>
 
 #pragma GCC visibility push(default)
 
 namespace host {
 
+/// A status of the management API as the trace shows it.
+std::string ImaStatusText(std::uint32_t status);
+
 /// The one failure type of this library; std::bad_alloc is the only other thing that its operations throw.
 /// what() is a whole sentence for an administrator.
 class Error : public std::runtime_error {
  public:
+  /// Why. Each has a code, by which scripts tell them apart: those are stable, and so is which refusal has
+  /// which.
   enum class Kind {
-    Refused,       ///< the request itself is wrong, or the host says no to it
-    NotFound,      ///< the object is gone
-    WrongObject,   ///< the object is of another kind
+    Failed,        ///< anything else
+    NotFound,      ///< what is named is not there, or not any more
+    Exists,        ///< what is to be added is there already
+    Invalid,       ///< what is given is no value of its kind
+    OutOfRange,    ///< a number, or a length, that is too small or too large
+    NotSettable,   ///< there is such a setting, and here it cannot be changed
     NotSupported,  ///< this object has no such thing
-    Exists,        ///< the object is there already
-    Failed,        ///< the host's file cannot be used
-    Damaged,       ///< what is in the file makes no sense; the choke point adds which file
-    Answered,      ///< the description's answers say so
+    WrongObject,   ///< the object is of another kind
+    WrongState,    ///< something else, which can be changed, stands against it
+    InUse,         ///< something uses what is to go
+    TooMany,       ///< there is no room for one more
+    Busy,          ///< another process keeps it locked
+    Denied,        ///< the system does not let the caller at the file
+    Damaged,       ///< what is in the host's file makes no sense; the choke point makes DamagedFile of it
+    DamagedFile,   ///< the same, with the file's name in the text; or a file that is none of its kind
+    NoSpace,       ///< a disk, or a limit of one, is full
+    NoMemory,      ///< as std::bad_alloc is told of
+    LoginRefused,  ///< a target, or the adapter, ended a login
+    NoAnswer,      ///< nobody answered, or no way leads there
   };
   /// Which exception of the control library shows the failure. A lookup turns Usual into CoreCtlException.
   enum class Thrown { Usual, NodeCtlException, CoreCtlException };
 
   Error(Kind kind, const std::string& text) : std::runtime_error(text), kind_(kind) {}
-  Error(Thrown thrown, const std::string& text)
-      : std::runtime_error(text), kind_(Kind::Answered), thrown_(thrown) {}
-  explicit Error(std::uint32_t imaStatus)
-      : std::runtime_error("answered so by the host description"),
-        kind_(Kind::Answered),
-        answer_(imaStatus) {}
+  /// Answers of the description: by an exception, and by a status.
+  Error(Thrown thrown, const std::string& text) : std::runtime_error(text), thrown_(thrown) {}
+  explicit Error(std::uint32_t imaStatus);
+
+  /// The kind that an error of the system, an errno, is of.
+  static Kind KindOfSystem(int error);
 
   Kind GetKind() const { return kind_; }
+  /// A word, such as "not-found".
+  std::string_view Code() const;
   Thrown GetThrown() const { return thrown_; }
   /// The status with which an IMA call shows this failure; never 0.
   std::uint32_t ImaStatus() const;
 
  private:
-  Kind kind_;
+  Kind kind_ = Kind::Failed;
   Thrown thrown_ = Thrown::Usual;
-  std::uint32_t answer_ = 0;
+  std::uint32_t answer_ = 0;  // 0 where none decides the status
 };
 
 }  // namespace host

@@ -4,6 +4,7 @@
 #include <sys/stat.h>
 #include <sys/types.h>
 
+#include <cstddef>
 #include <string>
 #include <string_view>
 
@@ -11,14 +12,21 @@
 
 namespace host {
 
-/// Where the absolute path @p path of the host lies: under HCLI_ROOT, or as it is without one.
+/// Where the absolute path @p path of the host lies: under HCLI_ROOT, or as it is without one. An Error where
+/// that is empty, which a script with an unset variable makes it: the host is not to be this machine by
+/// mistake.
 std::string HostPath(std::string_view path);
 
 /// An Error that says what could not be done with the file @p path, and the reason that errno gives.
 [[noreturn]] void FailFile(const std::string& path, const char* what, int error);
 
-/// How long another process that writes is waited for.
+/// How long another process that writes is waited for, unless SetPatience says otherwise.
 constexpr int kPatienceMilliseconds = 20000;
+
+/// How long it is waited for now, in milliseconds.
+int Patience();
+/// Host::SetPatience does this for what the host has open too. Returns what held before.
+int SetPatience(int milliseconds);
 
 /// Makes the folder that @p path lies in, and those above it.
 void MakeFoldersFor(const std::string& path);
@@ -28,10 +36,15 @@ void MakeFoldersFor(const std::string& path);
 /// waiting. Where it is none, or cannot be looked at, an Error that begins with @p what and the path says so.
 bool IsRegularFile(const char* what, const std::string& path, struct stat& status);
 
-/// The contents of @p path, whatever it is; false where there is no such file.
-bool ReadFile(const std::string& path, std::string& contents);
+/// The contents of @p path, whatever it is, of at most @p most bytes; false where there is no such file.
+bool ReadFile(const std::string& path, std::size_t most, std::string& contents);
+/// The same of standard input from where it stands, whatever it is.
+void ReadStandardInput(std::size_t most, std::string& contents);
 /// The same for a file of the host, which has to be a regular one.
 bool ReadHostFile(const std::string& path, std::string& contents);
+
+/// Takes from all but the owner what the mode @p status of @p path gives them, where this process may.
+void KeepPrivate(const std::string& path, const struct stat& status);
 
 /// A file that comes into being beside @p path and takes its place in one step, or leaves no trace. What a
 /// process leaves that was killed in between, one file at the most, the next one clears away.
@@ -47,7 +60,8 @@ class NewFile {
   void SetOwnerAndMode(uid_t owner, gid_t group, mode_t mode);
   /// Takes the place of @p path, durable when it returns.
   void Replace();
-  /// The same where @p path does not exist; where it does, it stays as it is and the result is false.
+  /// The same where @p path does not exist; where it does, it stays as it is and the result is false. Where
+  /// the file is in its place and its folder cannot be synced, an Error says so.
   bool Publish();
 
  private:
@@ -55,13 +69,16 @@ class NewFile {
   void SyncFolder();
 
   void Lock(int file);
-  bool IsTemporary(int file) const;
   void ClearTemporary();
 
   std::string path_;
   std::string temporary_;  // empty once there is nothing to clean up
   int file_ = -1;
 };
+
+/// Removes what a killed process has left of a NewFile for @p path, where this process may and nobody is at
+/// work on one. For where no NewFile follows, which would do it.
+void ClearLeftover(const std::string& path);
 
 }  // namespace host
 

@@ -3,7 +3,9 @@
 #include <arpa/inet.h>
 
 #include <algorithm>
+#include <charconv>
 #include <cstdio>
+#include <cstring>
 #include <vector>
 
 namespace host {
@@ -93,15 +95,31 @@ std::optional<char32_t> TakeCharacter(std::string_view& text) {
   return value;
 }
 
+/// How many bytes in front are ASCII.
+std::size_t AsciiLength(std::string_view text) {
+  std::size_t length = 0;
+  // Eight at a time: names of thousands of targets pass here.
+  for (std::uint64_t eight = 0; length + sizeof eight <= text.size(); length += sizeof eight) {
+    std::memcpy(&eight, text.data() + length, sizeof eight);
+    if ((eight & 0x8080808080808080u) != 0) break;
+  }
+  while (length < text.size() && static_cast<unsigned char>(text[length]) < 0x80) ++length;
+  return length;
+}
+
 }  // namespace
 
 std::optional<Ipv4Bytes> ParseIpv4(std::string_view text) { return Parse<Ipv4Bytes>(AF_INET, text); }
 std::optional<Ipv6Bytes> ParseIpv6(std::string_view text) { return Parse<Ipv6Bytes>(AF_INET6, text); }
 
 std::string FormatIpv4(const Ipv4Bytes& bytes) {
-  std::string text;
-  for (const std::uint8_t byte : bytes) text += (text.empty() ? "" : ".") + std::to_string(byte);
-  return text;
+  char text[16];
+  char* end = text;
+  for (const std::uint8_t byte : bytes) {
+    if (end != text) *end++ = '.';
+    end = std::to_chars(end, std::end(text), byte).ptr;
+  }
+  return std::string(text, end);
 }
 
 std::string FormatIpv6(const Ipv6Bytes& bytes) {
@@ -203,11 +221,14 @@ std::string IscsiNameFault(std::string_view text) {
 
 std::string IscsiNameOrNoneFault(std::string_view text) { return text.empty() ? "" : IscsiNameFault(text); }
 
+bool IsAscii(std::string_view text) { return AsciiLength(text) == text.size(); }
+
 bool IsUtf8(std::string_view text) {
-  while (!text.empty()) {
+  for (;;) {
+    text.remove_prefix(AsciiLength(text));
+    if (text.empty()) return true;
     if (!TakeCharacter(text)) return false;
   }
-  return true;
 }
 
 std::string StorableFault(std::string_view text) {
@@ -226,6 +247,8 @@ std::optional<std::wstring> WideFromUtf8(std::string_view text) {
 }
 
 std::optional<std::string> Utf8FromWide(std::wstring_view text) {
+  const auto isAscii = [](wchar_t wide) { return wide >= 0 && wide < 0x80; };
+  if (std::all_of(text.begin(), text.end(), isAscii)) return std::string(text.begin(), text.end());
   std::string narrow;
   for (const wchar_t wide : text) {
     const auto value = static_cast<char32_t>(wide);
@@ -238,23 +261,44 @@ std::optional<std::string> Utf8FromWide(std::wstring_view text) {
   return narrow;
 }
 
-std::string Quoted(std::string_view text) {
-  std::string quoted = "\"";
-  for (const char c : text) {
-    if (c == '"' || c == '\\') {
-      quoted += '\\';
-      quoted += c;
-    } else if (c == '\n') {
-      quoted += "\\n";
-    } else if ((c >= 0 && c < ' ') || c == 0x7f) {
-      quoted += "\\x";
-      quoted += kLowerHex[static_cast<unsigned char>(c) >> 4];
-      quoted += kLowerHex[static_cast<unsigned char>(c) & 15];
+std::string Printable(std::string_view text) {
+  std::string printable;
+  while (!text.empty()) {
+    const std::string_view rest = text;
+    const auto character = TakeCharacter(text);
+    if (!character) text.remove_prefix(1);
+    const std::string_view bytes = rest.substr(0, rest.size() - text.size());
+    // Among the controls behind ASCII is one that begins the sequences of a terminal.
+    const bool isControl = !character || *character < ' ' || (*character >= 0x7f && *character < 0xa0);
+    if (character == U'\n') {
+      printable += "\\n";
+    } else if (!isControl) {
+      printable += bytes;
     } else {
-      quoted += c;
+      for (const char byte : bytes) {
+        printable += "\\x";
+        printable += kLowerHex[static_cast<unsigned char>(byte) >> 4];
+        printable += kLowerHex[static_cast<unsigned char>(byte) & 15];
+      }
     }
   }
-  return quoted + '"';
+  return printable;
+}
+
+std::string Quoted(std::string_view text) {
+  std::string quoted;
+  for (const char c : text) {
+    if (c == '"' || c == '\\') quoted += '\\';
+    quoted += c;
+  }
+  return '"' + Printable(quoted) + '"';
+}
+
+std::string Excerpt(std::string_view text) {
+  std::size_t size = 64;
+  if (text.size() <= size) return Quoted(text);
+  while (size > 0 && (static_cast<unsigned char>(text[size]) & 0xc0) == 0x80) --size;  // whole characters
+  return Quoted(text.substr(0, size)) + "... (" + std::to_string(text.size()) + " bytes)";
 }
 
 std::size_t EditDistance(std::string_view a, std::string_view b) {

@@ -41,6 +41,7 @@ std::string IscsiNameFault(std::string_view text);
 /// The same, where an empty text stands for no name.
 std::string IscsiNameOrNoneFault(std::string_view text);
 
+bool IsAscii(std::string_view text);
 bool IsUtf8(std::string_view text);
 /// What keeps a text out of a record, as "is not UTF-8"; empty when nothing does.
 std::string StorableFault(std::string_view text);
@@ -49,8 +50,13 @@ std::optional<std::wstring> WideFromUtf8(std::string_view text);
 /// UTF-32 to UTF-8; nothing for surrogates and numbers above 0x10ffff.
 std::optional<std::string> Utf8FromWide(std::wstring_view text);
 
-/// The text in double quotes, what cannot be printed escaped: for messages and traces.
+/// The text with control characters and bytes that are not UTF-8 as "\n" and "\x9b", so that it can neither
+/// break a line nor work on a terminal.
+std::string Printable(std::string_view text);
+/// The same in double quotes, quotes and backslashes escaped: for messages and traces.
 std::string Quoted(std::string_view text);
+/// The same for what somebody wrote, of any length: of a long text only how it begins, and its size.
+std::string Excerpt(std::string_view text);
 /// The candidate most like @p word where one is near enough to be meant, else an empty text.
 template <class Candidates>
 std::string Nearest(std::string_view word, const Candidates& candidates);
@@ -59,6 +65,8 @@ std::size_t EditDistance(std::string_view a, std::string_view b);
 
 template <class Candidates>
 std::string Nearest(std::string_view word, const Candidates& candidates) {
+  // A long word is near nothing, and comparing costs its length.
+  if (word.size() > 64) return {};
   std::size_t best = word.size() / 3 + 2;
   std::string nearest;
   for (const auto& candidate : candidates) {

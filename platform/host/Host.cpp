@@ -7,10 +7,13 @@
 #include <cstdlib>
 #include <cstring>
 #include <new>
+#include <utility>
 
 #include "host/Description.h"
 #include "host/Files.h"
+#include "host/Rehearsal.h"
 #include "host/Restart.h"
+#include "host/Tables.h"
 
 namespace host {
 
@@ -19,7 +22,8 @@ namespace {
 constexpr std::string_view kDatabase = "/var/lib/tessaro/host.db";
 
 std::unique_ptr<Host>& CurrentHost() {
-  static std::unique_ptr<Host> current;
+  // Not closed when the process ends: no transaction is open then, and the rest is gone by itself.
+  static auto& current = *new std::unique_ptr<Host>;
   return current;
 }
 
@@ -34,57 +38,96 @@ bool IsTraceWanted() {
 }
 
 void Trace(const Call& call, const std::string& outcome) {
-  const std::string line = std::string(call.operation.Name()) + "(" + call.arguments + ") " + outcome;
+  const std::string line =
+      Printable(std::string(call.operation.Name()) + "(" + call.arguments + ") " + outcome);
   if (TraceSink()) TraceSink()(line);
-  if (IsTraceWanted()) std::fprintf(stderr, "%s\n", line.c_str());
+  if (!IsTraceWanted()) return;
+  if (Rehearsal* rehearsal = Rehearsal::Current()) return rehearsal->trace.push_back(line);
+  std::fprintf(stderr, "%s\n", line.c_str());
 }
 
-std::unique_ptr<Store> DescribedStore(const std::string& description) {
+std::unique_ptr<Store> DescribedStore(const std::string& text) {
+  Description description = ReadDescription(text);
   auto store = std::make_unique<Store>();
   Transaction transaction(*store, Transaction::Access::Change);
   CreateTables(*store);
   Tree tree(*store);
-  LoadDescription(tree, description);
+  LoadDescription(tree, std::move(description));
   transaction.Commit();
   return store;
 }
 
 }  // namespace
 
-std::string ImaStatusText(std::uint32_t status) {
-  char text[16];
-  std::snprintf(text, sizeof text, "0x%08x", static_cast<unsigned>(status));
-  return text;
-}
-
 void SetTraceSink(std::function<void(const std::string&)> sink) { TraceSink() = std::move(sink); }
 
 Host& Host::Current() {
   std::unique_ptr<Host>& current = CurrentHost();
-  if (current == nullptr) current = InFile(HostPath(kDatabase));
+  if (current == nullptr) current.reset(new Host("", nullptr));
   return *current;
 }
 
 void Host::Use(std::unique_ptr<Host> host) { CurrentHost() = std::move(host); }
 
+Host::Host(std::string path, std::unique_ptr<Store> store)
+    : path_(std::move(path)), store_(std::move(store)) {
+  if (store_ != nullptr) tree_.emplace(*store_);
+}
+
+int Host::SetPatience(int milliseconds) {
+  const std::unique_ptr<Host>& current = CurrentHost();
+  if (current != nullptr && current->store_ != nullptr) current->store_->SetPatience(milliseconds);
+  return host::SetPatience(milliseconds);
+}
+
+void Host::BeginRehearsal() {
+  Host& host = Current();
+  host.callsBefore_ = host.calls_;
+  Rehearsal::Begin();
+  if (host.store_ != nullptr) host.store_->BeginRehearsal();
+}
+
+std::vector<std::string> Host::TakeRehearsedCalls() { return std::exchange(Rehearsal::Current()->calls, {}); }
+
+void Host::EndRehearsal() noexcept {
+  const std::vector<std::string> trace = std::move(Rehearsal::Current()->trace);
+  Rehearsal::End();
+  Host& host = *CurrentHost();
+  host.calls_.swap(host.callsBefore_);
+  // Closing a file undoes what is not committed, too.
+  const bool isUndone = host.store_ == nullptr || host.store_->EndRehearsal() || host.path_.empty();
+  if (!isUndone || host.isStoreRehearsed_) {
+    host.tree_.reset();
+    host.store_.reset();
+    host.answersState_ = 0;
+  }
+  host.isStoreRehearsed_ = false;
+  for (const std::string& line : trace) std::fprintf(stderr, "%s\n", line.c_str());
+}
+
 std::unique_ptr<Host> Host::InMemory(const std::string& description) {
   return std::unique_ptr<Host>(new Host("", DescribedStore(description)));
 }
 
-std::unique_ptr<Host> Host::InFile(const std::string& path) {
-  return std::unique_ptr<Host>(new Host(path, nullptr));
-}
-
 Store& Host::GetStore() {
   if (store_ != nullptr) return *store_;
+  if (path_.empty()) path_ = HostPath(kDatabase);
   struct stat status;
   if (!IsRegularFile("The host database", path_, status)) {
     for (const std::string& journal : JournalsOf(path_)) {
       // A new host would take the changes in it for its own. What another process has just made is no matter.
       if (lstat(journal.c_str(), &status) != 0 || lstat(path_.c_str(), &status) == 0) continue;
-      throw Error(Error::Kind::Failed, "The host database " + path_ + " is gone, and its journal " + journal +
-                                           " is still there: put the database back, or remove the journal"
-                                           " for a new host.");
+      throw Error(Error::Kind::DamagedFile,
+                  "The host database " + path_ + " is gone, and its journal " + journal +
+                      " is still there: put the database back, or remove the journal"
+                      " for a new host.");
+    }
+    if (Rehearsal::Current() != nullptr) {
+      isStoreRehearsed_ = true;
+      store_ = DescribedStore(std::string(DemoDescription()));
+      store_->BeginRehearsal();
+      tree_.emplace(*store_);
+      return *store_;
     }
     // Built whole before it gets its name: nobody ever opens half a host, and the first of two wins.
     const std::string bytes = DescribedStore(std::string(DemoDescription()))->Serialize();
@@ -92,45 +135,61 @@ Store& Host::GetStore() {
     NewFile file(path_);
     file.Write(bytes);
     file.Publish();
+  } else {
+    ClearLeftover(path_);
   }
   store_ = std::make_unique<Store>(path_);
+  if (Rehearsal::Current() != nullptr) store_->BeginRehearsal();
+  tree_.emplace(*store_);
   return *store_;
 }
 
 Error Host::Located(const Error& error) {
   if (error.GetKind() != Error::Kind::Damaged) return error;
-  return Error(Error::Kind::Failed,
+  return Error(Error::Kind::DamagedFile,
                "The host database " + GetStore().GetPath() + " is damaged: " + error.what() + ".");
 }
 
 template <class Work>
-void Host::Simulate(Transaction::Access access, Work work) try {
+void Host::Simulate(const char* call, Transaction::Access access, Work work) try {
   GetStore().CheckStructure();
   Transaction transaction(GetStore(), access);
   Tree tree(GetStore());
   work(tree);
   transaction.Commit();
+  Rehearsal* const rehearsal = Rehearsal::Current();
+  if (rehearsal != nullptr && access == Transaction::Access::Change) rehearsal->calls.emplace_back(call);
 } catch (const Error& error) {
   throw Located(error);
 }
 
-void Host::Load(const std::string& description) {
+void Host::Load(const std::string& text) {
+  // Nobody has to wait while a large one is read.
+  Description description = ReadDescription(text);
   // A page written before its time would lock out readers for the whole of a long load.
   GetStore().Execute("PRAGMA cache_spill=off");
-  Simulate(Transaction::Access::Change, [&](Tree& tree) { LoadDescription(tree, description); });
+  Simulate("Load(...)", Transaction::Access::Change,
+           [&](Tree& tree) { LoadDescription(tree, std::move(description)); });
 }
 
 std::string Host::Show(bool secrets) {
   std::string text;
-  Simulate(Transaction::Access::Read, [&](Tree& tree) { text = ShowDescription(tree, secrets); });
+  Simulate("Show()", Transaction::Access::Read, [&](Tree& tree) { text = ShowDescription(tree, secrets); });
   return text;
 }
 
-void Host::Reboot() { Simulate(Transaction::Access::Change, host::Reboot); }
+std::vector<WaitingChange> Host::ShowPending() {
+  std::vector<WaitingChange> changes;
+  Simulate("ShowPending()", Transaction::Access::Read, [&](Tree& tree) { changes = WaitingChanges(tree); });
+  return changes;
+}
+
+void Host::Reboot() { Simulate("Reboot()", Transaction::Access::Change, host::Reboot); }
 
 Host::Begun::Begun(Host& host, const Call& call, Transaction::Access access)
-    : transaction_(host.GetStore(), access), tree_(host.GetStore()) {
-  const std::vector<Object> answers = tree_.Children(kRoot, Kind::Answer);
+    : transaction_(host.GetStore(), access), tree_(*host.tree_) {
+  tree_.SetAnswer({});
+  const std::vector<Object>& answers = host.Answers(tree_);
   if (answers.empty()) return;  // who it is that calls matters to answers alone
   std::string adapter = call.adapter;
   if (call.object != 0) {
@@ -166,33 +225,65 @@ Host::Begun::Begun(Host& host, const Call& call, Transaction::Access access)
   }
 }
 
-bool Host::IsTracing() { return TraceSink() != nullptr || IsTraceWanted(); }
+const std::vector<Object>& Host::Answers(Tree& tree) {
+  if (const std::uint64_t state = store_->GetState(); state != answersState_) {
+    answers_ = tree.Children(kRoot, Kind::Answer);
+    answersState_ = state;
+  }
+  return answers_;
+}
+
+bool IsTracing() { return TraceSink() != nullptr || IsTraceWanted() || Rehearsal::Current() != nullptr; }
+
+std::int64_t Host::RehearsedChanges() {
+  const Rehearsal* rehearsal = Rehearsal::Current();
+  return rehearsal == nullptr ? 0 : GetStore().CountChanges() + rehearsal->FileChanges();
+}
+
+void Host::NoteRehearsed(const Call& call, std::int64_t before) {
+  Rehearsal* const rehearsal = Rehearsal::Current();
+  if (rehearsal == nullptr || RehearsedChanges() == before) return;
+  rehearsal->calls.push_back(Printable(std::string(call.operation.Name()) + "(" + call.arguments + ")"));
+}
 
 void Host::TraceSuccess(const Call& call, const std::string& outcome) {
-  if (!IsTracing()) return;
   if (IsTraceWanted() && store_ != nullptr) store_->EndReading();  // who reads the trace may keep it waiting
   Trace(call, "= " + (call.style == Call::Style::Ima && outcome == "ok" ? ImaStatusText(0) : outcome));
+}
+
+std::string Host::AdapterOf(const Call& call, const Error& error) {
+  // Whatever keeps the file locked would be waited for once more.
+  if (call.object == 0 || store_ == nullptr || error.GetKind() == Error::Kind::Busy) return call.adapter;
+  try {
+    const Transaction transaction(*store_, Transaction::Access::Read);
+    const auto adapter = Tree(*store_).Above(call.object, Kind::Adapter);
+    return adapter ? adapter->name : "";
+  } catch (const std::exception&) {
+    return "";
+  }
 }
 
 void Host::Fail(const Call& call) {
   if (store_ != nullptr)
     store_->EndReading();  // what was read is of no more use, and a report may have to wait
-  const auto trace = [&](std::uint32_t imaStatus, const char* exception, const std::string& text) {
-    if (!IsTracing()) return;
-    const std::string outcome =
-        call.style == Call::Style::Ima ? "= " + ImaStatusText(imaStatus) : std::string("! ") + exception;
+  const auto tell = [&](const Error& error, const char* exception) {
+    CallLog::Current().Failed(call, AdapterOf(call, error), error);
+    if (!call.traced) return;
+    const std::string outcome = call.style == Call::Style::Ima ? "= " + ImaStatusText(error.ImaStatus())
+                                                               : std::string("! ") + exception;
+    const std::string text = error.what();
     Trace(call, outcome + (text.empty() ? "" : ": " + text));
   };
   const auto fail = [&](const Error& error) {
     const bool coreCtl = error.GetThrown() == Error::Thrown::CoreCtlException ||
                          (error.GetThrown() == Error::Thrown::Usual && call.style == Call::Style::Lookup);
-    trace(error.ImaStatus(), coreCtl ? "CoreCtlException" : "NodeCtlException", error.what());
+    tell(error, coreCtl ? "CoreCtlException" : "NodeCtlException");
     throw error;
   };
   try {
     throw;
   } catch (const std::bad_alloc&) {
-    trace(0x80000002u, "std::bad_alloc", "");
+    tell(Error(Error::Kind::NoMemory, "out of memory"), "std::bad_alloc");
     throw;
   } catch (const Error& error) {
     fail(Located(error));

@@ -1,24 +1,23 @@
 /// The simulated host, and the one point that every library operation passes.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <type_traits>
 
 #include "host/Call.h"
+#include "host/CallLog.h"
 #include "host/Error.h"
+#include "host/Pending.h"
 #include "host/Tree.h"
 
 #pragma GCC visibility push(default)
 
 namespace host {
-
-/// What an IMA call answers that did its work and still has to report a failure.
-enum class ImaStatus : std::uint32_t { Success = 0 };
-/// As the trace shows it.
-std::string ImaStatusText(std::uint32_t status);
 
 class Host {
  public:
@@ -28,15 +27,22 @@ class Host {
   /// Makes @p host the current one. Null closes it, and the next Current() opens the one under HCLI_ROOT.
   static void Use(std::unique_ptr<Host> host);
 
+  /// How long calls of this process wait for another one, in milliseconds. Returns what held before.
+  static int SetPatience(int milliseconds);
+
+  /// A dry run: what calls change from now on lasts until EndRehearsal undoes it, and is seen in this process
+  /// alone. See Rehearsal and Store::BeginRehearsal.
+  static void BeginRehearsal();
+  /// The calls that have changed something since then, or since this was asked, as the trace shows them.
+  static std::vector<std::string> TakeRehearsedCalls();
+  static void EndRehearsal() noexcept;
+
   static std::unique_ptr<Host> InMemory(const std::string& description);
-  /// The host in the file @p path, which is made where it does not exist. Nothing is opened before it is
-  /// needed.
-  static std::unique_ptr<Host> InFile(const std::string& path);
 
   /// Runs @p body with a Tree& as the work of @p call: in one transaction, whole or not at all, durable when
   /// it returns. Answers of the description go before the body or instead of it, and the trace gets its line.
   /// Throws Error and std::bad_alloc, nothing else. The body of an operation that gives a status returns
-  /// Status.
+  /// Status. An Error that a body returns is thrown when its work is stored.
   template <class Body>
   auto Read(const Call& call, Body&& body) {
     return Run(call, Transaction::Access::Read, body);
@@ -56,18 +62,21 @@ class Host {
   }
 
   /// For the simulator's own use: neither traced nor answered.
-  void Load(const std::string& description);
+  /// @p text is a host description.
+  void Load(const std::string& text);
   std::string Show(bool secrets);
+  std::vector<WaitingChange> ShowPending();
   void Reboot();
 
   /// Opens the store where that was not done yet.
   Store& GetStore();
 
  private:
-  Host(std::string path, std::unique_ptr<Store> store) : path_(std::move(path)), store_(std::move(store)) {}
+  Host(std::string path, std::unique_ptr<Store> store);
 
+  /// @p call is what a rehearsal shows of it.
   template <class Work>
-  void Simulate(Transaction::Access access, Work work);
+  void Simulate(const char* call, Transaction::Access access, Work work);
 
   /// A transaction in which the answers have had their say: it throws, or its tree knows the status to give.
   class Begun {
@@ -79,13 +88,14 @@ class Host {
    private:
     Reading reading_;  // so that opening the store and the work itself read once
     Transaction transaction_;
-    Tree tree_;
+    Tree& tree_;
   };
 
   template <class Body>
   auto Run(const Call& call, Transaction::Access access, Body& body) {
     using Result = std::invoke_result_t<Body&, Tree&>;
-    return Traced(call, [&]() -> Result {
+    constexpr bool mayFailAfterAll = std::is_same_v<Result, std::optional<Error>>;
+    return Traced(call, [&]() -> std::conditional_t<mayFailAfterAll, void, Result> {
       Begun begun(*this, call, access);
       if constexpr (std::is_void_v<Result>) {
         body(begun.GetTree());
@@ -96,6 +106,10 @@ class Host {
         const Status status = body(begun.GetTree());
         begun.Commit();
         return answer.value_or(status);
+      } else if constexpr (mayFailAfterAll) {
+        const Result failure = body(begun.GetTree());
+        begun.Commit();
+        if (failure) throw Error(*failure);
       } else {
         Result result = body(begun.GetTree());
         begun.Commit();
@@ -108,12 +122,17 @@ class Host {
   auto Traced(const Call& call, Work work) -> std::invoke_result_t<Work&> {
     using Result = std::invoke_result_t<Work&>;
     try {
+      const std::int64_t changes = RehearsedChanges();
       if constexpr (std::is_void_v<Result>) {
         work();
-        TraceSuccess(call, "ok");
+        NoteRehearsed(call, changes);
+        CallLog::Current().Gave(call);
+        if (call.traced) TraceSuccess(call, "ok");
       } else {
         Result result = work();
-        if (IsTracing()) TraceSuccess(call, OutcomeText(result));
+        NoteRehearsed(call, changes);
+        Log(call, result);
+        if (call.traced) TraceSuccess(call, OutcomeText(result));
         return result;
       }
     } catch (...) {
@@ -122,11 +141,21 @@ class Host {
   }
 
   template <class Result>
+  static void Log(const Call& call, const Result& result) {
+    CallLog& log = CallLog::Current();
+    if constexpr (std::is_same_v<Result, Status>) {
+      log.Gave(call, result);
+    } else if constexpr (requires { result == nullptr; }) {
+      result == nullptr ? log.GaveNothing(call) : log.Gave(call);
+    } else {
+      log.Gave(call);
+    }
+  }
+
+  template <class Result>
   static std::string OutcomeText(const Result& result) {
     if constexpr (std::is_same_v<Result, Status>) {
       return std::to_string(static_cast<int>(result));
-    } else if constexpr (std::is_same_v<Result, ImaStatus>) {
-      return ImaStatusText(static_cast<std::uint32_t>(result));
     } else if constexpr (std::is_constructible_v<Argument, const Result&>) {
       return Argument(result).Text();
     } else if constexpr (requires { result == nullptr; }) {
@@ -136,17 +165,29 @@ class Host {
     }
   }
 
-  static bool IsTracing();
+  /// The operations that the description has answered; as they are in the transaction that @p tree reads in.
+  const std::vector<Object>& Answers(Tree& tree);
+  /// How many changes this rehearsal has seen; 0 where there is none.
+  std::int64_t RehearsedChanges();
+  /// Takes note of a call behind which there are more than @p before.
+  void NoteRehearsed(const Call& call, std::int64_t before);
   void TraceSuccess(const Call& call, const std::string& outcome);
+  /// The adapter that the call was on; empty where it cannot be told any more.
+  std::string AdapterOf(const Call& call, const Error& error);
   /// The error, with the file's name where what is in it makes no sense.
   Error Located(const Error& error);
   /// Traces the exception being handled and throws it on, as an Error or std::bad_alloc.
   [[noreturn]] void Fail(const Call& call);
 
-  std::string path_;  // empty in memory
+  std::string path_;  // empty in memory, and before the host of this process is opened
   std::unique_ptr<Store> store_;
+  std::optional<Tree> tree_;  // of the store, from one call to the next
+  std::vector<Object> answers_;
+  std::uint64_t answersState_ = 0;  // of the store, when they were read
   std::map<std::string, int, std::less<>>
       calls_;  // how often each operation, and each on an adapter, was called
+  std::map<std::string, int, std::less<>> callsBefore_;  // the same when the rehearsal began
+  bool isStoreRehearsed_ = false;                        // the store is this rehearsal's alone
 };
 
 /// Takes the lines of the trace, besides HCLI_TRACE=1 in the environment, which writes them to standard

@@ -48,7 +48,7 @@ std::string FreeIsid(const Object& adapter, const std::vector<Object>& sessions)
     std::string isid = Isid(adapter, qualifier);
     if (!taken.contains(isid)) return isid;
   }
-  throw Error(Error::Kind::Refused,
+  throw Error(Error::Kind::TooMany,
               "The adapter " + adapter.name + " has no session identifier left to give.");
 }
 
@@ -172,7 +172,7 @@ bool GoesBy(const Object& session, const WayOut& way) {
 Initiator::Initiator(Tree& tree, const Object& adapter)
     : tree_(tree), adapter_(adapter), network_(NetworkOf(tree)) {
   if (adapter.record.GetInt("state") != 0) {
-    throw Error(Error::Kind::Refused, "The adapter " + adapter.name + " is not online.");
+    throw Error(Error::Kind::WrongState, "The adapter " + adapter.name + " is not online.");
   }
   for (Object& sendTarget : tree.Children(adapter.id, Kind::SendTarget)) {
     const std::string name = sendTarget.name;
@@ -240,15 +240,15 @@ std::vector<const WayOut*> Initiator::WaysWithout(const std::vector<Object>& ses
   return ways;
 }
 
-bool Initiator::LoginWhereMissing(KnownTarget& target) {
+std::uint32_t Initiator::LoginWhereMissing(KnownTarget& target) {
   std::vector<Object> sessions;
   if (target.object.id != 0) sessions = tree_.Children(target.object.id, Kind::Session);
-  if (!sessions.empty() && PlacesOf(target).empty()) return true;  // nothing is left to log in at
+  if (!sessions.empty() && PlacesOf(target).empty()) return kDone;  // nothing is left to log in at
   const std::vector<const WayOut*> ways = WaysWithout(sessions);
-  return (ways.empty() && !sessions.empty()) || LoginByEach(target, ways);
+  return ways.empty() && !sessions.empty() ? kDone : LoginByEach(target, ways);
 }
 
-bool Initiator::LoginOnceMore(KnownTarget& target) {
+std::uint32_t Initiator::LoginOnceMore(KnownTarget& target) {
   const std::vector<Object> sessions = tree_.Children(OwnObject(tree_, target).id, Kind::Session);
   std::vector<const WayOut*> ways = WaysWithout(sessions);
   if (ways.empty() && !ways_.empty()) {
@@ -262,14 +262,14 @@ bool Initiator::LoginOnceMore(KnownTarget& target) {
   return LoginByEach(target, ways);
 }
 
-bool Initiator::LoginBeside(KnownTarget& target, const Object& session) {
+std::uint32_t Initiator::LoginBeside(KnownTarget& target, const Object& session) {
   const auto same =
       std::find_if(ways_.begin(), ways_.end(), [&](const WayOut& way) { return GoesBy(session, way); });
   if (same == ways_.end()) return LoginByEach(target, {});
   return LoginByEach(target, {&*same});
 }
 
-bool Initiator::LoginByEach(KnownTarget& target, const std::vector<const WayOut*>& ways) {
+std::uint32_t Initiator::LoginByEach(KnownTarget& target, const std::vector<const WayOut*>& ways) {
   Object& object = OwnObject(tree_, target);
   std::uint32_t status = ways.empty() ? kNoWayOut : kDone;
   for (const WayOut* way : ways) {
@@ -278,7 +278,7 @@ bool Initiator::LoginByEach(KnownTarget& target, const std::vector<const WayOut*
   }
   object.record.Set("loginStatus", std::int64_t{status});
   tree_.Update(object);
-  return status == kDone;
+  return status;
 }
 
 std::uint32_t Initiator::LoginBy(KnownTarget& target, const WayOut& way) {

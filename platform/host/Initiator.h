@@ -21,20 +21,20 @@ struct WayOut {
 
 class Initiator {
  public:
-  /// An Error (Refused) when the adapter is not online.
+  /// An Error (WrongState) when the adapter is not online.
   Initiator(Tree& tree, const Object& adapter);
 
   /// Asks the portal @p sendTarget for its targets, by the first way out on which it answers.
   SendTargetsAnswer Ask(const Object& sendTarget);
 
-  /// One session by each way out by which the target has none; where it has them all, nothing happens. False
-  /// when one of them fails. The target's status word tells of the first failure that was answered, else of
-  /// the first, or of none.
-  bool LoginWhereMissing(KnownTarget& target);
+  /// One session by each way out by which the target has none; where it has them all, nothing happens. Gives
+  /// the target's status word: it tells of the first failure that was answered, else of the first, or of
+  /// none (kDone).
+  std::uint32_t LoginWhereMissing(KnownTarget& target);
   /// The same; but where it has them all, one session more.
-  bool LoginOnceMore(KnownTarget& target);
+  std::uint32_t LoginOnceMore(KnownTarget& target);
   /// One session more beside @p session, by the same way out.
-  bool LoginBeside(KnownTarget& target, const Object& session);
+  std::uint32_t LoginBeside(KnownTarget& target, const Object& session);
 
  private:
   /// A portal at which a target can be logged in to, and the levels that hold there.
@@ -48,7 +48,7 @@ class Initiator {
   Request RequestFor(const Inheritance& levels) const;
   std::vector<const WayOut*> WaysWithout(const std::vector<Object>& sessions) const;
 
-  bool LoginByEach(KnownTarget& target, const std::vector<const WayOut*>& ways);
+  std::uint32_t LoginByEach(KnownTarget& target, const std::vector<const WayOut*>& ways);
   std::uint32_t LoginBy(KnownTarget& target, const WayOut& way);
   /// Keeps at the place, if the adapter has it, what a login has told of its portal group.
   void NoteTag(const KnownTarget& target, const Portal& portal, int tag);

@@ -44,6 +44,7 @@ std::string ParameterFault(const Record& adapter) {
 }
 
 std::string OverrideFault(const Record& place, const Record& adapter) {
+  if (place.GetRecord("parameters") == Record()) return {};  // as most have nothing of their own
   for (const ParameterSpec& spec : kParameters) {
     const std::string path = "parameters/" + std::string(spec.name);
     if (spec.type != Type::Integer || !place.Has(path)) continue;

@@ -70,7 +70,7 @@ Json WithoutPending(const Json& record) {
 }
 
 /// The record of @p json, its keys in the order of the schema and with the defaults of what a patch left out.
-Record Completed(Kind kind, Json json) { return Complete(kind, Record(std::move(json))); }
+Record Completed(Kind kind, const Json& json) { return Complete(kind, Record(json)); }
 
 Effect AskedFor(const std::optional<Status>& answer, Effect effect) {
   if (!answer) return effect;
@@ -90,8 +90,43 @@ void TakeEffectOf(Tree& tree, const Object& object, Effect until) {
     if (!reboot.empty()) record[kPending][std::string(WordOf(Effect::Reboot))] = std::move(reboot);
   }
   Object changed = object;
-  changed.record = Completed(object.kind, std::move(record));
+  changed.record = Completed(object.kind, record);
   tree.Update(changed);
+}
+
+std::string ValueText(const Json& value) {
+  return value.is_null() ? "" : value.is_string() ? value.get<std::string>() : value.dump();
+}
+
+/// Adds a change for each value that @p patch sets in @p record. @p change tells the rest.
+void AddChanges(const Json& record, const Json& patch, const WaitingChange& change,
+                std::vector<WaitingChange>& changes) {
+  for (const auto& [key, value] : patch.items()) {
+    WaitingChange one = change;
+    one.setting += (one.setting.empty() ? "" : "/") + key;
+    const Json before = record.is_object() ? record.value(key, Json()) : Json();
+    if (!value.is_object()) {
+      one.from = ValueText(before);
+      one.to = ValueText(value);
+      changes.push_back(std::move(one));
+    } else if (before.is_null() && value.contains("current")) {
+      // A parameter of the adapter that was at its standard: what it can be comes with its value.
+      one.from = ValueText(value.value("default", Json()));
+      one.to = ValueText(value["current"]);
+      changes.push_back(std::move(one));
+    } else {
+      AddChanges(before, value, one, changes);
+    }
+  }
+}
+
+void AddChanges(const Object& object, WaitingChange change, std::vector<WaitingChange>& changes) {
+  if (!object.record.Has(kPending)) return;
+  const Json record = object.record.GetJson();
+  for (const Effect effect : {Effect::Reset, Effect::Reboot}) {
+    change.effect = effect;
+    AddChanges(record, PatchOf(record, effect), change, changes);
+  }
 }
 
 }  // namespace
@@ -110,7 +145,7 @@ Object Configured(const Object& object) {
   Json record = WithoutPending(json);
   record.merge_patch(PatchOf(json, Effect::Reset));
   record.merge_patch(PatchOf(json, Effect::Reboot));
-  configured.record = Completed(object.kind, std::move(record));
+  configured.record = Completed(object.kind, record);
   return configured;
 }
 
@@ -146,8 +181,7 @@ Status StoreConfigured(Tree& tree, const Object& object, const Record& configure
   if (!pending.empty()) record[kPending] = std::move(pending);
   Object changed = object;
   // Where something waits, a change may concern a part of what is not in effect yet.
-  changed.record =
-      json.contains(kPending) ? Completed(object.kind, std::move(record)) : Record(std::move(record));
+  changed.record = json.contains(kPending) ? Completed(object.kind, record) : Record(record);
   tree.Update(changed);
   return status;
 }
@@ -157,6 +191,22 @@ void TakeEffect(Tree& tree, const Object& adapter, Effect until) {
   for (const Kind kind : {Kind::SendTarget, Kind::StaticTarget}) {
     for (const Object& place : tree.Children(adapter.id, kind)) TakeEffectOf(tree, place, until);
   }
+}
+
+std::vector<WaitingChange> WaitingChanges(Tree& tree) {
+  std::vector<WaitingChange> changes;
+  if (tree.Get(kRoot, Kind::Host).record.GetBool("softwareIscsi/rebootPending")) {
+    changes.push_back({{}, {}, "softwareIscsi/enabled", "true", "false", Effect::Reboot});
+  }
+  for (const Object& adapter : tree.Children(kRoot, Kind::Adapter)) {
+    AddChanges(adapter, {adapter.name, {}, {}, {}, {}, {}}, changes);
+    for (const Kind kind : {Kind::SendTarget, Kind::StaticTarget}) {
+      for (const Object& place : tree.Children(adapter.id, kind)) {
+        AddChanges(place, {adapter.name, place.name, {}, {}, {}, {}}, changes);
+      }
+    }
+  }
+  return changes;
 }
 
 }  // namespace host

@@ -32,6 +32,18 @@ Status StoreConfigured(Tree& tree, const Object& object, const Record& configure
 /// Reboot for a reboot too.
 void TakeEffect(Tree& tree, const Object& adapter, Effect until);
 
+/// A setting that will be different.
+struct WaitingChange {
+  std::string adapter;  // empty for the host's own
+  std::string place;    // the sendtarget or static target below the adapter; empty where it is none's
+  std::string setting;  // by the keys of the description, such as "network/mtu"
+  std::string from;     // what is in effect; empty where there is nothing
+  std::string to;       // empty where there will be nothing
+  Effect effect;        // what it waits for
+};
+/// All that waits, adapter by adapter.
+std::vector<WaitingChange> WaitingChanges(Tree& tree);
+
 }  // namespace host
 
 #pragma GCC visibility pop

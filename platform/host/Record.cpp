@@ -1,11 +1,12 @@
 #include "host/Record.h"
 
 #include <algorithm>
-#include <charconv>
+#include <array>
 #include <limits>
 #include <nlohmann/json.hpp>
-#include <vector>
+#include <optional>
 
+#include "host/Bson.h"
 #include "host/Error.h"
 #include "host/Formats.h"
 
@@ -13,137 +14,171 @@ namespace host {
 
 namespace {
 
+using bson::Cursor;
+using bson::Element;
+using bson::Type;
+
+constexpr int kMostDepth = 16;  // twice that of any kind of object
+
 [[noreturn]] void Damaged(std::string_view path, const char* what) {
   throw Error(Error::Kind::Damaged, "a record " + std::string(what) + " at \"" + std::string(path) + "\"");
 }
 
-/// The value at @p path below @p json, or null.
-const Json* Lookup(const Json* json, std::string_view path) {
-  while (json != nullptr && !path.empty()) {
-    const std::size_t slash = std::min(path.find('/'), path.size());
-    const std::string_view key = path.substr(0, slash);
-    path.remove_prefix(std::min(slash + 1, path.size()));
-    if (json->is_array()) {
-      std::size_t index = 0;
-      const auto [end, fault] = std::from_chars(key.data(), key.data() + key.size(), index);
-      json = fault == std::errc() && end == key.data() + key.size() && index < json->size() ? &(*json)[index]
-                                                                                            : nullptr;
+[[noreturn]] void TooDeep() { throw Error(Error::Kind::Damaged, "a record is nested too deeply"); }
+
+bool HoldsElements(Type type) { return type == Type::Document || type == Type::Array; }
+
+/// The element of @p key in the document at @p document.
+std::optional<Element> Member(std::string_view bytes, std::size_t document, std::string_view key) {
+  Cursor cursor(bytes, document);
+  for (Element element; cursor.Next(element);) {
+    // Without a call for those of another length, which most are.
+    if (element.key.size() == key.size() && element.key == key) return element;
+  }
+  return {};
+}
+
+/// Takes the first part off @p path.
+std::string_view FirstOf(std::string_view& path) {
+  const std::size_t slash = std::min(path.find('/'), path.size());
+  const std::string_view first = path.substr(0, slash);
+  path.remove_prefix(std::min(slash + 1, path.size()));
+  return first;
+}
+
+/// How far a path leads.
+struct Way {
+  Way() { documents[0] = 0; }  // the rest is set as it is come through
+
+  std::array<std::size_t, kMostDepth> documents;  // those that it goes through, the outermost first
+  std::size_t depth = 1;                          // how many they are
+  bool inArray = false;                           // the last one is an array
+  std::string_view key;                           // in that one
+  std::optional<Element> element;                 // what the key has there
+  std::string_view rest;                          // of the path, below the key
+
+  bool IsFound() const { return element && rest.empty(); }
+};
+
+Way WayTo(std::string_view bytes, std::string_view path) {
+  Way way;
+  for (;;) {
+    way.key = FirstOf(path);
+    way.element = Member(bytes, way.documents[way.depth - 1], way.key);
+    way.rest = path;
+    if (path.empty() || !way.element || !HoldsElements(way.element->type)) return way;
+    if (way.depth == kMostDepth) TooDeep();
+    way.documents[way.depth++] = way.element->value;
+    way.inArray = way.element->type == Type::Array;
+  }
+}
+
+/// Puts @p text in the place of the bytes from @p begin to @p end, all inside the documents of @p way.
+void Splice(std::string& bytes, const Way& way, std::size_t begin, std::size_t end, std::string_view text) {
+  const std::size_t before = bytes.size();
+  bytes.replace(begin, end - begin, text);
+  for (std::size_t i = 0; i < way.depth; ++i) {
+    const std::size_t place = way.documents[i];
+    const std::size_t size = static_cast<std::size_t>(bson::Int32At(bytes, place)) + bytes.size() - before;
+    bytes.replace(place, sizeof(std::int32_t), bson::Number32(static_cast<std::int32_t>(size)));
+  }
+}
+
+Element At(std::string_view bytes, std::string_view path) {
+  const Way way = WayTo(bytes, path);
+  if (!way.IsFound()) Damaged(path, "has nothing");
+  return *way.element;
+}
+
+std::size_t CountOf(std::string_view bytes, std::size_t document) {
+  std::size_t count = 0;
+  Cursor cursor(bytes, document);
+  for (Element element; cursor.Next(element);) ++count;
+  return count;
+}
+
+std::string TextValue(std::string_view path, std::string_view value) {
+  // The text is not repeated: it may be a secret.
+  const std::string fault = StorableFault(value);
+  if (!fault.empty()) throw Error(Error::Kind::Invalid, "The text for " + Quoted(path) + ' ' + fault + '.');
+  return bson::Text(value);
+}
+
+bool BooleanAt(std::string_view bytes, const Element& element) { return bytes[element.value] != '\0'; }
+
+Json JsonOf(std::string_view bytes, std::size_t document, bool isArray, int depth) {
+  if (depth > kMostDepth) TooDeep();
+  Json json = isArray ? Json::array() : Json::object();
+  Cursor cursor(bytes, document);
+  for (Element element; cursor.Next(element);) {
+    Json value;
+    switch (element.type) {
+      case Type::Text:
+        value = std::string(bson::TextOf(bytes, element));
+        if (!IsUtf8(value.get_ref<const std::string&>())) Damaged(element.key, "has no text");
+        break;
+      case Type::Document:
+      case Type::Array:
+        value = JsonOf(bytes, element.value, element.type == Type::Array, depth + 1);
+        break;
+      case Type::Boolean:
+        value = BooleanAt(bytes, element);
+        break;
+      case Type::Null:
+        break;
+      case Type::Int32:
+        value = bson::Int32At(bytes, element.value);
+        break;
+      case Type::Int64:
+        value = bson::Int64At(bytes, element.value);
+        break;
+      case Type::Double:
+        Damaged(element.key, "has no whole number");
+    }
+    if (isArray) {
+      json.push_back(std::move(value));
     } else {
-      const auto found = json->is_object() ? json->find(std::string(key)) : json->end();
-      json = json->is_object() && found != json->end() ? &*found : nullptr;
+      if (!IsUtf8(element.key)) bson::Damaged();
+      json.emplace(std::string(element.key), std::move(value));
     }
   }
   return json;
 }
 
-/// Builds what the parser reads. The library's own way compares each key with all before it, which takes a
-/// third of the time; here a record that has a key twice, as none that was stored has, is found by the first.
-class Builder {
- public:
-  using Text = Json::string_t;
-
-  explicit Builder(Json& top) : top_(top) {}
-
-  bool null() { return Add(nullptr); }
-  bool boolean(bool value) { return Add(value); }
-  bool number_integer(Json::number_integer_t value) { return Add(value); }
-  bool number_unsigned(Json::number_unsigned_t value) { return Add(value); }
-  bool number_float(Json::number_float_t value, const Text&) { return Add(value); }
-  bool string(Text& value) { return Add(std::move(value)); }
-  bool binary(Json::binary_t&) { return false; }
-  bool start_object(std::size_t) { return Open(Json::object()); }
-  bool key(Text& value) {
-    key_ = std::move(value);
-    return true;
-  }
-  bool end_object() { return Close(); }
-  bool start_array(std::size_t) { return Open(Json::array()); }
-  bool end_array() { return Close(); }
-  bool parse_error(std::size_t, const Text&, const Json::exception&) { return false; }
-
- private:
-  bool Add(Json value) {
-    if (open_.empty()) {
-      last_ = &(top_ = std::move(value));
-    } else if (open_.back()->is_array()) {
-      last_ = &open_.back()->emplace_back(std::move(value));
-    } else {
-      auto& members = open_.back()->get_ref<Json::object_t&>();
-      if (members.size() == members.capacity()) members.reserve(members.size() * 4 + 16);
-      last_ = &members.emplace_back(std::move(key_), std::move(value)).second;
-    }
-    return true;
-  }
-  bool Open(Json value) {
-    Add(std::move(value));
-    open_.push_back(last_);
-    return true;
-  }
-  bool Close() {
-    open_.pop_back();
-    return true;
-  }
-
-  Json& top_;
-  std::vector<Json*> open_;  // each the last element of the one before, so that none is moved while it grows
-  Json* last_ = nullptr;
-  Text key_;
-};
-
 }  // namespace
 
-Record::Record() : json_(std::make_shared<Json>(Json::object())) {}
-Record::Record(Json json) : json_(std::make_shared<Json>(std::move(json))) {}
-Record::Record(const Record& other) = default;
-Record::Record(Record&& other) noexcept = default;
-Record& Record::operator=(Record other) noexcept {
-  json_.swap(other.json_);
-  return *this;
-}
-Record::~Record() = default;
+Record::Record() : bytes_(bson::Document({})) {}
 
-Record Record::Parse(const std::string& text) {
-  Json json;
-  Builder builder(json);
-  const bool whole = Json::sax_parse(text, &builder);
-  if (!whole || !json.is_object()) throw Error(Error::Kind::Damaged, "a record is not a JSON object");
-  return Record(std::move(json));
+Record::Record(const Json& json) { Json::to_bson(json, bytes_); }
+
+Record Record::Stored(std::string_view bytes) {
+  Record record{std::string()};
+  record.Restore(bytes);
+  return record;
 }
 
-std::string Record::Text() const { return json_->dump(); }
-
-bool Record::Has(std::string_view path) const { return Lookup(json_.get(), path) != nullptr; }
-
-const Json& Record::At(std::string_view path) const {
-  const Json* json = Lookup(json_.get(), path);
-  if (json == nullptr) Damaged(path, "has nothing");
-  return *json;
+void Record::Restore(std::string_view bytes) {
+  if (Cursor(bytes, 0).End() + 1 != bytes.size()) bson::Damaged();
+  bytes_ = bytes;
 }
 
-void Record::Detach() {
-  if (json_.use_count() > 1) json_ = std::make_shared<Json>(*json_);
-}
+Json Record::GetJson() const { return JsonOf(bytes_, 0, false, 1); }
 
-Json& Record::Slot(std::string_view path) {
-  Detach();
-  const std::size_t slash = path.rfind('/');
-  const bool nested = slash != path.npos;
-  Json& owner = nested ? Slot(path.substr(0, slash)) : *json_;
-  if (owner.is_array()) return const_cast<Json&>(At(path));
-  if (!owner.is_object() && !owner.is_null()) Damaged(path, "has no record around what is");
-  return owner[std::string(nested ? path.substr(slash + 1) : path)];
-}
+bool Record::Has(std::string_view path) const { return WayTo(bytes_, path).IsFound(); }
 
-const std::string& Record::GetString(std::string_view path) const {
-  const Json& json = At(path);
-  if (!json.is_string()) Damaged(path, "has no text");
-  return json.get_ref<const std::string&>();
+std::string Record::GetString(std::string_view path) const {
+  const Element element = At(bytes_, path);
+  if (element.type != Type::Text) Damaged(path, "has no text");
+  const std::string_view text = bson::TextOf(bytes_, element);
+  if (!IsUtf8(text)) Damaged(path, "has no text");
+  return std::string(text);
 }
 
 std::int64_t Record::GetInt64(std::string_view path) const {
-  const Json& json = At(path);
-  if (!json.is_number_integer()) Damaged(path, "has no whole number");
-  return json.get<std::int64_t>();
+  const Element element = At(bytes_, path);
+  if (element.type == Type::Int32) return bson::Int32At(bytes_, element.value);
+  if (element.type != Type::Int64) Damaged(path, "has no whole number");
+  return bson::Int64At(bytes_, element.value);
 }
 
 int Record::GetInt(std::string_view path) const {
@@ -154,9 +189,9 @@ int Record::GetInt(std::string_view path) const {
 }
 
 bool Record::GetBool(std::string_view path) const {
-  const Json& json = At(path);
-  if (!json.is_boolean()) Damaged(path, "has neither true nor false");
-  return json.get<bool>();
+  const Element element = At(bytes_, path);
+  if (element.type != Type::Boolean) Damaged(path, "has neither true nor false");
+  return BooleanAt(bytes_, element);
 }
 
 int Record::GetWord(std::string_view path, std::span<const std::string_view> words) const {
@@ -166,45 +201,81 @@ int Record::GetWord(std::string_view path, std::span<const std::string_view> wor
 }
 
 std::size_t Record::GetSize(std::string_view path) const {
-  const Json& json = At(path);
-  if (!json.is_array()) Damaged(path, "has no list");
-  return json.size();
+  const Element list = At(bytes_, path);
+  if (list.type != Type::Array) Damaged(path, "has no list");
+  return CountOf(bytes_, list.value);
 }
 
 Record Record::GetRecord(std::string_view path) const {
-  const Json& json = At(path);
-  if (!json.is_object()) Damaged(path, "has no record");
-  return Record(json);
+  const Element element = At(bytes_, path);
+  if (element.type != Type::Document) Damaged(path, "has no record");
+  return Record(bytes_.substr(element.value, element.end - element.value));
+}
+
+void Record::Put(std::string_view path, Type type, std::string_view value) {
+  const Way way = WayTo(bytes_, path);
+  const std::size_t document = way.documents[way.depth - 1];
+  if (!way.element && way.inArray && way.key != std::to_string(CountOf(bytes_, document))) {
+    Damaged(path, "has nothing");
+  }
+  if (way.element && !way.rest.empty() && way.element->type != Type::Null) {
+    Damaged(path, "has no record around what is");
+  }
+  // The records around the value that are not there yet, from within.
+  std::string made(value);
+  for (std::string_view rest = way.rest; !rest.empty();) {
+    const std::size_t slash = rest.rfind('/');
+    made = bson::Document(bson::ElementOf(type, rest.substr(slash + 1), made));
+    type = Type::Document;
+    rest = slash == rest.npos ? std::string_view() : rest.substr(0, slash);
+  }
+  const std::size_t end = Cursor(bytes_, document).End();
+  Splice(bytes_, way, way.element ? way.element->begin : end, way.element ? way.element->end : end,
+         bson::ElementOf(type, way.key, made));
 }
 
 void Record::Set(std::string_view path, std::string_view value) {
-  // The text is not repeated: it may be a secret.
-  const std::string fault = StorableFault(value);
-  if (!fault.empty()) throw Error(Error::Kind::Refused, "The text for " + Quoted(path) + ' ' + fault + '.');
-  Slot(path) = std::string(value);
+  Put(path, Type::Text, TextValue(path, value));
 }
 
-void Record::Set(std::string_view path, std::int64_t value) { Slot(path) = value; }
-void Record::Set(std::string_view path, bool value) { Slot(path) = value; }
-void Record::Set(std::string_view path, const Record& value) { Slot(path) = *value.json_; }
+void Record::Set(std::string_view path, std::int64_t value) {
+  if (value == static_cast<std::int32_t>(value)) {
+    Put(path, Type::Int32, bson::Number32(static_cast<std::int32_t>(value)));
+  } else {
+    Put(path, Type::Int64, bson::Number64(value));
+  }
+}
 
-void Record::Append(std::string_view path, const Record& value) {
-  if (!At(path).is_array()) Damaged(path, "has no list");
-  Slot(path).push_back(*value.json_);
+void Record::Set(std::string_view path, bool value) {
+  Put(path, Type::Boolean, std::string_view(value ? "\1" : "\0", 1));
+}
+
+void Record::Set(std::string_view path, const Record& value) { Put(path, Type::Document, value.bytes_); }
+
+void Record::Append(std::string_view path, const Record& value) { Set(NextOf(path), value); }
+void Record::Append(std::string_view path, std::string_view value) { Set(NextOf(path), value); }
+
+std::string Record::NextOf(std::string_view path) const {
+  return std::string(path) + '/' + std::to_string(GetSize(path));
 }
 
 void Record::Erase(std::string_view path) {
-  if (!Has(path)) return;
-  Detach();
-  const std::size_t slash = path.rfind('/');
-  const bool nested = slash != path.npos;
-  Json& owner = const_cast<Json&>(nested ? At(path.substr(0, slash)) : *json_);
-  const std::string key(nested ? path.substr(slash + 1) : path);
-  if (owner.is_array()) {
-    owner.erase(static_cast<std::size_t>(std::stoul(key)));
-  } else {
-    owner.erase(key);
+  const Way way = WayTo(bytes_, path);
+  if (!way.IsFound()) return;
+  std::size_t end = way.element->end;
+  std::string moved;
+  if (way.inArray) {
+    std::size_t number = 0;
+    Cursor cursor(bytes_, way.documents[way.depth - 1]);
+    for (Element element; cursor.Next(element);) {
+      if (element.begin == way.element->begin) continue;
+      const std::string key = std::to_string(number++);
+      if (element.begin < end) continue;
+      moved += bson::ElementOf(element.type, key, bytes_.substr(element.value, element.end - element.value));
+    }
+    end = cursor.End();
   }
+  Splice(bytes_, way, way.element->begin, end, moved);
 }
 
 }  // namespace host

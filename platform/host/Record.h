@@ -1,16 +1,19 @@
 /// The settings of one object: a JSON object behind typed getters and setters.
 ///
+/// It is kept in the form in which it is stored (Bson.h): reading a key costs what finding that key does, and
+/// nothing is made of the rest.
+///
 /// A path is a key, or keys and list indices with slashes between: "properties/vendor", "addresses/0/port".
 /// Records are stored complete, so a getter that finds nothing, or another type, means a damaged host and
 /// throws host::Error; a key that may be missing is asked for with Has first.
 #pragma once
 
 #include <cstdint>
-#include <memory>
 #include <nlohmann/json_fwd.hpp>
 #include <span>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #pragma GCC visibility push(default)
 
@@ -18,20 +21,25 @@ namespace host {
 
 using Json = nlohmann::ordered_json;
 
+namespace bson {
+enum class Type : unsigned char;
+}
+
 class Record {
  public:
   Record();
-  explicit Record(Json json);
-  Record(const Record& other);
-  Record(Record&& other) noexcept;
-  Record& operator=(Record other) noexcept;
-  ~Record();
+  /// @p json is an object.
+  explicit Record(const Json& json);
 
-  static Record Parse(const std::string& text);
-  std::string Text() const;
+  /// The record that is stored as @p bytes. That they are one is found out as they are read.
+  static Record Stored(std::string_view bytes);
+  /// Becomes that one, in the memory that it has.
+  void Restore(std::string_view bytes);
+  const std::string& Bytes() const { return bytes_; }
+  bool operator==(const Record&) const = default;
 
   bool Has(std::string_view path) const;
-  const std::string& GetString(std::string_view path) const;
+  std::string GetString(std::string_view path) const;
   std::int64_t GetInt64(std::string_view path) const;
   int GetInt(std::string_view path) const;
   bool GetBool(std::string_view path) const;
@@ -41,7 +49,8 @@ class Record {
   std::size_t GetSize(std::string_view path) const;
   Record GetRecord(std::string_view path) const;
 
-  /// Setters make the keys of the path that are missing. A text that cannot be stored is refused.
+  /// Setters make the keys of the path that are missing, and the next element of a list. A text that cannot
+  /// be stored is refused.
   void Set(std::string_view path, std::string_view value);
   void Set(std::string_view path, const char* value) { Set(path, std::string_view(value)); }
   void Set(std::string_view path, const std::string& value) { Set(path, std::string_view(value)); }
@@ -51,18 +60,20 @@ class Record {
   void Set(std::string_view path, const Record& value);
   /// Adds an element at the end of the list at @p path.
   void Append(std::string_view path, const Record& value);
+  void Append(std::string_view path, std::string_view value);
   /// Takes out a key or a list's element; no change where it is missing.
   void Erase(std::string_view path);
 
-  const Json& GetJson() const { return *json_; }
+  /// All of it, taken apart.
+  Json GetJson() const;
 
  private:
-  const Json& At(std::string_view path) const;
-  /// Goes ahead of each change.
-  void Detach();
-  Json& Slot(std::string_view path);
+  explicit Record(std::string bytes) : bytes_(std::move(bytes)) {}
+  void Put(std::string_view path, bson::Type type, std::string_view value);
+  /// The path of the element that the list at @p path does not have yet.
+  std::string NextOf(std::string_view path) const;
 
-  std::shared_ptr<Json> json_;  // shared with copies of this record until one is changed
+  std::string bytes_;
 };
 
 }  // namespace host

@@ -67,7 +67,7 @@ std::string AnswerFault(const Record& answer) {
     std::vector<std::string_view> names;
     for (const OperationSpec& one : kOperations) names.push_back(one.name);
     const std::string nearest = Nearest(name, names);
-    return "operation: no operation is called " + Quoted(name) +
+    return "operation: no operation is called " + Excerpt(name) +
            (nearest.empty() ? "" : "; did you mean " + Quoted(nearest) + "?");
   }
   const int given = answer.Has("throw") + answer.Has("status") + answer.Has("imaStatus");

@@ -1,6 +1,7 @@
 #include "host/Sessions.h"
 
 #include "host/Initiator.h"
+#include "host/LoginStatus.h"
 
 namespace host {
 
@@ -23,20 +24,26 @@ void LogoutFrom(Tree& tree, const Object& adapter, const Object& target,
 
 }  // namespace
 
-bool Login(Tree& tree, KnownTarget& target) { return InitiatorOf(tree, target).LoginOnceMore(target); }
-
-bool LoginLike(Tree& tree, KnownTarget& target, const Object& session) {
-  return InitiatorOf(tree, target).LoginBeside(target, session);
+std::optional<Error> Login(Tree& tree, KnownTarget& target) {
+  FailedLogins failed;
+  failed.Note(target, InitiatorOf(tree, target).LoginOnceMore(target));
+  return failed.GetError();
 }
 
-bool LoginAdapter(Tree& tree, const Object& adapter) {
+std::optional<Error> LoginLike(Tree& tree, KnownTarget& target, const Object& session) {
+  FailedLogins failed;
+  failed.Note(target, InitiatorOf(tree, target).LoginBeside(target, session));
+  return failed.GetError();
+}
+
+std::optional<Error> LoginAdapter(Tree& tree, const Object& adapter) {
   Initiator initiator(tree, adapter);
-  bool everywhere = true;
+  FailedLogins failed;
   for (const std::int64_t id : TargetIds(tree, adapter.id)) {
     KnownTarget target = GetTarget(tree, id);
-    if (!initiator.LoginWhereMissing(target)) everywhere = false;
+    failed.Note(target, initiator.LoginWhereMissing(target));
   }
-  return everywhere;
+  return failed.GetError();
 }
 
 void LogoutSession(Tree& tree, const Object& session) {

@@ -1,6 +1,9 @@
 /// Logging in to targets, and out. Logins are refused (Error) on an adapter that is not online.
 #pragma once
 
+#include <optional>
+
+#include "host/Error.h"
 #include "host/Targets.h"
 
 #pragma GCC visibility push(default)
@@ -8,13 +11,13 @@
 namespace host {
 
 /// Logs in to @p target by each way out by which it has no session, and where it has one by each, with one
-/// session more; false when one fails. Its status word tells the outcome either way.
-bool Login(Tree& tree, KnownTarget& target);
+/// session more; an Error when one fails. Its status word tells the outcome either way.
+std::optional<Error> Login(Tree& tree, KnownTarget& target);
 /// One session more, by the way out of @p session, which is one of the target's.
-bool LoginLike(Tree& tree, KnownTarget& target, const Object& session);
-/// Logs in to every target of the adapter by each way out by which it has no session yet; false when one
+std::optional<Error> LoginLike(Tree& tree, KnownTarget& target, const Object& session);
+/// Logs in to every target of the adapter by each way out by which it has no session yet; an Error when one
 /// fails.
-bool LoginAdapter(Tree& tree, const Object& adapter);
+std::optional<Error> LoginAdapter(Tree& tree, const Object& adapter);
 
 /// Ends one session, those with a target, or all. A target that only its sessions kept goes with them.
 void LogoutSession(Tree& tree, const Object& session);

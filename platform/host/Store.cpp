@@ -6,52 +6,46 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
+#include <ctime>
 #include <new>
-#include <span>
 
 #include "host/Error.h"
 #include "host/Files.h"
 #include "host/Formats.h"
+#include "host/Tables.h"
 
 namespace host {
 
 namespace {
 
 constexpr int kFewPages = 64;
-constexpr int kApplicationId = 0x7465736f;  // marks a database as a host's
-constexpr int kVersion = 1;
 
-/// What brings a database of version @p from to the next one.
-struct Migration {
-  int from;
-  const char* sql;
-};
-constexpr std::span<const Migration> kMigrations{};
-
-constexpr const char* kTables =
-    "CREATE TABLE object(id INTEGER PRIMARY KEY AUTOINCREMENT, parent INTEGER NOT NULL, kind INTEGER NOT "
-    "NULL,"
-    " place INTEGER NOT NULL, name TEXT, record TEXT NOT NULL,"
-    " UNIQUE(parent, kind, place), UNIQUE(parent, kind, name));";
-
-/// Opens a connection. What SQLite sets aside for a long life, a process of one command would only pay for:
-/// each page that is touched for the first time is an interrupt.
-int Open(const char* path, sqlite3** database) {
-  static const int configured = [] {
-    sqlite3_config(SQLITE_CONFIG_PAGECACHE, nullptr, 0, 0);
-    return sqlite3_config(SQLITE_CONFIG_MEMSTATUS, 0);
-  }();
-  static_cast<void>(configured);  // without effect where SQLite works already
-  return sqlite3_open_v2(path, database, SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX | SQLITE_OPEN_NOFOLLOW,
-                         nullptr);
-}
-
-/// The same file by a path on which no folder is a link: SQLite would refuse those too.
+/// The same file by a path on which no folder is a link.
 std::string WithoutLinks(const std::string& path) {
   const std::size_t slash = path.rfind('/');
   const std::unique_ptr<char, void (*)(void*)> folder(
       realpath(slash == path.npos ? "." : path.substr(0, slash + 1).c_str(), nullptr), free);
   return folder == nullptr ? path : std::string(folder.get()) + "/" + path.substr(slash + 1);
+}
+
+/// Opens a connection. What SQLite sets aside for a long life, a process of one command would only pay for:
+/// each page that is touched for the first time is an interrupt.
+int Open(const std::string& path, sqlite3** database) {
+  static const int configured = [] {
+    sqlite3_config(SQLITE_CONFIG_PAGECACHE, nullptr, 0, 0);
+    sqlite3_config(SQLITE_CONFIG_LOOKASIDE, 0, 0);
+    return sqlite3_config(SQLITE_CONFIG_MEMSTATUS, 0);
+  }();
+  static_cast<void>(configured);  // without effect where SQLite works already
+  const auto open = [&](const std::string& name) {
+    return sqlite3_open_v2(name.c_str(), database,
+                           SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX | SQLITE_OPEN_NOFOLLOW, nullptr);
+  };
+  const int code = open(path);
+  if (code == SQLITE_OK || sqlite3_extended_errcode(*database) != SQLITE_CANTOPEN_SYMLINK) return code;
+  // SQLite refuses folders that are links, too.
+  sqlite3_close(*database);
+  return open(WithoutLinks(path));
 }
 
 /// What SQLite says quotes the file, and can be anything where that is damaged: then its words for @p code
@@ -73,6 +67,36 @@ void RollBack(Store& store) {
 
 int readings = 0;
 Store* kept = nullptr;  // the store with a transaction that is open for the sake of them
+time_t keptSince = 0;
+
+/// In seconds; asked for at each call, and so the clock that is read without counting.
+time_t Now() {
+  timespec now{};
+  clock_gettime(CLOCK_MONOTONIC_COARSE, &now);
+  return now.tv_sec;
+}
+
+bool IsKeptTooLong() { return Now() - keptSince > kPatienceMilliseconds / 2 / 1000; }
+
+Error::Kind KindOf(int code, int systemError) {
+  switch (code & 0xff) {
+    case SQLITE_CORRUPT:
+    case SQLITE_NOTADB:
+    case SQLITE_ERROR:  // a statement that fits every host does not fit this one
+      return Error::Kind::DamagedFile;
+    case SQLITE_BUSY:
+    case SQLITE_LOCKED:
+      return Error::Kind::Busy;
+    case SQLITE_READONLY:
+    case SQLITE_PERM:
+    case SQLITE_AUTH:
+      return Error::Kind::Denied;
+    case SQLITE_FULL:
+      return Error::Kind::NoSpace;
+    default:
+      return Error::KindOfSystem(systemError);
+  }
+}
 
 std::string Reason(int code, int systemError, const std::string& message) {
   switch (code & 0xff) {
@@ -113,21 +137,22 @@ Store::Store() : path_("in memory"), checked_(true) {
 
 Store::Store(const std::string& path) : path_(path) {
   struct stat status;
-  const auto refuse = [&](const std::string& reason) {
-    throw Error(Error::Kind::Failed, "The host database " + path_ + reason);
+  const auto refuse = [&](Error::Kind kind, const std::string& reason) {
+    throw Error(kind, "The host database " + path_ + reason);
   };
   if (!IsRegularFile("The host database", path, status)) {
-    refuse(std::string(" cannot be opened: ") + strerror(ENOENT) + ".");
+    refuse(Error::Kind::NotFound, std::string(" cannot be opened: ") + strerror(ENOENT) + ".");
   }
-  if (status.st_size == 0) refuse(" is damaged: it is empty.");
+  if (status.st_size == 0) refuse(Error::Kind::DamagedFile, " is damaged: it is empty.");
+  KeepPrivate(path, status);
   for (const std::string& journal : JournalsOf(path)) {
-    IsRegularFile("The host database's journal", journal, status);
+    if (IsRegularFile("The host database's journal", journal, status)) KeepPrivate(journal, status);
   }
   try {
-    const int code = Open(WithoutLinks(path).c_str(), &database_);
+    const int code = Open(path, &database_);
     if (code != SQLITE_OK) Fail(code);
-    SetPatience(kPatienceMilliseconds);
-    CheckVersion();
+    SetPatience(Patience());
+    UpdateTables(*this);
   } catch (...) {
     Close();
     throw;
@@ -142,35 +167,13 @@ void Store::Close() {
   sqlite3_close(database_);
 }
 
-void Store::CheckVersion() {
-  const auto refuse = [&](const std::string& reason) {
-    throw Error(Error::Kind::Failed, "The host database " + path_ + reason);
-  };
-  {
-    Transaction reading(*this, Transaction::Access::Read);  // one look at the file for both
-    if (Number("PRAGMA application_id") != kApplicationId) refuse(" is not a host database.");
-    const bool present = Number("PRAGMA user_version") == kVersion;
-    reading.Commit();
-    if (present) return;
-  }
-  Transaction transaction(*this, Transaction::Access::Change);
-  const std::int64_t version = Number("PRAGMA user_version");  // another process may have been first
-  if (version > kVersion) refuse(" belongs to a newer version of this program.");
-  if (version < 1) refuse(" is damaged: it has no schema version.");
-  for (const Migration& migration : kMigrations) {
-    if (migration.from >= version) Execute(migration.sql);
-  }
-  Execute(("PRAGMA user_version=" + std::to_string(kVersion)).c_str());
-  transaction.Commit();
-}
-
 void Store::CheckStructure() {
   if (checked_) return;
   Statement statement(*this, "PRAGMA integrity_check(1)");
-  const std::string found = statement.Step() ? statement.GetText(0) : "ok";
+  const std::string found(statement.Step() ? statement.GetText(0) : "ok");
   if (found != "ok") {
     // A heading may stand on a line of its own in front.
-    throw Error(Error::Kind::Failed,
+    throw Error(Error::Kind::DamagedFile,
                 "The host database " + path_ +
                     Reason(SQLITE_CORRUPT, 0, Words(found.substr(found.rfind('\n') + 1), SQLITE_CORRUPT)));
   }
@@ -182,10 +185,11 @@ bool Store::IsSmall() { return Number("PRAGMA page_count") <= kFewPages; }
 void Store::Fail(int code) {
   if ((code & 0xff) == SQLITE_NOMEM) throw std::bad_alloc();
   const bool real = sqlite3_errcode(database_) == (code & 0xff);
-  throw Error(Error::Kind::Failed,
-              "The host database " + path_ +
-                  Reason(code, real ? sqlite3_system_errno(database_) : 0,
-                         Words(real ? sqlite3_errmsg(database_) : sqlite3_errstr(code), code)));
+  const int systemError = real ? sqlite3_system_errno(database_) : 0;
+  throw Error(
+      KindOf(code, systemError),
+      "The host database " + path_ +
+          Reason(code, systemError, Words(real ? sqlite3_errmsg(database_) : sqlite3_errstr(code), code)));
 }
 
 void Store::SetPatience(int milliseconds) { sqlite3_busy_timeout(database_, milliseconds); }
@@ -262,6 +266,13 @@ Statement& Statement::Bind(std::string_view value) {
   return *this;
 }
 
+Statement& Statement::BindBytes(std::string_view value) {
+  const int code =
+      sqlite3_bind_blob(statement_, ++bound_, value.data(), static_cast<int>(value.size()), SQLITE_STATIC);
+  if (code != SQLITE_OK) store_.Fail(code);
+  return *this;
+}
+
 Statement& Statement::BindNull() {
   sqlite3_bind_null(statement_, ++bound_);
   return *this;
@@ -274,13 +285,23 @@ bool Statement::Step() {
   return false;
 }
 
+bool Statement::Insert() {
+  const int code = store_.Step(statement_);
+  if (code == SQLITE_DONE) return true;
+  if (sqlite3_extended_errcode(store_.database_) != SQLITE_CONSTRAINT_UNIQUE) store_.Fail(code);
+  return false;
+}
+
 std::int64_t Statement::GetInt(int column) const { return sqlite3_column_int64(statement_, column); }
 
-std::string Statement::GetText(int column) const {
+std::string_view Statement::GetText(int column) const {
   const auto* text = reinterpret_cast<const char*>(sqlite3_column_text(statement_, column));
-  return text == nullptr
-             ? ""
-             : std::string(text, static_cast<std::size_t>(sqlite3_column_bytes(statement_, column)));
+  return {text, static_cast<std::size_t>(sqlite3_column_bytes(statement_, column))};
+}
+
+std::string_view Statement::GetBytes(int column) const {
+  const auto* bytes = static_cast<const char*>(sqlite3_column_blob(statement_, column));
+  return {bytes, static_cast<std::size_t>(sqlite3_column_bytes(statement_, column))};
 }
 
 void Store::EndReading() {
@@ -293,6 +314,47 @@ void Store::EndReading() {
     throw;
   }
 }
+
+bool Store::IsInRehearsal() const {
+  return isRehearsing_ && kept != this && sqlite3_get_autocommit(database_) == 0;
+}
+
+void Store::BeginChange() {
+  if (!isRehearsing_) {
+    Statement(*this, "BEGIN IMMEDIATE").Step();
+    return;
+  }
+  if (!IsInRehearsal()) {
+    // The file stays as it is: no page is written ahead of a commit, and there will be none.
+    Execute("PRAGMA cache_spill=off; PRAGMA journal_mode=memory");
+    Statement(*this, "BEGIN IMMEDIATE").Step();
+  }
+  Statement(*this, "SAVEPOINT part").Step();
+}
+
+void Store::UndoPart() {
+  try {
+    Statement(*this, "ROLLBACK TO part").Step();
+    Statement(*this, "RELEASE part").Step();
+  } catch (const std::exception&) {
+    // A part that cannot be undone by itself is undone with all of it.
+    RollBack(*this);
+  }
+}
+
+bool Store::EndRehearsal() noexcept {
+  isRehearsing_ = false;
+  try {
+    EndReading();
+    if (sqlite3_get_autocommit(database_) == 0) RollBack(*this);
+    Execute("PRAGMA journal_mode=delete; PRAGMA cache_spill=on");
+  } catch (const std::exception&) {
+    return false;
+  }
+  return sqlite3_get_autocommit(database_) != 0;
+}
+
+std::int64_t Store::CountChanges() const { return sqlite3_total_changes64(database_); }
 
 Reading::Reading() { ++readings; }
 
@@ -307,42 +369,51 @@ Reading::~Reading() {
 
 Transaction::Transaction(Store& store, Access access) : store_(store), access_(access) {
   if (access == Access::Read) {
+    if (kept == &store && IsKeptTooLong()) store.EndReading();
     if (kept == &store) {
       open_ = false;
     } else {
-      Statement(store, "BEGIN").Step();
+      if (store.IsInRehearsal()) {
+        open_ = false;
+      } else {
+        Statement(store, "BEGIN").Step();
+      }
+      ++store.state_;
     }
   } else {
     store.EndReading();
     // Some damage shows as rows that are not there; what is written on top of it would be lost as well. In a
     // large file the look would take many times what a change does.
     if (store.IsSmall()) store.CheckStructure();
-    Statement(store, "BEGIN IMMEDIATE").Step();
+    isPart_ = store.isRehearsing_;
+    store.BeginChange();
+    ++store.state_;
   }
   store_.inTransaction_ = true;
 }
 
 Transaction::~Transaction() {
   store_.inTransaction_ = false;
-  if (open_) RollBack(store_);
+  if (open_ && isPart_) {
+    store_.UndoPart();
+  } else if (open_) {
+    RollBack(store_);
+  }
 }
 
 void Transaction::Commit() {
   if (open_) {
-    if (access_ == Access::Read && readings > 0 && kept == nullptr) {
+    if (isPart_) {
+      Statement(store_, "RELEASE part").Step();
+    } else if (access_ == Access::Read && readings > 0 && kept == nullptr) {
       kept = &store_;
+      keptSince = Now();
     } else {
       Statement(store_, "COMMIT").Step();
     }
   }
   open_ = false;
   store_.inTransaction_ = false;
-}
-
-void CreateTables(Store& store) {
-  store.Execute(kTables);
-  store.Execute(("PRAGMA application_id=" + std::to_string(kApplicationId)).c_str());
-  store.Execute(("PRAGMA user_version=" + std::to_string(kVersion)).c_str());
 }
 
 }  // namespace host

@@ -41,14 +41,25 @@ class Store {
   const std::string& GetPath() const { return path_; }
   /// True while a Transaction does its work.
   bool IsInTransaction() const { return inTransaction_; }
+  /// A number that is another one in each transaction: what was read under the same one is as it was.
+  std::uint64_t GetState() const { return state_; }
   /// Ends what a Reading keeps open.
   void EndReading();
   /// An Error where the file's structure is damaged. Looks once at the whole of it; later calls cost nothing.
   void CheckStructure();
   /// True where looking at the whole file takes no more than a few tenths of a millisecond.
   bool IsSmall();
-  /// How long a lock of another process is waited for; 20 seconds from the start.
+  /// How long a lock of another process is waited for; as host::Patience has it from the start.
   void SetPatience(int milliseconds);
+
+  /// A dry run: what transactions change lasts until EndRehearsal undoes it, and is seen by this object
+  /// alone. Nothing of it gets into a file. Others are kept from writing, not from reading, from the first
+  /// change on.
+  void BeginRehearsal() { isRehearsing_ = true; }
+  /// False where the database has to be closed for that.
+  bool EndRehearsal() noexcept;
+  /// How many rows have been written since the database was opened.
+  std::int64_t CountChanges() const;
 
   /// Tests only: statement @p number from now (1 is the next) fails with the SQLite code @p code without
   /// having run. 0 ends it.
@@ -62,8 +73,12 @@ class Store {
   sqlite3_stmt* Prepared(const char* sql);
   int Step(sqlite3_stmt* statement);
   [[noreturn]] void Fail(int code);
-  void CheckVersion();
   void Close();
+  /// True where the rehearsal's own transaction is open, around those of the calls. One failure or another
+  /// may have ended it.
+  bool IsInRehearsal() const;
+  void BeginChange();
+  void UndoPart();
 
   struct Fault {
     int countdown = 0;
@@ -73,6 +88,8 @@ class Store {
   std::string path_;
   bool checked_ = false;
   bool inTransaction_ = false;
+  bool isRehearsing_ = false;
+  std::uint64_t state_ = 0;
   sqlite3* database_ = nullptr;
   /// By the address of the text: each statement has one place in the code.
   std::vector<std::pair<const char*, sqlite3_stmt*>> statements_;
@@ -91,11 +108,16 @@ class Statement {
   /// Arguments are bound in order.
   Statement& Bind(std::int64_t value);
   Statement& Bind(std::string_view value);
+  Statement& BindBytes(std::string_view value);
   Statement& BindNull();
   /// Steps to the next row; false when there is none.
   bool Step();
+  /// Runs an insertion; false where a unique value is taken, which leaves all as it was.
+  bool Insert();
   std::int64_t GetInt(int column) const;
-  std::string GetText(int column) const;
+  /// They stay until the next Step.
+  std::string_view GetText(int column) const;
+  std::string_view GetBytes(int column) const;
 
  private:
   Store& store_;
@@ -106,7 +128,8 @@ class Statement {
 /// While one of these lives, all that is read comes from one state of the store, at the price of one
 /// transaction: that of the first read stays open for those that follow, until the last of these goes, or
 /// until something is changed. Others cannot write meanwhile, so none should live while a person, or a pipe,
-/// is waited for.
+/// is waited for. What has been open for half the time that they wait begins anew, so that one of these that
+/// is forgotten cannot make them fail.
 class Reading {
  public:
   Reading();
@@ -129,10 +152,9 @@ class Transaction {
   Store& store_;
   Access access_;
   bool open_ = true;
+  /// A part of the rehearsal's, and undone or kept within it.
+  bool isPart_ = false;
 };
-
-/// The tables of a new database.
-void CreateTables(Store& store);
 
 }  // namespace host
 

@@ -1,5 +1,6 @@
 #include "host/TargetSchema.h"
 
+#include <algorithm>
 #include <cstdio>
 
 #include "host/Formats.h"
@@ -8,14 +9,15 @@
 namespace host {
 
 std::string IpFault(std::string_view text) {
-  if (!ParseIpv4(text) && !ParseIpv6(text)) return Quoted(text) + " is no IP address";
+  if (!ParseIpv4(text) && !ParseIpv6(text)) return Excerpt(text) + " is no IP address";
   return CanonicalHostFault(text);
 }
 
 std::string TargetNameFault(std::string_view text) {
-  const auto wide = WideFromUtf8(text);
-  if (!wide || wide->empty()) return "expected a name";
-  return wide->size() <= 223 ? "" : "expected at most 223 characters";
+  if (text.empty() || !IsUtf8(text)) return "expected a name";
+  const auto characters =
+      std::count_if(text.begin(), text.end(), [](unsigned char c) { return (c & 0xc0U) != 0x80; });
+  return characters <= 223 ? "" : "expected at most 223 characters";
 }
 
 std::string IsidFault(std::string_view text) {

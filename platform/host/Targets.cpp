@@ -15,12 +15,12 @@ namespace {
 std::vector<Record> PortalsTo(Tree& tree, std::int64_t adapter, const std::string& name) {
   Statement statement(tree.GetStore(),
                       "SELECT record FROM object WHERE parent = ? AND kind = ? AND name > ? AND name < ?"
-                      " ORDER BY place");
+                      " ORDER BY id");
   const std::string least = name + ' ';
   const std::string most = name + '!';  // what follows a blank
   statement.Bind(adapter).Bind(static_cast<std::int64_t>(Kind::StaticTarget)).Bind(least).Bind(most);
   std::vector<Record> portals;
-  while (statement.Step()) portals.push_back(Record::Parse(statement.GetText(0)));
+  while (statement.Step()) portals.push_back(Record::Stored(statement.GetBytes(0)));
   std::erase_if(portals, [&](const Record& portal) { return portal.GetString("name") != name; });
   return portals;
 }
@@ -49,6 +49,11 @@ KnownTarget GetTarget(Tree& tree, std::int64_t id) {
     target.object.record = NewTarget(name);
   }
   return target;
+}
+
+std::int64_t OwnIdOf(Tree& tree, std::int64_t id) {
+  const std::optional<Object> named = tree.Lookup(id);
+  return named && named->kind == Kind::Target ? id : GetTarget(tree, id).object.id;
 }
 
 std::vector<std::int64_t> TargetIds(Tree& tree, std::int64_t adapter) {

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -35,11 +36,17 @@ class Tree {
   /// The object @p id; an Error (NotFound) where there is none, (WrongObject) where it is of another kind.
   Object Get(std::int64_t id, Kind kind);
   std::optional<Object> Lookup(std::int64_t id);
+  /// The same as Get without a copy, for walks: it stays until the next See, or a change. Who goes from one
+  /// object to the next in their order has them read ahead.
+  const Object& See(std::int64_t id, Kind kind);
   /// The child of that name (see NameOf), if there is one.
   std::optional<Object> Find(std::int64_t parent, Kind kind, std::string_view name);
   /// In order of place.
   std::vector<Object> Children(std::int64_t parent, Kind kind);
   std::vector<std::int64_t> ChildIds(std::int64_t parent, Kind kind);
+  /// Shows the id and the record of each to @p visit, which asks for no others of that kind.
+  void ForEachChild(std::int64_t parent, Kind kind,
+                    const std::function<void(std::int64_t id, const Record& record)>& visit);
   /// The closest object of @p kind at or above the object @p id, if there is one.
   std::optional<Object> Above(std::int64_t id, Kind kind);
 
@@ -50,6 +57,8 @@ class Tree {
   Object InsertNew(std::int64_t parent, Kind kind, const Record& given);
   /// Writes the record of @p object, and its name with it.
   void Update(const Object& object);
+  /// Removes all objects, the host's own too. Their ids are not used again either, but for that one.
+  void Clear();
   /// Removes the object and all that is below it.
   void Remove(std::int64_t id);
 
@@ -57,10 +66,19 @@ class Tree {
 
   /// The status that the description has the operation answer, where it does.
   const std::optional<Status>& Answer() const { return answer_; }
-  void SetAnswer(Status status) { answer_ = status; }
+  void SetAnswer(std::optional<Status> status) { answer_ = status; }
 
  private:
+  /// The object @p id where it was read ahead, in the state that the store is in.
+  const Object* Seen(std::int64_t id) const;
+  void ReadAhead(std::int64_t id);
+
   Store& store_;
+  std::vector<Object> ahead_;     // in the order of their ids; its members keep their memory
+  std::size_t aheadCount_ = 0;    // how many of them were read
+  mutable std::size_t seen_ = 0;  // the one that was asked for last
+  std::uint64_t aheadState_ = 0;  // of the store, when they were read
+  std::int64_t reach_ = 1;        // how many are read at a time
   std::optional<Status> answer_;
 };
 

@@ -41,7 +41,7 @@ ima::FirmwareImage ReadImage(const Object& physical, const IMA_WCHAR* path) {
   ima::FirmwareImage image = ima::ReadFirmwareImage(ima::Narrow(path));
   const std::string& model = physical.record.GetString("properties/model");
   if (!image.model.empty() && image.model != model) {
-    throw host::Error(host::Error::Kind::Refused, "The image is for another model than " + model + ".");
+    throw host::Error(host::Error::Kind::Invalid, "The image is for another model than " + model + ".");
   }
   return image;
 }
@@ -121,7 +121,7 @@ extern "C" IMA_STATUS IMA_PhbaDownload(IMA_OID phbaOid, IMA_PHBA_DOWNLOAD_IMAGE_
     const Object physical = ima::Get(tree, phbaOid, IMA_OBJECT_TYPE_PHBA);
     const ima::FirmwareImage image = ReadImage(physical, path);
     if (image.type != imageType) {
-      throw host::Error(host::Error::Kind::Refused, "The image is of another type than the download.");
+      throw host::Error(host::Error::Kind::Invalid, "The image is of another type than the download.");
     }
     for (Object& adapter : tree.Children(host::kRoot, Kind::Adapter)) {
       if (!host::IsIscsi(adapter) || !ShareHardware(physical, adapter)) continue;

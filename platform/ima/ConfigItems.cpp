@@ -31,7 +31,7 @@ extern "C" IMA_STATUS IMA_TSR_GetInternalConfigData(IMA_OID oid, IMA_UINT key, v
     for (const auto& item : ima::kItems) {
       if (item.key != key) continue;
       const IMA_UINT32 value = item.read(tree, oid);
-      if (size != sizeof value) throw Error(Error::Kind::Refused, "The item is of another size.");
+      if (size != sizeof value) throw Error(Error::Kind::Invalid, "The item is of another size.");
       std::memcpy(buffer, &value, sizeof value);
       return;
     }

@@ -26,7 +26,7 @@ class File {
  public:
   explicit File(const std::string& path)
       : path_(path), file_(open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK)) {
-    if (file_ < 0) Refuse(std::strerror(errno));
+    if (file_ < 0) RefuseForSystem();
   }
   File(const File&) = delete;
   File& operator=(const File&) = delete;
@@ -34,13 +34,16 @@ class File {
     if (file_ >= 0) close(file_);
   }
 
-  [[noreturn]] void Refuse(const std::string& why) const {
-    throw host::Error(host::Error::Kind::Refused,
-                      "The image " + host::Quoted(path_) + " is refused: " + why + ".");
+  [[noreturn]] void Refuse(const std::string& why,
+                           host::Error::Kind kind = host::Error::Kind::Invalid) const {
+    throw host::Error(kind, "The image " + host::Quoted(path_) + " is refused: " + why + ".");
+  }
+  [[noreturn]] void RefuseForSystem() const {
+    Refuse(std::strerror(errno), host::Error::KindOfSystem(errno));
   }
   std::uint64_t Size() const {
     struct stat status {};
-    if (fstat(file_, &status) != 0) Refuse(std::strerror(errno));
+    if (fstat(file_, &status) != 0) RefuseForSystem();
     if (!S_ISREG(status.st_mode)) Refuse("it is no file");
     return static_cast<std::uint64_t>(status.st_size);
   }
@@ -50,7 +53,7 @@ class File {
     while (length < bytes.size()) {
       const ssize_t got = read(file_, bytes.data() + length, bytes.size() - length);
       if (got < 0 && errno == EINTR) continue;
-      if (got < 0) Refuse(std::strerror(errno));
+      if (got < 0) RefuseForSystem();
       if (got == 0) break;
       length += static_cast<std::size_t>(got);
     }

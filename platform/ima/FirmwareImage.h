@@ -15,7 +15,7 @@ struct FirmwareImage {
   std::string model;  // empty for all
 };
 
-/// Reads the header of the file @p path and holds its length against it. Throws host::Error (Refused) with
+/// Reads the header of the file @p path and holds its length against it. Throws host::Error with
 /// the file and the reason for anything that is no whole image.
 __attribute__((visibility("default"))) FirmwareImage ReadFirmwareImage(const std::string& path);
 

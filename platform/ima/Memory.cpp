@@ -2,14 +2,25 @@
 
 #include <cstdlib>
 #include <new>
+#include <optional>
 #include <set>
+
+#include "host/Store.h"
 
 namespace ima {
 
 namespace {
 
-std::set<void*>& HandedOut() {
-  static std::set<void*> registry;
+struct Registry {
+  std::set<void*> handedOut;
+  /// What is called while a list is held is a walk, and sees one state of the host. It is the walk of the
+  /// list that was there first: one within it that is never given back keeps no transaction open.
+  std::optional<host::Reading> walk;
+  void* outermost = nullptr;
+};
+
+Registry& TheRegistry() {
+  static Registry registry;
   return registry;
 }
 
@@ -18,16 +29,28 @@ std::set<void*>& HandedOut() {
 void* Allocate(std::size_t size) {
   std::unique_ptr<void, void (*)(void*)> memory(std::calloc(1, size), std::free);
   if (memory == nullptr) throw std::bad_alloc();
-  HandedOut().insert(memory.get());
+  Registry& registry = TheRegistry();
+  registry.handedOut.insert(memory.get());
+  if (!registry.walk) {
+    registry.walk.emplace();
+    registry.outermost = memory.get();
+  }
   return memory.release();
 }
 
-std::size_t OutstandingAllocations() { return HandedOut().size(); }
+#ifdef HCLI_CHECKED
+std::size_t OutstandingAllocations() { return TheRegistry().handedOut.size(); }
+#endif
 
 }  // namespace ima
 
 extern "C" IMA_STATUS IMA_FreeMemory(void* memory) {
-  if (ima::HandedOut().erase(memory) == 0) return IMA_ERROR_INVALID_PARAMETER;
+  ima::Registry& registry = ima::TheRegistry();
+  if (registry.handedOut.erase(memory) == 0) return IMA_ERROR_INVALID_PARAMETER;
+  if (memory == registry.outermost) {
+    registry.walk.reset();
+    registry.outermost = nullptr;
+  }
   std::free(memory);
   return IMA_STATUS_SUCCESS;
 }

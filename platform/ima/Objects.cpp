@@ -25,8 +25,10 @@ host::Kind KindOf(IMA_OBJECT_TYPE type) {
 
 }  // namespace
 
-host::Object Get(host::Tree& tree, const IMA_OID& oid, IMA_OBJECT_TYPE type) {
-  host::Object object = tree.Get(IdOfType(oid, type), KindOf(type));
+host::Object Get(host::Tree& tree, const IMA_OID& oid, IMA_OBJECT_TYPE type) { return See(tree, oid, type); }
+
+const host::Object& See(host::Tree& tree, const IMA_OID& oid, IMA_OBJECT_TYPE type) {
+  const host::Object& object = tree.See(IdOfType(oid, type), KindOf(type));
   if (type == IMA_OBJECT_TYPE_LHBA && !host::IsPresent(tree, object)) {
     throw host::Error(host::Error::Kind::NotFound, "The adapter is gone.");
   }

@@ -16,6 +16,9 @@ inline constexpr IMA_OBJECT_TYPE kRouteType = 0x1000;
 /// is gone.
 host::Object Get(host::Tree& tree, const IMA_OID& oid, IMA_OBJECT_TYPE type);
 
+/// The same without a copy, as Tree::See.
+const host::Object& See(host::Tree& tree, const IMA_OID& oid, IMA_OBJECT_TYPE type);
+
 /// The same for a target.
 host::KnownTarget GetTarget(host::Tree& tree, const IMA_OID& oid);
 
@@ -31,7 +34,7 @@ IMA_STATUS ReadProperties(host::Operation operation, const IMA_OID& oid, IMA_OBJ
                           Properties* properties, Fill&& fill) noexcept {
   return ReadObject(operation, oid, [&](host::Tree& tree) {
     Properties filled{};
-    fill(tree, Get(tree, oid, type), filled);
+    fill(tree, See(tree, oid, type), filled);
     *properties = filled;
   });
 }

@@ -25,7 +25,8 @@ IMA_STATUS StatusOf(const Work& work) noexcept try {
 }
 
 /// Runs @p body with a Tree& and gives the status: what it throws is a failure, all else success. The body
-/// sets the out parameters as its last step.
+/// sets the out parameters as its last step. What it returns as an Error
+/// is a failure of a call that has changed something all the same.
 template <class Body>
 IMA_STATUS Read(const host::Call& call, Body&& body) noexcept {
   return StatusOf([&] { host::Host::Current().Read(call, body); });
@@ -33,13 +34,6 @@ IMA_STATUS Read(const host::Call& call, Body&& body) noexcept {
 template <class Body>
 IMA_STATUS Change(const host::Call& call, Body&& body) noexcept {
   return StatusOf([&] { host::Host::Current().Change(call, body); });
-}
-/// The same for a body that returns the status, of a call that changes something although it fails.
-template <class Body>
-IMA_STATUS ChangeWithStatus(const host::Call& call, Body&& body) noexcept {
-  host::ImaStatus answer{};
-  const IMA_STATUS status = StatusOf([&] { answer = host::Host::Current().Change(call, body); });
-  return status != IMA_STATUS_SUCCESS ? status : static_cast<IMA_STATUS>(answer);
 }
 
 /// The object ids on both sides: the sequence number of an OID is the id of the host's object.

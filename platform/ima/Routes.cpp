@@ -40,12 +40,12 @@ bool IsNetmask(const IMA_IP_ADDRESS& mask) {
 void Judge(const IMA_TSR_ROUTE_PROPERTIES& route) {
   const IMA_BOOL ipv4 = route.destination.ipv4Address;
   if (route.netmask.ipv4Address != ipv4 || route.gateway.ipv4Address != ipv4) {
-    throw Error(Error::Kind::Refused, "The addresses of the route are of different families.");
+    throw Error(Error::Kind::Invalid, "The addresses of the route are of different families.");
   }
-  if (!IsNetmask(route.netmask)) throw Error(Error::Kind::Refused, "The netmask of the route has gaps.");
+  if (!IsNetmask(route.netmask)) throw Error(Error::Kind::Invalid, "The netmask of the route has gaps.");
   for (int i = 0; i < (ipv4 ? 4 : 16); ++i) {
     if ((route.destination.ipAddress[i] & ~route.netmask.ipAddress[i]) != 0) {
-      throw Error(Error::Kind::Refused, "The destination of the route is not the address of its network.");
+      throw Error(Error::Kind::Invalid, "The destination of the route is not the address of its network.");
     }
   }
 }

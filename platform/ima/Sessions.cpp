@@ -32,8 +32,8 @@ void SetTime(const Record& record, const char* key, IMA_UINT32& present, IMA_DAT
   time = ima::Time(record.GetString(key));
 }
 
-/// The login that the object stands for; false when a target refuses.
-bool LoginTo(Tree& tree, const IMA_OID& oid) {
+/// The login that the object stands for; an Error when a target refuses.
+std::optional<host::Error> LoginTo(Tree& tree, const IMA_OID& oid) {
   switch (oid.objectType) {
     case IMA_OBJECT_TYPE_SESSION: {
       const Object session = ima::Get(tree, oid, IMA_OBJECT_TYPE_SESSION);
@@ -53,9 +53,9 @@ bool LoginTo(Tree& tree, const IMA_OID& oid) {
 
 extern "C" IMA_STATUS IMA_GetSessionOidList(IMA_OID targetOid, IMA_OID_LIST** list) {
   return ima::ReadObject("IMA_GetSessionOidList", targetOid, [&](Tree& tree) {
-    const host::KnownTarget target = ima::GetTarget(tree, targetOid);
     // Without an object of its own it has no sessions, and 0 is nothing's parent but the host's.
-    *list = ima::OidList(IMA_OBJECT_TYPE_SESSION, tree.ChildIds(target.object.id, Kind::Session)).release();
+    const std::int64_t target = host::OwnIdOf(tree, ima::IdOfType(targetOid, IMA_OBJECT_TYPE_TARGET));
+    *list = ima::OidList(IMA_OBJECT_TYPE_SESSION, tree.ChildIds(target, Kind::Session)).release();
   });
 }
 
@@ -122,12 +122,12 @@ extern "C" IMA_STATUS IMA_TSR_GetConnectionStatus(IMA_OID connectionOid, IMA_TSR
       });
 }
 
-extern "C" IMA_STATUS IMA_TSR_AddSession(IMA_OID oid, IMA_UINT, IMA_UINT, IMA_UINT) {
-  const auto call = host::Call::Ima("IMA_TSR_AddSession", ima::Id(oid), {ima::OidArgument(oid)});
+extern "C" IMA_STATUS IMA_TSR_AddSession(IMA_OID oid, IMA_UINT reserved1, IMA_UINT reserved2,
+                                         IMA_UINT reserved3) {
+  const auto call = host::Call::Ima("IMA_TSR_AddSession", ima::Id(oid),
+                                    {ima::OidArgument(oid), reserved1, reserved2, reserved3});
   // A refused login is kept: the target's status word tells of it.
-  return ima::ChangeWithStatus(call, [&](Tree& tree) {
-    return LoginTo(tree, oid) ? host::ImaStatus::Success : host::ImaStatus{IMA_ERROR_UNKNOWN_ERROR};
-  });
+  return ima::Change(call, [&](Tree& tree) { return LoginTo(tree, oid); });
 }
 
 extern "C" IMA_STATUS IMA_TSR_RemoveSession(IMA_OID oid) {

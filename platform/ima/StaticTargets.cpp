@@ -11,8 +11,9 @@ namespace {
 
 IMA_HOST_ID HostId(const std::string& host) {
   IMA_HOST_ID id{};
-  if (host::ParseIpv4(host) || host::ParseIpv6(host)) {
-    id.id.ipAddress = ima::Address(host);
+  const IMA_IP_ADDRESS address = ima::Address(host);
+  if (address.ipv4Address || host::ParseIpv6(host)) {
+    id.id.ipAddress = address;
   } else {
     id.hostnameInUse = IMA_TRUE;
     ima::SetWide(id.id.hostname, host);
@@ -23,16 +24,16 @@ IMA_HOST_ID HostId(const std::string& host) {
 }  // namespace
 
 IMA_UINT32 ima::ReadBootTarget(Tree& tree, const IMA_OID& staticTargetOid) {
-  return Get(tree, staticTargetOid, IMA_OBJECT_TYPE_STATIC_DISC_TARGET).record.GetBool("boot") ? 1 : 0;
+  return See(tree, staticTargetOid, IMA_OBJECT_TYPE_STATIC_DISC_TARGET).record.GetBool("boot") ? 1 : 0;
 }
 
 extern "C" IMA_STATUS IMA_GetStaticDiscoveryTargetOidList(IMA_OID lhbaOid, IMA_OID_LIST** list) {
   return ima::ReadObject("IMA_GetStaticDiscoveryTargetOidList", lhbaOid, [&](Tree& tree) {
     const Object adapter = ima::Get(tree, lhbaOid, IMA_OBJECT_TYPE_LHBA);
     std::vector<std::int64_t> ids;
-    for (const Object& target : tree.Children(adapter.id, Kind::StaticTarget)) {
-      if (host::IsStatic(target.record)) ids.push_back(target.id);
-    }
+    tree.ForEachChild(adapter.id, Kind::StaticTarget, [&](std::int64_t id, const host::Record& target) {
+      if (host::IsStatic(target)) ids.push_back(id);
+    });
     *list = ima::OidList(IMA_OBJECT_TYPE_STATIC_DISC_TARGET, ids).release();
   });
 }

@@ -13,16 +13,20 @@ namespace ima {
 
 namespace {
 
+constexpr std::string_view kTypes[] = {"unknown", "plugin",       "node",          "lhba",       "phba",
+                                       "portal",  "portal group", "pnp",           "lnp",        "target",
+                                       "lu",      "address",      "static target", "connection", "session"};
+
 std::string TypeText(IMA_OBJECT_TYPE type) {
-  static constexpr const char* kTypes[] = {
-      "unknown", "plugin", "node", "lhba",    "phba",          "portal",     "portal group", "pnp",
-      "lnp",     "target", "lu",   "address", "static target", "connection", "session"};
-  return type < std::size(kTypes) ? kTypes[type] : "type " + std::to_string(type);
+  return type < std::size(kTypes) ? std::string(kTypes[type]) : "type " + std::to_string(type);
 }
 
 }  // namespace
 
 host::Argument OidArgument(const IMA_OID& oid) {
+  if (oid.objectType < std::size(kTypes)) {
+    return host::Argument::Numbered(kTypes[oid.objectType], Id(oid));
+  }
   return host::Argument::Plain(TypeText(oid.objectType) + " " + std::to_string(oid.objectSequenceNumber));
 }
 
@@ -32,6 +36,10 @@ std::int64_t IdOfType(const IMA_OID& oid, IMA_OBJECT_TYPE type) {
 }
 
 void SetWide(IMA_WCHAR* destination, std::size_t size, std::string_view text) {
+  if (text.size() < size && host::IsAscii(text)) {  // as nearly all are
+    *std::copy(text.begin(), text.end(), destination) = L'\0';
+    return;
+  }
   const std::wstring wide = host::WideFromUtf8(text).value_or(L"");
   const std::size_t length = wide.copy(destination, size - 1);
   destination[length] = L'\0';
@@ -39,7 +47,7 @@ void SetWide(IMA_WCHAR* destination, std::size_t size, std::string_view text) {
 
 std::string Narrow(const IMA_WCHAR* wide) {
   const auto text = host::Utf8FromWide(wide);
-  if (!text) throw host::Error(host::Error::Kind::Refused, "The name is no UTF-32 text.");
+  if (!text) throw host::Error(host::Error::Kind::Invalid, "The name is no UTF-32 text.");
   return *text;
 }
 

@@ -22,7 +22,7 @@ template <std::size_t size>
 void SetWide(IMA_WCHAR (&destination)[size], std::string_view text) {
   SetWide(destination, size, text);
 }
-/// A file's name as UTF-8; an Error (Refused) where it has none.
+/// A file's name as UTF-8; an Error (Invalid) where it has none.
 std::string Narrow(const IMA_WCHAR* wide);
 
 /// All zero for a text that is no address.

@@ -57,8 +57,17 @@ void SetValue(KeyValues& settings, const std::string& key, const std::string& va
 Command::Command() { NodeData::Of(*this).isCommand = true; }
 Command::~Command() = default;
 
-boost::shared_ptr<CallSpec::InputSpec> Command::GetInputSpec() { return GetInputSpecInternal(); }
-boost::shared_ptr<CallSpec::OutputSpec> Command::GetOutputSpec() { return GetOutputSpecInternal(); }
+boost::shared_ptr<CallSpec::InputSpec> Command::GetInputSpec() {
+  auto spec = GetInputSpecInternal();
+  if (!spec) throw std::logic_error("a command declares no InputSpec");
+  return spec;
+}
+
+boost::shared_ptr<CallSpec::OutputSpec> Command::GetOutputSpec() {
+  auto spec = GetOutputSpecInternal();
+  if (!spec) throw std::logic_error("a command declares no OutputSpec");
+  return spec;
+}
 
 void Command::Execute(boost::shared_ptr<CallSpec::Input> input, boost::shared_ptr<CallSpec::Output> output) {
   ExecuteInternal(std::move(input), std::move(output));

@@ -16,6 +16,14 @@ Output::~Output() = default;
 
 namespace {
 
+/// A plug-in can derive from a specification, but what it declares is in ours alone.
+template <class OwnClass, class Spec>
+const OwnClass& Own(const Spec& spec, const char* name) {
+  const auto* const own = dynamic_cast<const OwnClass*>(&spec);
+  if (!own) throw std::logic_error(std::string("a command's ") + name + " was not made by its New()");
+  return *own;
+}
+
 class EnumConstraint final : public ParameterConstraint {
  public:
   void AddStringEnum(const std::string& value, const std::string& help) override {
@@ -43,7 +51,7 @@ class DeclaredParameter final : public ParameterSpec {
   /// Values may be added to the constraint at any time, so they are read last.
   Parameter Read() const {
     Parameter parameter = parameter_;
-    if (constraint_) parameter.allowed = static_cast<const EnumConstraint&>(*constraint_).values;
+    if (constraint_) parameter.allowed = Own<EnumConstraint>(*constraint_, "ParameterConstraint").values;
     return parameter;
   }
 
@@ -105,18 +113,16 @@ bool MayBeOperand(const Parameter& parameter) {
   return parameter.required && parameter.shortName.empty() && parameter.type != CallSpec::ParameterType::Flag;
 }
 
-// The specs' constructors are protected and the classes above are the only ones derived from them, so the
-// casts hold.
 std::vector<Parameter> ParametersOf(const CallSpec::InputSpec& spec) {
   std::vector<Parameter> parameters;
-  for (const auto& parameter : static_cast<const CallSpec::DeclaredInput&>(spec).parameters) {
-    parameters.push_back(static_cast<const CallSpec::DeclaredParameter&>(*parameter).Read());
+  for (const auto& parameter : CallSpec::Own<CallSpec::DeclaredInput>(spec, "InputSpec").parameters) {
+    parameters.push_back(CallSpec::Own<CallSpec::DeclaredParameter>(*parameter, "ParameterSpec").Read());
   }
   return parameters;
 }
 
 boost::shared_ptr<MetaObj::MetaObject> PrototypeOf(const CallSpec::OutputSpec& spec) {
-  return static_cast<const CallSpec::DeclaredOutput&>(spec).prototype;
+  return CallSpec::Own<CallSpec::DeclaredOutput>(spec, "OutputSpec").prototype;
 }
 
 const MetaObj::MetaStruct* StructureOf(const MetaObj::MetaObject& object) {

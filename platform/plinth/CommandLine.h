@@ -3,6 +3,7 @@
 
 #include <Plinth/AutoCli.h>
 #include <Plinth/MetaObj.h>
+#include <Plinth/Reasons.h>
 
 #include <boost/shared_ptr.hpp>
 #include <string>
@@ -21,6 +22,7 @@ enum ExitStatus : int {
   kUsage = 2,
   kResultAndReported = 3,
   kFailure = 4,
+  // Those of kReasonCodes follow, from 10 on.
 };
 
 /// What happened in a run.
@@ -38,6 +40,12 @@ struct RunRecord {
   bool closed = false;
   /// The text of a usage error (status 2) or of a failure of the program (status 4), else empty.
   std::string failure;
+  /// Nobody reads standard output any more: a failure, but one that is not told.
+  bool isUnread = false;
+  /// Why the library calls failed behind what was reported, in order.
+  std::vector<Reason> reasons;
+  /// What the calls did, or left to do, besides.
+  std::vector<std::string> notes;
 };
 
 /// True where the build holds commands to what they declare.
@@ -63,8 +71,9 @@ RunRecord RunCommand(AutoCli::Command& command, const std::vector<std::string>& 
 /// without fields is open: its fields are not looked at.
 std::string CheckResult(const MetaObj::MetaObject* prototype, const MetaObj::MetaObject& posted);
 
-/// The help of a node that stands at @p path ("" for the root), as --help shows it.
-std::string HelpText(AutoCli::NamespaceNode& node, const std::string& path);
+/// The help of a node that stands at @p path ("" for the root), as --help shows it on @p screen
+/// columns.
+std::string HelpText(AutoCli::NamespaceNode& node, const std::string& path, std::size_t screen);
 
 /// Hangs the framework's own commands under @p root.
 void RegisterOwnCommands(AutoCli::Namespace& root);
@@ -74,9 +83,12 @@ enum class PluginFolder { BuiltIn, Named };
 
 /// Loads each "*.so" of @p folder in the order of the names and hangs what it registers under @p root. One
 /// that cannot be loaded, or clashes with a name that is taken, leaves nothing behind. Returns a line for
-/// each trouble. Of a folder that was named, root loads nothing that somebody else could have put there.
-/// Files stay loaded until the process ends, since the tree holds objects of theirs.
-std::vector<std::string> LoadPlugins(AutoCli::Namespace& root, const std::string& folder, PluginFolder whose);
+/// each trouble. An empty name of a folder of its own means that nobody knows it. Of a folder that was named,
+/// root loads nothing that somebody else could have put there. Files stay loaded until the process ends,
+/// since the tree holds objects of theirs. Where "FIRST.so" registers the name @p first, it is the only one
+/// that is loaded.
+std::vector<std::string> LoadPlugins(AutoCli::Namespace& root, const std::string& folder, PluginFolder whose,
+                                     const std::string& first = {});
 
 /// The whole program: loads the plug-ins, runs the arguments and returns the exit status. @p folder is where
 /// plug-ins lie when neither --plugins nor HCLI_PLUGINS names another.

@@ -1,6 +1,6 @@
 #include <algorithm>
 
-#include "plinth/Options.h"
+#include "plinth/GlobalOptions.h"
 #include "plinth/OwnCommands.h"
 #include "plinth/Text.h"
 

@@ -1,11 +1,9 @@
 #include "plinth/Console.h"
 
-#include <signal.h>
-#include <termios.h>
+#include <sys/ioctl.h>
 #include <unistd.h>
 
 #include <cerrno>
-#include <cstring>
 
 namespace Plinth {
 
@@ -37,75 +35,13 @@ int FileSink::Flush() {
   return error_;
 }
 
-namespace {
+bool ProcessConsole::IsAsking() const { return isatty(STDIN_FILENO) == 1; }
+bool ProcessConsole::IsErrorTerminal() const { return isatty(STDERR_FILENO) == 1; }
 
-constexpr int kEndingSignals[] = {SIGHUP, SIGINT, SIGQUIT, SIGTERM};
-
-// Only one secret is read at a time.
-volatile sig_atomic_t caughtSignal = 0;
-
-void CatchSignal(int number) { caughtSignal = number; }
-
-/// Keeps a terminal from echoing. On every way out, a signal included, the terminal is as it was.
-class NoEcho {
- public:
-  NoEcho() {
-    if (tcgetattr(STDIN_FILENO, &before_) != 0) return;
-    isTerminal_ = true;
-    caughtSignal = 0;
-    // No SA_RESTART: the read has to come back to be given up.
-    struct sigaction action = {};
-    action.sa_handler = CatchSignal;
-    for (std::size_t index = 0; index < std::size(kEndingSignals); ++index) {
-      sigaction(kEndingSignals[index], &action, &actions_[index]);
-    }
-    termios quiet = before_;
-    quiet.c_lflag &= ~static_cast<tcflag_t>(ECHO);
-    tcsetattr(STDIN_FILENO, TCSAFLUSH, &quiet);
-  }
-  NoEcho(const NoEcho&) = delete;
-  NoEcho& operator=(const NoEcho&) = delete;
-  ~NoEcho() {
-    if (!isTerminal_) return;
-    tcsetattr(STDIN_FILENO, TCSAFLUSH, &before_);
-    for (std::size_t index = 0; index < std::size(kEndingSignals); ++index) {
-      sigaction(kEndingSignals[index], &actions_[index], nullptr);
-    }
-    if (caughtSignal != 0) raise(caughtSignal);
-  }
-
-  bool IsTerminal() const { return isTerminal_; }
-
- private:
-  bool isTerminal_ = false;
-  termios before_ = {};
-  struct sigaction actions_[std::size(kEndingSignals)] = {};
-};
-
-}  // namespace
-
-bool ProcessConsole::ReadSecret(const std::string& name, std::string& line) {
-  const NoEcho noEcho;
-  if (noEcho.IsTerminal()) {
-    error_.Write(name + ": ");
-    error_.Flush();
-  }
-  line.clear();
-  bool begun = false;
-  // Byte by byte: what stands behind the line is not ours.
-  for (char byte = 0;;) {
-    const ssize_t count = read(STDIN_FILENO, &byte, 1);
-    if (count < 0 && errno == EINTR && caughtSignal == 0) continue;
-    if (count <= 0) break;
-    begun = true;
-    if (byte == '\n') break;
-    line += byte;
-  }
-  if (noEcho.IsTerminal()) {
-    error_.Write("\n");
-    error_.Flush();
-  }
-  return begun;
+ScreenSize ProcessConsole::OutScreen() const {
+  winsize size{};
+  if (ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) != 0) return {};
+  return {size.ws_col, size.ws_row};
 }
 
 bool TextConsole::ReadSecret(const std::string&, std::string& line) {

@@ -48,6 +48,12 @@ class FileSink final : public Sink {
   std::array<char, 8192> buffer_;
 };
 
+/// In characters; zeros where there is no terminal, or one that does not tell.
+struct ScreenSize {
+  std::size_t columns = 0;
+  std::size_t rows = 0;
+};
+
 class Console {
  public:
   Console() = default;
@@ -60,6 +66,12 @@ class Console {
   /// Reads one line, without its newline, that must not be shown. @p name tells the user what is asked for.
   /// False where the input ended before a line began.
   virtual bool ReadSecret(const std::string& name, std::string& line) = 0;
+  /// True where a person is asked for secrets, rather than that they come from a pipe or a file.
+  virtual bool IsAsking() const = 0;
+  /// True where a person sees standard error.
+  virtual bool IsErrorTerminal() const = 0;
+  /// The terminal on which a person sees standard output.
+  virtual ScreenSize OutScreen() const = 0;
 };
 
 /// The three standard files of the process.
@@ -68,6 +80,9 @@ class ProcessConsole final : public Console {
   Sink& Out() override { return out_; }
   Sink& Error() override { return error_; }
   bool ReadSecret(const std::string& name, std::string& line) override;
+  bool IsAsking() const override;
+  bool IsErrorTerminal() const override;
+  ScreenSize OutScreen() const override;
 
  private:
   FileSink out_{1};
@@ -80,7 +95,13 @@ class TextConsole final : public Console {
   Sink& Out() override { return out; }
   Sink& Error() override { return error; }
   bool ReadSecret(const std::string& name, std::string& line) override;
+  bool IsAsking() const override { return isTerminal; }
+  bool IsErrorTerminal() const override { return isTerminal; }
+  ScreenSize OutScreen() const override { return screen; }
 
+  /// What is read and written counts as a person's.
+  bool isTerminal = false;
+  ScreenSize screen;
   TextSink out;
   TextSink error;
   /// What is left to read.

@@ -1,6 +1,6 @@
 #include "plinth/Formatter.h"
 
-#include <charconv>
+#include <utility>
 
 #include "plinth/Text.h"
 
@@ -8,74 +8,72 @@ namespace Plinth {
 
 using MetaObj::MetaType;
 
-namespace {
-
-struct Entry {
-  const char* name;
-  const Formatter& (*get)();
-};
-
-/// Every formatter there is, in the order that help shows.
-constexpr Entry kFormatters[] = {
-    {"simple", SimpleFormatter},
-    {"table", TableFormatter},
-    {"json", JsonFormatter},
-};
-
-}  // namespace
-
 std::vector<std::string> FormatterNames() {
   std::vector<std::string> names;
-  for (const Entry& entry : kFormatters) names.emplace_back(entry.name);
+  for (const Formatter& formatter : kFormatters) names.emplace_back(formatter.name);
   return names;
 }
 
 const Formatter* FindFormatter(const std::string& name) {
-  for (const Entry& entry : kFormatters) {
-    if (name == entry.name) return &entry.get();
+  for (const Formatter& formatter : kFormatters) {
+    if (name == formatter.name) return &formatter;
   }
   return nullptr;
 }
 
-std::vector<std::string> ShownFields(const Report& report, const MetaObj::MetaStruct& structure) {
+std::vector<std::string> ShownFields(const Report& report, const std::string& typeName) {
   if (!report.fields.empty()) return report.fields;
-  const std::string* fields = FindValue(report.settings, "fields:" + structure.GetTypeName());
+  const std::string* fields = FindValue(report.settings, "fields:" + typeName);
   if (!fields) fields = FindValue(report.settings, "fields");
-  return fields ? Split(*fields, ',') : FieldNames(structure);
+  return fields ? Split(*fields, ',') : std::vector<std::string>();
 }
 
-std::string ValueText(const MetaObj::MetaObject& value) {
-  switch (value.GetType()) {
+namespace {
+
+/// A structure or list in one line.
+std::string JoinedText(const MetaObj::MetaObject& value) {
+  std::string joined;
+  std::string space;
+  const auto append = [&](std::string_view separator, const MetaObj::MetaObject* part) {
+    joined.append(separator).append(ValueText(part, space));
+  };
+  if (value.GetType() == MetaType::List) {
+    std::string_view separator;
+    ForEachElement(
+        value, [&](const MetaObj::MetaObject& element) { append(std::exchange(separator, ", "), &element); });
+  } else {
+    ForEachField(static_cast<const MetaObj::MetaStruct&>(value), {},
+                 [&](const std::string& name, const MetaObj::MetaObject* field) {
+                   append((joined.empty() ? "" : " ") + Visible(name) + '=', field);
+                 });
+  }
+  return joined;
+}
+
+}  // namespace
+
+std::string_view ValueText(const MetaObj::MetaObject* value, std::string& space) {
+  if (!value) return "";
+  switch (value->GetType()) {
     case MetaType::Bool: {
-      const auto& truth = static_cast<const MetaObj::MetaBool&>(value);
+      const auto& truth = static_cast<const MetaObj::MetaBool&>(*value);
       return !truth.HasValue() ? "" : truth.GetValue() ? "true" : "false";
     }
     case MetaType::Int: {
-      const auto& number = static_cast<const MetaObj::MetaInt&>(value);
-      return number.HasValue() ? std::to_string(number.GetValue()) : "";
+      const auto& number = static_cast<const MetaObj::MetaInt&>(*value);
+      if (!number.HasValue()) return "";
+      return space = std::to_string(number.GetValue());
     }
-    case MetaType::String:
-      return Visible(static_cast<const MetaObj::MetaString&>(value).GetValue());
-    case MetaType::Struct: {
-      const auto& structure = static_cast<const MetaObj::MetaStruct&>(value);
-      std::vector<std::string> parts;
-      for (const std::string& name : FieldNames(structure)) {
-        parts.push_back(Visible(name) + '=' + FieldText(structure, name));
-      }
-      return Join(parts, " ");
+    case MetaType::String: {
+      const std::string& text = static_cast<const MetaObj::MetaString&>(*value).GetValue();
+      if (PlainLength(text) == text.size()) return text;
+      return space = Visible(text);
     }
-    case MetaType::List: {
-      std::vector<std::string> parts;
-      ForEachElement(value, [&](const MetaObj::MetaObject& element) { parts.push_back(ValueText(element)); });
-      return Join(parts, ", ");
-    }
+    case MetaType::Struct:
+    case MetaType::List:
+      return space = JoinedText(*value);
   }
   return "";
-}
-
-std::string FieldText(const MetaObj::MetaStruct& structure, const std::string& name) {
-  const MetaObj::MetaObject* field = FindField(structure, name);
-  return field ? ValueText(*field) : "";
 }
 
 void WritePlain(const MetaObj::MetaObject& result, Sink& sink) {
@@ -85,7 +83,11 @@ void WritePlain(const MetaObj::MetaObject& result, Sink& sink) {
     if (text.empty() || text.back() != '\n') sink.Write("\n");
     return;
   }
-  ForEachElement(result, [&](const MetaObj::MetaObject& element) { sink.Write(ValueText(element) + '\n'); });
+  std::string space;
+  ForEachElement(result, [&](const MetaObj::MetaObject& element) {
+    sink.Write(ValueText(&element, space));
+    sink.Write("\n");
+  });
 }
 
 }  // namespace Plinth

@@ -2,7 +2,7 @@
 
 #include "plinth/CommandLine.h"
 #include "plinth/Declarations.h"
-#include "plinth/Options.h"
+#include "plinth/GlobalOptions.h"
 #include "plinth/Text.h"
 
 namespace Plinth {
@@ -13,18 +13,16 @@ using AutoCli::Child;
 using AutoCli::NodeData;
 using CallSpec::ParameterType;
 
-constexpr std::size_t kWidth = 80;
-
-/// @p text with its own lines, each broken at blanks to fit behind @p indent blanks. The first line has no
-/// indent: something stands in front of it.
-std::string Wrap(const std::string& text, std::size_t indent) {
+/// @p text with its own lines, each broken at blanks to fit behind @p indent blanks within @p screen columns.
+/// The first line has no indent: something stands in front of it.
+std::string Wrap(const std::string& text, std::size_t indent, std::size_t screen) {
   std::string wrapped;
   for (const std::string& line : Split(Visible(text, Lines::Kept), '\n')) {
     if (!wrapped.empty()) wrapped += '\n' + std::string(indent, ' ');
     std::size_t column = indent;
     for (const std::string& word : Split(line, ' ')) {
       const std::size_t width = DisplayWidth(word);
-      if (column > indent && column + 1 + width > kWidth) {
+      if (column > indent && column + 1 + width > screen) {
         wrapped += '\n' + std::string(indent, ' ');
         column = indent;
       } else if (column > indent) {
@@ -70,7 +68,7 @@ std::string HelpOf(const Parameter& parameter) {
   return help;
 }
 
-std::string OptionsText(const std::vector<Parameter>& parameters) {
+std::string OptionsText(const std::vector<Parameter>& parameters, std::size_t screen) {
   std::string text;
   for (const Parameter& parameter : parameters) {
     text += parameter.shortName.empty() ? "      " : "  -" + parameter.shortName + ", ";
@@ -82,19 +80,20 @@ std::string OptionsText(const std::vector<Parameter>& parameters) {
     if (parameter.sensitive) {
       help += std::string(help.empty() ? "" : "\n") + "\"-\" reads it from standard input, without echo.";
     }
-    if (!help.empty()) text += std::string(10, ' ') + Wrap(help, 10) + '\n';
+    if (!help.empty()) text += std::string(10, ' ') + Wrap(help, 10, screen) + '\n';
   }
   return text;
 }
 
 /// Two columns, the second wrapped.
-std::string ListText(const std::vector<std::pair<std::string, std::string>>& rows) {
+std::string ListText(const std::vector<std::pair<std::string, std::string>>& rows, std::size_t screen) {
   std::size_t width = 0;
   for (const auto& row : rows) width = std::max(width, DisplayWidth(row.first));
   std::string text;
   for (const auto& [name, help] : rows) {
     text += "  " + name;
-    if (!help.empty()) text += std::string(width + 2 - DisplayWidth(name), ' ') + Wrap(help, width + 4);
+    if (!help.empty())
+      text += std::string(width + 2 - DisplayWidth(name), ' ') + Wrap(help, width + 4, screen);
     text += '\n';
   }
   return text;
@@ -102,25 +101,25 @@ std::string ListText(const std::vector<std::pair<std::string, std::string>>& row
 
 std::string Program(const std::string& path) { return path.empty() ? "hcli" : "hcli " + path; }
 
-std::string Description(const NodeData& data) {
-  return data.description.empty() ? "" : Wrap(data.description, 0) + "\n\n";
+std::string Description(const NodeData& data, std::size_t screen) {
+  return data.description.empty() ? "" : Wrap(data.description, 0, screen) + "\n\n";
 }
 
-std::string NamespaceHelp(const AutoCli::NamespaceNode& node, const std::string& path) {
+std::string NamespaceHelp(const AutoCli::NamespaceNode& node, const std::string& path, std::size_t screen) {
   const NodeData& data = NodeData::Of(node);
   std::string text = path.empty() ? "Usage: hcli [GLOBAL OPTIONS] COMMAND... [OPTIONS]\n\n"
                                   : "Usage: " + Program(path) + " COMMAND... [OPTIONS]\n\n";
-  text += Description(data);
+  text += Description(data, screen);
   std::vector<std::pair<std::string, std::string>> rows;
   for (const Child& child : data.children) {
     rows.emplace_back(Visible(child.name), NodeData::Of(*child.node).description);
   }
-  text += rows.empty() ? "There are no commands here.\n" : "Commands:\n" + ListText(rows);
-  if (path.empty()) text += "\nGlobal options:\n" + OptionsText(GlobalParameters());
+  text += rows.empty() ? "There are no commands here.\n" : "Commands:\n" + ListText(rows, screen);
+  if (path.empty()) text += "\nGlobal options:\n" + OptionsText(GlobalParameters(), screen);
   return text;
 }
 
-std::string ResultText(AutoCli::Command& command) {
+std::string ResultText(AutoCli::Command& command, std::size_t screen) {
   const auto prototype = PrototypeOf(*command.GetOutputSpec());
   if (!prototype) return "";
   const std::string kind = TypeName(prototype->GetType());
@@ -130,15 +129,15 @@ std::string ResultText(AutoCli::Command& command) {
   for (std::size_t index = 0; index < structure->GetFieldCount(); ++index) {
     rows.emplace_back(structure->GetFieldName(index), TypeName(structure->GetField(index)->GetType()));
   }
-  return "\nResult: " + kind + " with the fields\n" + ListText(rows);
+  return "\nResult: " + kind + " with the fields\n" + ListText(rows, screen);
 }
 
-std::string CommandHelp(AutoCli::Command& command, const std::string& path) {
+std::string CommandHelp(AutoCli::Command& command, const std::string& path, std::size_t screen) {
   const std::vector<Parameter> parameters = ParametersOf(*command.GetInputSpec());
   std::string usage = "Usage: " + Program(path);
   std::size_t column = DisplayWidth(usage);
   const auto add = [&](const std::string& part) {
-    if (column + part.size() > kWidth) {
+    if (column + part.size() > screen) {
       usage += "\n      ";  // the part begins with a blank
       column = 6;
     }
@@ -153,17 +152,17 @@ std::string CommandHelp(AutoCli::Command& command, const std::string& path) {
     add((operand ? " [--" : " --") + parameter.name + (operand ? "]" : "") + Placeholder(parameter));
   }
   if (optional) add(" [OPTIONS]");
-  std::string text = usage + "\n\n" + Description(NodeData::Of(command));
-  if (!parameters.empty()) text += "Options:\n" + OptionsText(parameters) + '\n';
+  std::string text = usage + "\n\n" + Description(NodeData::Of(command), screen);
+  if (!parameters.empty()) text += "Options:\n" + OptionsText(parameters, screen) + '\n';
   text += "hcli --help lists the global options.\n";
-  return text + ResultText(command);
+  return text + ResultText(command, screen);
 }
 
 }  // namespace
 
-std::string HelpText(AutoCli::NamespaceNode& node, const std::string& path) {
-  if (!NodeData::Of(node).isCommand) return NamespaceHelp(node, path);
-  return CommandHelp(dynamic_cast<AutoCli::Command&>(node), path);
+std::string HelpText(AutoCli::NamespaceNode& node, const std::string& path, std::size_t screen) {
+  if (!NodeData::Of(node).isCommand) return NamespaceHelp(node, path, screen);
+  return CommandHelp(dynamic_cast<AutoCli::Command&>(node), path, screen);
 }
 
 }  // namespace Plinth

@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <cstdio>
 
 #include "plinth/Formatter.h"
@@ -10,28 +11,34 @@ namespace {
 using MetaObj::MetaType;
 
 void WriteString(std::string_view text, Sink& sink) {
-  std::string quoted = "\"";
-  for (std::size_t at = 0; at < text.size();) {
-    const Character character = DecodeUtf8(text, at);
+  const auto standsForItself = [](unsigned char byte) {
+    return byte >= ' ' && byte < 0x80 && byte != '"' && byte != '\\';
+  };
+  sink.Write("\"");
+  while (true) {
+    const auto end = std::find_if_not(text.begin(), text.end(), standsForItself);
+    const auto length = static_cast<std::size_t>(end - text.begin());
+    sink.Write(text.substr(0, length));
+    text.remove_prefix(length);
+    if (text.empty()) break;
+    const Character character = DecodeUtf8(text, 0);
     if (!character.valid) {
-      quoted += "\xef\xbf\xbd";
-    } else if (character.code == '"' || character.code == '\\') {
-      quoted += '\\';
-      quoted += text[at];
+      sink.Write("\xef\xbf\xbd");
     } else if (character.code == '\n') {
-      quoted += "\\n";
+      sink.Write("\\n");
     } else if (character.code == '\t') {
-      quoted += "\\t";
+      sink.Write("\\t");
     } else if (character.code < 0x20) {
       char escape[8];
       std::snprintf(escape, sizeof escape, "\\u%04x", static_cast<unsigned>(character.code));
-      quoted += escape;
+      sink.Write(escape);
     } else {
-      quoted += text.substr(at, character.length);
+      if (character.code < 0x80) sink.Write("\\");
+      sink.Write(text.substr(0, character.length));
     }
-    at += character.length;
+    text.remove_prefix(character.length);
   }
-  sink.Write(quoted += '"');
+  sink.Write("\"");
 }
 
 /// Writes "," between the parts of an array or object.
@@ -48,6 +55,31 @@ class Separator {
   bool first_ = true;
 };
 
+/// A member of the document behind others.
+template <class Element, class Writer>
+void WriteList(const char* key, const std::vector<Element>& elements, Sink& sink, Writer write) {
+  sink.Write(std::string(", \"") + key + "\": [");
+  Separator separator(sink);
+  for (const Element& element : elements) {
+    separator.Next();
+    write(element, sink);
+  }
+  sink.Write("]");
+}
+
+/// What there is none of is null.
+void WriteReason(const Reason& reason, Sink& sink) {
+  const std::pair<const char*, const std::string&> members[] = {{"{\"operation\": ", reason.operation},
+                                                                {", \"adapter\": ", reason.adapter},
+                                                                {", \"code\": ", reason.code},
+                                                                {", \"text\": ", reason.text}};
+  for (const auto& [name, text] : members) {
+    sink.Write(name);
+    text.empty() ? sink.Write("null") : WriteString(text, sink);
+  }
+  sink.Write("}");
+}
+
 /// @p fields limits structures, unless it is empty; a field that the structure lacks is null.
 void WriteValue(const MetaObj::MetaObject* value, const std::vector<std::string>& fields, Sink& sink);
 
@@ -55,16 +87,12 @@ void WriteStructure(const MetaObj::MetaStruct& structure, const std::vector<std:
                     Sink& sink) {
   sink.Write("{");
   Separator separator(sink);
-  const auto write = [&](const std::string& name, const MetaObj::MetaObject* field) {
+  ForEachField(structure, fields, [&](const std::string& name, const MetaObj::MetaObject* field) {
     separator.Next();
     WriteString(name, sink);
     sink.Write(": ");
     WriteValue(field, {}, sink);
-  };
-  for (const std::string& name : fields) write(name, FindField(structure, name));
-  for (std::size_t index = 0; fields.empty() && index < structure.GetFieldCount(); ++index) {
-    write(structure.GetFieldName(index), structure.GetField(index).get());
-  }
+  });
   sink.Write("}");
 }
 
@@ -102,28 +130,18 @@ void WriteValue(const MetaObj::MetaObject* value, const std::vector<std::string>
   }
 }
 
-class Json final : public Formatter {
- public:
-  bool IsDocument() const override { return true; }
-
-  void Write(const Report& report, Sink& sink) const override {
-    sink.Write("{\"schema\": 1, \"status\": " + std::to_string(report.status) + ", \"messages\": [");
-    Separator separator(sink);
-    for (const std::string& message : report.messages) {
-      separator.Next();
-      WriteString(message, sink);
-    }
-    sink.Write("], \"result\": ");
-    WriteValue(report.result, report.fields, sink);
-    sink.Write("}\n");
-  }
-};
-
 }  // namespace
 
-const Formatter& JsonFormatter() {
-  static const Json formatter;
-  return formatter;
+void WriteJson(const Report& report, Sink& sink) {
+  sink.Write("{\"schema\": 1, \"status\": " + std::to_string(report.status));
+  if (report.line != 0) sink.Write(", \"line\": " + std::to_string(report.line));
+  WriteList("messages", report.messages, sink, WriteString);
+  if (!report.reasons.empty()) WriteList("reasons", report.reasons, sink, WriteReason);
+  if (!report.notes.empty()) WriteList("notes", report.notes, sink, WriteString);
+  if (report.calls) WriteList("calls", *report.calls, sink, WriteString);
+  sink.Write(", \"result\": ");
+  WriteValue(report.result, report.fields, sink);
+  sink.Write("}\n");
 }
 
 }  // namespace Plinth

@@ -13,6 +13,8 @@
 #include "plinth/CommandLine.h"
 #include "plinth/Declarations.h"
 #include "plinth/Failure.h"
+#include "plinth/LibraryFile.h"
+#include "plinth/OwnCommands.h"
 #include "plinth/Text.h"
 
 namespace Plinth {
@@ -23,19 +25,19 @@ using AutoCli::Child;
 using AutoCli::Namespace;
 using AutoCli::NodeData;
 
-/// The names of the framework's own commands stay free, so that no plug-in can take them away.
-constexpr std::string_view kReservedNames[] = {"catalogue", "completion"};
-
 /// The "*.so" files of the folder by name. False, with errno, where it cannot be read.
 bool ListPlugins(const std::string& folder, std::vector<std::string>& names) {
   const std::unique_ptr<DIR, int (*)(DIR*)> directory(opendir(folder.c_str()), closedir);
   if (!directory) return false;
+  errno = 0;  // how a folder that cannot be read on is told from one that has ended
   while (const dirent* entry = readdir(directory.get())) {
     const std::string_view name = entry->d_name;
     if (name.size() > 3 && name.substr(name.size() - 3) == ".so") names.emplace_back(name);
+    errno = 0;
   }
+  const bool isWhole = errno == 0;
   std::sort(names.begin(), names.end());
-  return true;
+  return isWhole;
 }
 
 /// Who else than root could have put code into the file or folder @p path; "" where nobody could, or where it
@@ -73,8 +75,8 @@ std::string LoadFile(const std::string& path, const boost::shared_ptr<Namespace>
 
 std::string FindClash(const Namespace& root, const Namespace& scratch) {
   for (const Child& child : NodeData::Of(scratch).children) {
-    const bool reserved = std::find(std::begin(kReservedNames), std::end(kReservedNames), child.name) !=
-                          std::end(kReservedNames);
+    const bool reserved = std::any_of(std::begin(kOwnCommands), std::end(kOwnCommands),
+                                      [&](const OwnCommand& own) { return child.name == own.name; });
     if (reserved || NodeData::FindChild(root, child.name)) {
       return "the name " + Quoted(child.name) + " is taken";
     }
@@ -82,30 +84,50 @@ std::string FindClash(const Namespace& root, const Namespace& scratch) {
   return "";
 }
 
+/// Takes in what the file @p name registers, whole or not at all. Returns the trouble, or "".
+std::string TakeIn(Namespace& root, const std::string& folder, const std::string& name, PluginFolder whose) {
+  const std::string path = folder + '/' + name;
+  // What a plug-in registers before it fails goes with this namespace.
+  const auto scratch = Namespace::New();
+  std::string trouble = StrangerFault(path, whose);
+  if (trouble.empty()) trouble = LibraryFault(path);
+  if (trouble.empty()) trouble = LoadFile(path, scratch);
+  if (trouble.empty()) trouble = FindClash(root, *scratch);
+  if (!trouble.empty()) return "plug-in " + Quoted(path) + " is left out: " + Visible(trouble);
+  for (const Child& child : NodeData::Of(*scratch).children) {
+    root.RegisterNamespaceNode(child.node, child.name);
+  }
+  return "";
+}
+
 }  // namespace
 
-std::vector<std::string> LoadPlugins(Namespace& root, const std::string& folder, PluginFolder whose) {
-  std::vector<std::string> troubles;
-  std::vector<std::string> names;
+std::vector<std::string> LoadPlugins(Namespace& root, const std::string& folder, PluginFolder whose,
+                                     const std::string& first) {
+  if (folder.empty() && whose == PluginFolder::BuiltIn) {
+    return {
+        "no plug-ins are loaded: where the program lies cannot be told without /proc; give their folder with "
+        "--plugins"};
+  }
   if (const std::string fault = StrangerFault(folder, whose); !fault.empty()) {
-    troubles.push_back("the plug-in folder " + Quoted(folder) + " is left out: " + fault);
-  } else if (!ListPlugins(folder, names)) {
+    return {"the plug-in folder " + Quoted(folder) + " is left out: " + fault};
+  }
+  std::vector<std::string> troubles;
+  const auto load = [&](const std::string& name) {
+    const std::string trouble = TakeIn(root, folder, name, whose);
+    if (!trouble.empty()) troubles.push_back(trouble);
+  };
+  // Each costs a tenth of a short command, so none is loaded for the sake of another one's words.
+  const std::string own = first.find('/') == first.npos ? first + ".so" : "";
+  const bool hasOwn = own.size() > 3 && access((folder + '/' + own).c_str(), F_OK) == 0;
+  if (hasOwn) load(own);
+  if (hasOwn && NodeData::FindChild(root, first)) return troubles;
+  std::vector<std::string> names;
+  if (!ListPlugins(folder, names)) {
     troubles.push_back("cannot read the plug-in folder " + Quoted(folder) + ": " + std::strerror(errno));
   }
   for (const std::string& name : names) {
-    const std::string path = folder + '/' + name;
-    // What a plug-in registers before it fails goes with this namespace.
-    const auto scratch = Namespace::New();
-    std::string trouble = StrangerFault(path, whose);
-    if (trouble.empty()) trouble = LoadFile(path, scratch);
-    if (trouble.empty()) trouble = FindClash(root, *scratch);
-    if (!trouble.empty()) {
-      troubles.push_back("plug-in " + Quoted(path) + " is left out: " + Visible(trouble));
-      continue;
-    }
-    for (const Child& child : NodeData::Of(*scratch).children) {
-      root.RegisterNamespaceNode(child.node, child.name);
-    }
+    if (!hasOwn || name != own) load(name);
   }
   return troubles;
 }

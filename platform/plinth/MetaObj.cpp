@@ -1,7 +1,10 @@
 #include <Plinth/MetaObj.h>
 
+#include <algorithm>
+#include <boost/make_shared.hpp>
 #include <boost/shared_ptr.hpp>
 #include <optional>
+#include <set>
 #include <utility>
 #include <vector>
 
@@ -31,9 +34,20 @@ using Bool = Scalar<MetaBool, bool, bool, MetaType::Bool>;
 using Int = Scalar<MetaInt, long long, long long, MetaType::Int>;
 using String = Scalar<MetaString, std::string, const std::string&, MetaType::String>;
 
+/// The one copy of a name, which stays. Thousands of rows have the same names, each at the same @p place.
+const std::string& Shared(const std::string& name, std::size_t place) {
+  static auto& names = *new std::set<std::string>;
+  static auto& before = *new std::vector<const std::string*>;
+  if (place < before.size() && *before[place] == name) return *before[place];
+  const std::string& shared = *names.insert(name).first;
+  before.resize(std::max(before.size(), place + 1), &shared);
+  before[place] = &shared;
+  return shared;
+}
+
 class Struct final : public MetaStruct {
  public:
-  explicit Struct(const std::string& typeName) : typeName_(typeName) {}
+  explicit Struct(const std::string& typeName) : typeName_(Shared(typeName, 0)) {}
 
   MetaType GetType() const override { return MetaType::Struct; }
   void SetField(const std::string& name, bool value) override { SetField(name, MetaBool::New(value)); }
@@ -47,16 +61,17 @@ class Struct final : public MetaStruct {
   }
   void SetField(const std::string& name, boost::shared_ptr<MetaObject> value) override {
     for (auto& field : fields_) {
-      if (field.first != name) continue;
+      if (*field.first != name) continue;
       field.second = std::move(value);
       return;
     }
-    fields_.emplace_back(name, std::move(value));
+    if (fields_.empty()) fields_.reserve(8);  // as many as most have
+    fields_.emplace_back(&Shared(name, fields_.size() + 1), std::move(value));
   }
 
   const std::string& GetTypeName() const override { return typeName_; }
   std::size_t GetFieldCount() const override { return fields_.size(); }
-  const std::string& GetFieldName(std::size_t index) const override { return fields_[index].first; }
+  const std::string& GetFieldName(std::size_t index) const override { return *fields_[index].first; }
   const boost::shared_ptr<MetaObject>& GetField(std::size_t index) const override {
     return fields_[index].second;
   }
@@ -67,8 +82,8 @@ class Struct final : public MetaStruct {
     SetField(name, boost::shared_ptr<MetaObject>(std::move(value)));
   }
 
-  std::string typeName_;
-  std::vector<std::pair<std::string, boost::shared_ptr<MetaObject>>> fields_;
+  const std::string& typeName_;
+  std::vector<std::pair<const std::string*, boost::shared_ptr<MetaObject>>> fields_;
 };
 
 class List final : public MetaList {
@@ -93,7 +108,7 @@ class List final : public MetaList {
 
 template <class Object, class... Arguments>
 boost::shared_ptr<Object> Make(Arguments&&... arguments) {
-  return boost::shared_ptr<Object>(new Object(std::forward<Arguments>(arguments)...));
+  return boost::make_shared<Object>(std::forward<Arguments>(arguments)...);
 }
 
 }  // namespace

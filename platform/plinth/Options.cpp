@@ -5,7 +5,6 @@
 #include <string_view>
 #include <utility>
 
-#include "plinth/Formatter.h"
 #include "plinth/Text.h"
 
 namespace Plinth {
@@ -148,14 +147,17 @@ void OptionTable::RequireAll() const {
                    Join(missing, ", "));
 }
 
-void OptionTable::ReadSecrets(Console& console) {
+void OptionTable::Inherit(const std::string& name, const OptionTable& other) {
+  Given& slot = Slot(*Find(name));
+  if (!slot.given) slot = other.For(name);
+}
+
+void OptionTable::ReadSecrets(const std::function<std::string(const Parameter&)>& read) {
   for (const Parameter& parameter : parameters_) {
     if (!parameter.sensitive) continue;
     for (std::string& text : Slot(parameter).texts) {
       if (text != "-") continue;
-      if (!console.ReadSecret(parameter.name, text)) {
-        throw UsageError("option " + OptionName(parameter) + ": standard input ended before the value");
-      }
+      text = read(parameter);
       CheckAllowed(parameter, text);
     }
   }
@@ -230,31 +232,6 @@ void ReadOption(const std::vector<std::string>& arguments, std::size_t& at,
                 const std::vector<OptionTable*>& tables) {
   if (arguments[at][1] == '-') return ReadLongOption(arguments, at, tables);
   ReadShortOptions(arguments, at, tables);
-}
-
-std::vector<Parameter> GlobalParameters() {
-  std::vector<AllowedValue> formatters;
-  for (const std::string& name : FormatterNames()) formatters.push_back({name, ""});
-  return {
-      {"output", ParameterType::String, "", "How to show the result: %ENUM%.", false, false, formatters},
-      {"fields",
-       ParameterType::String,
-       "",
-       "The fields to show, separated by commas, in this order.",
-       false,
-       false,
-       {}},
-      {"trace", ParameterType::Flag, "", "Show each call of the host's libraries.", false, false, {}},
-      {"plugins",
-       ParameterType::String,
-       "",
-       "The folder to load plug-ins from; HCLI_PLUGINS names it too.",
-       false,
-       false,
-       {}},
-      {"help", ParameterType::Flag, "h", "Show this help.", false, false, {}},
-      {"version", ParameterType::Flag, "", "Show the version.", false, false, {}},
-  };
 }
 
 }  // namespace Plinth

@@ -2,12 +2,12 @@
 #pragma once
 
 #include <cstddef>
+#include <functional>
 #include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
 
-#include "plinth/Console.h"
 #include "plinth/Declarations.h"
 
 namespace Plinth {
@@ -44,8 +44,10 @@ class OptionTable {
   /// Takes a value for the next parameter that may stand without its name. False where there is none.
   bool TakeOperand(const std::string& text);
   void RequireAll() const;
-  /// Replaces each sensitive value that is "-" by a line of the console.
-  void ReadSecrets(Console& console);
+  /// Takes over what @p other, of the same parameters, has for the parameter, unless it is given here.
+  void Inherit(const std::string& name, const OptionTable& other);
+  /// Replaces each sensitive value that is "-" by what @p read gives for its parameter.
+  void ReadSecrets(const std::function<std::string(const Parameter&)>& read);
 
  private:
   Given& Slot(const Parameter& parameter);
@@ -64,9 +66,6 @@ void ReadOption(const std::vector<std::string>& arguments, std::size_t& at,
 
 /// Reads a truth word: true, yes, y, 1, false, no, n or 0. False where @p text is none.
 bool ReadTruth(std::string_view text, bool& truth);
-
-/// The options that every command line may have.
-std::vector<Parameter> GlobalParameters();
 
 /// "--name" or "--name (-n)", as messages name a parameter.
 std::string OptionName(const Parameter& parameter);

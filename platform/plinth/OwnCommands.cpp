@@ -5,8 +5,9 @@
 namespace Plinth {
 
 void RegisterOwnCommands(AutoCli::Namespace& root) {
-  root.RegisterNamespaceNode(NewCatalogue(root), "catalogue");
-  root.RegisterNamespaceNode(NewCompletion(root), "completion");
+  for (const OwnCommand& command : kOwnCommands) {
+    root.RegisterNamespaceNode(command.make(root), command.name);
+  }
 }
 
 }  // namespace Plinth

@@ -15,6 +15,14 @@ boost::shared_ptr<AutoCli::Command> NewCatalogue(AutoCli::Namespace& root);
 /// Writes completion scripts for the tree under @p root, which outlives the command.
 boost::shared_ptr<AutoCli::Command> NewCompletion(AutoCli::Namespace& root);
 
+struct OwnCommand {
+  const char* name;
+  boost::shared_ptr<AutoCli::Command> (*make)(AutoCli::Namespace& root);
+};
+
+/// In the order in which they hang under the root. No plug-in gets one of these names.
+inline constexpr OwnCommand kOwnCommands[] = {{"catalogue", NewCatalogue}, {"completion", NewCompletion}};
+
 /// Calls @p visit(path, node) for each node under @p node in order of registration, a namespace ahead of
 /// its children. @p path leads to @p node.
 template <class Visitor>

@@ -7,25 +7,38 @@
 
 #include "plinth/CommandLine.h"
 #include "plinth/Failure.h"
+#include "plinth/GlobalOptions.h"
 #include "plinth/Options.h"
 
 namespace Plinth {
 
 namespace {
 
-/// The folder that --plugins names. It is needed before there is a tree to resolve the words in, and without
-/// them an option cannot be told from another one's value: so it counts in front of the first word alone.
-std::optional<std::string> NamedFolder(const std::vector<std::string>& arguments) {
+/// What is told by the options in front of the first word, and by that word itself.
+struct Beginning {
+  std::optional<std::string> folder;  // of --plugins
+  std::string word;                   // empty where there is none
+};
+
+/// The folder is needed before there is a tree to resolve the words in, and without them an option cannot be
+/// told from another one's value: so it counts in front of the first word alone.
+Beginning BeginningOf(const std::vector<std::string>& arguments) {
+  Beginning beginning;
+  if (arguments.empty()) return beginning;
+  if (!IsOption(arguments.front())) return {.folder = {}, .word = arguments.front()};
   OptionTable global(GlobalParameters());
+  std::size_t at = 0;
   try {
-    for (std::size_t at = 0; at < arguments.size() && IsOption(arguments[at]) && arguments[at] != "--";) {
+    while (at < arguments.size() && IsOption(arguments[at]) && arguments[at] != "--") {
       ReadOption(arguments, at, {&global});
     }
+    if (at < arguments.size() && arguments[at] != "--") beginning.word = arguments[at];
   } catch (const UsageError&) {
     // It will be told when the whole line is read.
   }
   const Given& given = global.For("plugins");
-  return given.given ? std::optional(given.texts.front()) : std::nullopt;
+  if (given.given) beginning.folder = given.texts.front();
+  return beginning;
 }
 
 /// A file opened later must not take the number of a standard file that is closed: results would be written
@@ -37,33 +50,41 @@ void HoldStandardFiles() {
   }
 }
 
-int RunWithPlugins(const std::vector<std::string>& arguments, const std::string& folder, PluginFolder whose,
-                   Console& console) {
+RunRecord RunWithPlugins(const std::vector<std::string>& arguments, const std::string& word,
+                         const std::string& folder, PluginFolder whose, Console& console) {
   // Kept to the end of the process, where nobody waits for the tree to be taken apart.
   static const auto& root = *new auto(AutoCli::Namespace::New());
-  for (const std::string& trouble : LoadPlugins(*root, folder, whose)) {
+  for (const std::string& trouble : LoadPlugins(*root, folder, whose, word)) {
     console.Error().Write("hcli: " + trouble + '\n');
   }
   console.Error().Flush();
   RegisterOwnCommands(*root);
-  return RunCommandLine(*root, arguments, console).status;
+  return RunCommandLine(*root, arguments, console);
 }
 
 }  // namespace
 
 int RunProgram(const std::vector<std::string>& arguments, const std::string& folder) {
   HoldStandardFiles();
-  // A closed pipe and a file that may not grow are told as any other failure to write.
-  signal(SIGPIPE, SIG_IGN);
+  // Neither a closed pipe nor a file that may not grow ends a command in the middle of its work.
+  const auto whenUnread = signal(SIGPIPE, SIG_IGN);
   signal(SIGXFSZ, SIG_IGN);
 
   ProcessConsole console;
   try {
-    const std::optional<std::string> early = NamedFolder(arguments);
-    const char* given = early ? early->c_str() : getenv("HCLI_PLUGINS");
-    const bool named = early || (given && *given);
-    return RunWithPlugins(arguments, named ? given : folder,
-                          named ? PluginFolder::Named : PluginFolder::BuiltIn, console);
+    const Beginning beginning = BeginningOf(arguments);
+    const char* given = beginning.folder ? beginning.folder->c_str() : getenv("HCLI_PLUGINS");
+    const bool named = beginning.folder || (given && *given);
+    // Kept as the tree is: a result of thousands of rows takes a tenth of the run to take apart.
+    static const RunRecord& record =
+        *new RunRecord(RunWithPlugins(arguments, beginning.word, named ? given : folder,
+                                      named ? PluginFolder::Named : PluginFolder::BuiltIn, console));
+    if (record.isUnread) {
+      // The end that the signal brings to other programs, now that the work is done.
+      signal(SIGPIPE, whenUnread);
+      raise(SIGPIPE);
+    }
+    return record.status;
   } catch (const std::bad_alloc&) {
     return OutOfMemory(console).status;
   }

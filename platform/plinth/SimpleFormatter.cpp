@@ -1,47 +1,61 @@
 #include "plinth/Formatter.h"
 #include "plinth/Text.h"
+#include "plinth/Tty.h"
 
 namespace Plinth {
 
 namespace {
 
-class Simple final : public Formatter {
- public:
-  void Write(const Report& report, Sink& sink) const override {
-    if (!StructureOf(*report.result)) return WritePlain(*report.result, sink);
-    bool first = true;
-    ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
-      if (!first) sink.Write("\n");
-      first = false;
-      if (const auto* structure = dynamic_cast<const MetaObj::MetaStruct*>(&element)) {
-        WriteStructure(report, *structure, sink);
-      } else {
-        WritePlain(element, sink);
-      }
-    });
-  }
+/// How structures of one type are shown.
+struct Style {
+  Style(const Report& report, const std::string& typeName)
+      : type(typeName),
+        fields(ShownFields(report, typeName)),
+        header(FindValue(report.settings, "header:" + typeName)),
+        isColored(report.isColored) {}
 
- private:
-  static void WriteStructure(const Report& report, const MetaObj::MetaStruct& structure, Sink& sink) {
-    if (const std::string* header = FindValue(report.settings, "header:" + structure.GetTypeName())) {
-      const auto lookup = [&](std::string_view name, std::string& value) {
-        const MetaObj::MetaObject* field = FindField(structure, std::string(name));
-        if (field) value = ValueText(*field);
-        return field != nullptr;
-      };
-      sink.Write(Expand(*header, lookup) + '\n');
-    }
-    for (const std::string& name : ShownFields(report, structure)) {
-      sink.Write("   " + Visible(name) + ": " + FieldText(structure, name) + '\n');
-    }
-  }
+  std::string type;
+  std::vector<std::string> fields;
+  /// Null where they have none.
+  const std::string* header;
+  bool isColored;
 };
+
+void WriteStructure(const Style& style, const MetaObj::MetaStruct& structure, Sink& sink) {
+  std::string space;
+  if (style.header) {
+    const auto lookup = [&](std::string_view name, std::string& value) {
+      const MetaObj::MetaObject* field = FindField(structure, std::string(name));
+      if (field) value = ValueText(field, space);
+      return field != nullptr;
+    };
+    const std::string header = Expand(*style.header, lookup);
+    sink.Write(style.isColored ? kHeading + header + kPlain + '\n' : header + '\n');
+  }
+  ForEachField(structure, style.fields, [&](const std::string& name, const MetaObj::MetaObject* field) {
+    sink.Write("   ");
+    sink.Write(Visible(name));
+    sink.Write(": ");
+    sink.Write(ValueText(field, space));
+    sink.Write("\n");
+  });
+}
 
 }  // namespace
 
-const Formatter& SimpleFormatter() {
-  static const Simple formatter;
-  return formatter;
+void WriteSimple(const Report& report, Sink& sink) {
+  const MetaObj::MetaStruct* shape = StructureOf(*report.result);
+  if (!shape) return WritePlain(*report.result, sink);
+  Style style(report, shape->GetTypeName());
+  bool first = true;
+  ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
+    if (!first) sink.Write("\n");
+    first = false;
+    if (element.GetType() != MetaObj::MetaType::Struct) return WritePlain(element, sink);
+    const auto& structure = static_cast<const MetaObj::MetaStruct&>(element);
+    if (structure.GetTypeName() != style.type) style = Style(report, structure.GetTypeName());
+    WriteStructure(style, structure, sink);
+  });
 }
 
 }  // namespace Plinth

@@ -26,10 +26,16 @@ Character DecodeUtf8(std::string_view text, std::size_t at) {
   return valid ? Character{code, length, true} : Character{first, 1, false};
 }
 
+std::size_t PlainLength(std::string_view text) {
+  const auto isPlain = [](char byte) { return byte >= ' ' && byte <= '~'; };
+  return static_cast<std::size_t>(std::find_if_not(text.begin(), text.end(), isPlain) - text.begin());
+}
+
 std::string Visible(std::string_view text, Lines lines) {
-  std::string visible;
+  std::size_t at = PlainLength(text);
+  std::string visible(text.substr(0, at));
   visible.reserve(text.size());
-  for (std::size_t at = 0; at < text.size();) {
+  while (at < text.size()) {
     const Character character = DecodeUtf8(text, at);
     const std::string_view bytes = text.substr(at, character.length);
     at += character.length;
@@ -69,14 +75,41 @@ int Columns(char32_t code) {
 }  // namespace
 
 std::size_t DisplayWidth(std::string_view visible) {
-  std::size_t width = 0;
-  for (std::size_t at = 0; at < visible.size();) {
+  std::size_t at = PlainLength(visible);
+  std::size_t width = at;
+  while (at < visible.size()) {
     const Character character = DecodeUtf8(visible, at);
     at += character.length;
     const int columns = character.code < 0x80 ? 1 : Columns(character.code);
     width += columns < 0 ? 1U : static_cast<std::size_t>(columns);
   }
   return width;
+}
+
+std::string Shortened(std::string_view visible, std::size_t width) {
+  const std::size_t whole = DisplayWidth(visible);
+  if (whole <= width) return std::string(visible);
+  // The mark takes one column. Up to where the columns of the front end, and from where those of the back
+  // begin.
+  const std::size_t front = width / 2;
+  const std::size_t back = whole - (width - 1 - front);
+  std::string shortened;
+  std::size_t column = 0;
+  bool isMarked = false;
+  for (std::size_t at = 0; at < visible.size();) {
+    const std::string_view character = visible.substr(at, DecodeUtf8(visible, at).length);
+    const std::size_t end = column + DisplayWidth(character);
+    const bool isFront = !isMarked && end <= front;
+    if (!isFront && !isMarked) {
+      shortened += "\xe2\x80\xa6";
+      isMarked = true;
+    }
+    // What combines with a character that is left out is left out with it.
+    if (isFront || (column >= back && (end > column || column > back))) shortened += character;
+    column = end;
+    at += character.size();
+  }
+  return shortened;
 }
 
 std::string Join(const std::vector<std::string>& parts, std::string_view separator) {

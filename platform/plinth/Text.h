@@ -23,6 +23,9 @@ Character DecodeUtf8(std::string_view text, std::size_t at);
 /// Whether Visible leaves newlines and tabs as they are.
 enum class Lines { Escaped, Kept };
 
+/// How many bytes at the front of @p text are printable ASCII, which every form of output shows as it is.
+std::size_t PlainLength(std::string_view text);
+
 /// @p text with control characters and invalid bytes written as "\n", "\t" or "\x1b", so that it can neither
 /// break a line nor steer a terminal.
 std::string Visible(std::string_view text, Lines lines = Lines::Escaped);
@@ -33,10 +36,15 @@ std::string Quoted(std::string_view text);
 /// Columns that a visible text takes on a terminal. Depends on LC_CTYPE for characters outside ASCII.
 std::size_t DisplayWidth(std::string_view visible);
 
+/// @p visible with its middle left out, and a mark there, so that it takes at most @p width columns, which
+/// are at least 1: of names, the end tells as much as the beginning.
+std::string Shortened(std::string_view visible, std::size_t width);
+
 std::string Join(const std::vector<std::string>& parts, std::string_view separator);
 std::vector<std::string> Split(std::string_view text, char separator);
 
-/// The candidate nearest to @p word by edits and swaps, or "" where none is reasonably near.
+/// The candidate nearest to @p word by edits and swaps, or "" where none is reasonably near; of several, the
+/// first. The platform's libraries, which cannot know the framework, have a wider rule of their own.
 std::string Nearest(std::string_view word, const std::vector<std::string>& candidates);
 
 /// @p text with each %Name% replaced by what @p lookup gives; a %Name% that it does not know (it returns

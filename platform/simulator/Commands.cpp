@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <string>
 
+#include "host/CallLog.h"
 #include "host/Description.h"
 #include "host/Error.h"
 #include "host/Files.h"
@@ -19,6 +20,8 @@ using CallSpec::ParameterType;
 
 constexpr const char* kFile = "file";
 constexpr const char* kSecrets = "secrets";
+/// Of a description: ten times what scripts/make-large-host writes of 100,000 targets, each with a session.
+constexpr std::size_t kMostBytes = std::size_t{1} << 30U;
 
 /// What the commands share: host failures are reported, results are posted.
 class SimulatorCommand : public AutoCli::Command {
@@ -51,6 +54,7 @@ class SimulatorCommand : public AutoCli::Command {
     try {
       output->SetResult(Run(*input));
     } catch (const host::Error& error) {
+      host::CallLog::Current().Failed(error);
       output->ReportError(error.what());
       return;
     }
@@ -80,13 +84,15 @@ class SimulatorLoad final : public SimulatorCommand {
   boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input& input) override {
     const std::string file = input.GetString(kFile);
     std::string description;
-    if (!host::ReadFile(file == "-" ? "/dev/stdin" : file, description)) {
-      throw host::Error(host::Error::Kind::Refused, "There is no file " + file + ".");
+    if (file == "-") {
+      host::ReadStandardInput(kMostBytes, description);
+    } else if (!host::ReadFile(file, kMostBytes, description)) {
+      throw host::Error(host::Error::Kind::NotFound, "There is no file " + file + ".");
     }
     try {
       return Load(description);
     } catch (const host::Error& error) {
-      if (error.GetKind() != host::Error::Kind::Refused) throw;
+      if (error.GetKind() != host::Error::Kind::Invalid) throw;
       throw host::Error(error.GetKind(), (file == "-" ? "standard input" : file) + ": " + error.what());
     }
   }
@@ -110,6 +116,37 @@ class SimulatorShow final : public SimulatorCommand {
 
   boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input& input) override {
     return MetaObj::MetaString::New(host::Host::Current().Show(input.GetFlag(kSecrets)));
+  }
+};
+
+class SimulatorPending final : public SimulatorCommand {
+ public:
+  SimulatorPending()
+      : SimulatorCommand("List the changes that wait for a reset of their adapter, or for a reboot.",
+                         "fetcher") {
+    SetDefaultOutputFormatter("table");
+  }
+
+ private:
+  static boost::shared_ptr<MetaObj::MetaStruct> Row(const host::WaitingChange& change) {
+    auto row = MetaObj::MetaStruct::New("PendingChange");
+    row->SetField("Adapter", change.adapter);
+    row->SetField("Place", change.place);
+    row->SetField("Setting", change.setting);
+    row->SetField("From", change.from);
+    row->SetField("To", change.to);
+    row->SetField("Waits For", std::string(host::kEffects[static_cast<std::size_t>(change.effect)]));
+    return row;
+  }
+
+  boost::shared_ptr<MetaObj::MetaObject> Prototype() override {
+    return MetaObj::MetaList::New(MetaObj::MetaType::Struct, Row({}));
+  }
+
+  boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input&) override {
+    const auto list = MetaObj::MetaList::New(MetaObj::MetaType::Struct, Row({}));
+    for (const host::WaitingChange& change : host::Host::Current().ShowPending()) list->Append(Row(change));
+    return list;
   }
 };
 
@@ -146,6 +183,10 @@ boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewShow() {
   return boost::shared_ptr<Plinth::AutoCli::NamespaceNode>(new SimulatorShow);
 }
 
+boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewPending() {
+  return boost::shared_ptr<Plinth::AutoCli::NamespaceNode>(new SimulatorPending);
+}
+
 boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewReset() {
   return boost::shared_ptr<Plinth::AutoCli::NamespaceNode>(new SimulatorReset);
 }
@@ -159,6 +200,7 @@ boost::shared_ptr<Plinth::AutoCli::Namespace> NewNamespace() {
   simulator->SetDescription("The simulated host behind the storage libraries.");
   simulator->RegisterNamespaceNode(NewLoad(), "load");
   simulator->RegisterNamespaceNode(NewShow(), "show");
+  simulator->RegisterNamespaceNode(NewPending(), "pending");
   simulator->RegisterNamespaceNode(NewReset(), "reset");
   simulator->RegisterNamespaceNode(NewReboot(), "reboot");
   return simulator;

@@ -7,6 +7,7 @@ namespace simulator {
 
 boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewLoad();
 boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewShow();
+boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewPending();
 boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewReset();
 boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewReboot();
 /// The namespace with its commands.

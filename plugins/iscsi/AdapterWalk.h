@@ -1,6 +1,6 @@
 /// The walk over the host's adapters, all or the one that the user named, that listing commands share.
 ///
-///     ListAdapters(input, output, {"Unable to list."}, kRow, NothingPassedOver,
+///     ListAdapters(input, output, Reporting("Unable to list."), GetListType(), NothingPassedOver,
 ///                  [](const ListedAdapter& listed, MetaList& list) { list.Append(...); });
 #pragma once
 
@@ -25,21 +25,14 @@ using PassedOver = bool (*)(iScsiInterface& adapter, const NodeCtl::Lib::NodeCtl
 inline bool NothingPassedOver(iScsiInterface&, const NodeCtl::Lib::NodeCtlException&) { return false; }
 inline bool EverythingPassedOver(iScsiInterface&, const NodeCtl::Lib::NodeCtlException&) { return true; }
 
-/// True where an adapter with a network stack of its own says, in exactly the words @p text, that it lacks
-/// the call. Of any other adapter that is a failure like all others.
-template <const auto& text>
-bool LacksCall(iScsiInterface& adapter, const NodeCtl::Lib::NodeCtlException& failure) {
-  return !adapter.IsSoftwareOrDependent() && failure.GetDescription(0) == text;
-}
-
-/// Posts the list of @p structure that @p body fills, called for each adapter in turn, or for the one of the
-/// option "adapter" where that is not empty.
+/// Posts the list of structures such as @p element that @p body fills, called for each adapter in turn, or
+/// for the one of the option "adapter" where that is not empty.
 template <class Body>
 void ListAdapters(const InputPtr& input, const OutputPtr& output, const FailureReport& report,
-                  const Structure& structure, PassedOver passedOver, Body&& body) {
+                  const StructPtr& element, PassedOver passedOver, Body&& body) {
   const std::string wanted = input->GetString("adapter");
-  const ListPtr list = NewList(structure);
   CoreCtl::Storage::StorageInfoImpl storage;
+  const ListPtr list = NewList(element);
   Guarded(output, report, [&] {
     const OwnedVector<iScsiInterface> adapters(storage.GetiScsiInterfaces());
     bool found = wanted.empty();

@@ -2,19 +2,19 @@
 
 namespace TessaroCli::IscsiNamespace {
 
-using CoreCtl::Lib::CoreCtlException;
 using NodeCtl::Lib::NodeCtlException;
 
-void FailureReport::operator()(Plinth::CallSpec::Output& output, const NodeCtlException& failure) const {
-  if (reason == Reason::First) output.ReportError(failure.GetDescription(0));
-  output.ReportError(text);
-  if (reason == Reason::Last) output.ReportError(failure.GetDescription(0));
+void Report(const OutputPtr& output, const FailureReport& report, const NodeCtlException& failure) {
+  using enum FailureReport::Reason;
+  if (report.reason == First) output->ReportError(failure.GetDescription(0));
+  output->ReportError(report.text);
+  if (report.reason == Last) output->ReportError(failure.GetDescription(0));
 }
 
 std::unique_ptr<iScsiInterface> FindAdapter(const InputPtr& input, const OutputPtr& output) {
   try {
     return IscsiTools::GetIscsiInterface(input->GetString("adapter"));
-  } catch (const CoreCtlException&) {
+  } catch (const NodeCtlException&) {
     output->ReportError(InvalidAdapterMessage);
     return nullptr;
   }

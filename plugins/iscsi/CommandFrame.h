@@ -30,25 +30,55 @@ namespace TessaroCli::IscsiNamespace {
 using IscsiUtil::IscsiTools;
 using NodeCtl::Storage::iScsiInterface;
 
+// The two names of the operation by which a class whose result is a list tells what its elements are.
+
+template <class CommandClass>
+concept HasListType = requires(CommandClass& command) {
+  command.GetListType();
+};
+template <class CommandClass>
+concept HasOutputStructure = requires(CommandClass& command) {
+  command.GetOutputStructure();
+};
+
 /// Derives the specs and the help of @p Derived from its kDeclaration. Holds nothing between runs.
 template <class Derived>
 class CommandFrame : public virtual Plinth::AutoCli::Command {
  public:
-  static boost::shared_ptr<Derived> New() { return boost::shared_ptr<Derived>(new Derived()); }
+  static boost::shared_ptr<Derived> New() {
+    static_assert((Derived::kDeclaration.result.kind == ResultKind::List) ==
+                  (HasListType<Derived> || HasOutputStructure<Derived>));
+    return boost::shared_ptr<Derived>(new Derived());
+  }
 
  protected:
   CommandFrame() {
     const Declaration& declaration = Derived::kDeclaration;
     SetDescription(declaration.description);
     if (declaration.formatter != nullptr) SetDefaultOutputFormatter(declaration.formatter);
-    for (const FormatterParameter& setting : declaration.formatterParameters) {
-      if (setting.key != nullptr) SetDefaultOutputParameter(setting.key, SettingText(setting, declaration));
+    for (const auto& setting : declaration.formatterSettings) {
+      if (setting) SetDefaultOutputParameter(setting->key, TextOf(*setting));
     }
     if (declaration.type != nullptr) SetMetaDataField("type", declaration.type);
   }
 
   InputSpecPtr GetInputSpecInternal() override { return MakeInputSpec(Derived::kDeclaration); }
-  OutputSpecPtr GetOutputSpecInternal() override { return MakeOutputSpec(Derived::kDeclaration); }
+  OutputSpecPtr GetOutputSpecInternal() override {
+    return MakeOutputSpec(Derived::kDeclaration.result, NewElement());
+  }
+
+ private:
+  /// The structure of the elements of a list; null for other results.
+  StructPtr NewElement() {
+    auto& command = static_cast<Derived&>(*this);
+    if constexpr (HasListType<Derived>) {
+      return command.GetListType();
+    } else if constexpr (HasOutputStructure<Derived>) {
+      return command.GetOutputStructure();
+    } else {
+      return nullptr;
+    }
+  }
 };
 
 template <class CommandClass>
@@ -62,31 +92,35 @@ struct FailureReport {
 
   const char* text;
   Reason reason = Reason::Hidden;
-
-  void operator()(Plinth::CallSpec::Output& output, const NodeCtl::Lib::NodeCtlException& failure) const;
 };
 
-/// Runs @p body and reports a NodeCtlException from it. False after a failure.
-template <class Body>
-bool Guarded(const OutputPtr& output, const FailureReport& report, Body&& body) {
+constexpr FailureReport Reporting(const char* text) { return {text, FailureReport::Reason::Hidden}; }
+constexpr FailureReport ReportingReasonThen(const char* text) { return {text, FailureReport::Reason::First}; }
+constexpr FailureReport ReportingThenReason(const char* text) { return {text, FailureReport::Reason::Last}; }
+
+/// Tells the user of @p failure.
+void Report(const OutputPtr& output, const FailureReport& report,
+            const NodeCtl::Lib::NodeCtlException& failure);
+
+/// Runs @p steps; a NodeCtlException ends them and is reported.
+template <class Steps>
+void Guarded(const OutputPtr& output, const FailureReport& report, Steps&& steps) {
   try {
-    body();
-    return true;
+    steps();
   } catch (const NodeCtl::Lib::NodeCtlException& failure) {
-    report(*output, failure);
-    return false;
+    Report(output, report, failure);
   }
 }
 
-/// The adapter that the user named. Null when there is none, which is then reported.
+/// The adapter that the user named. Null when it cannot be had, for whatever reason: that is then reported as
+/// an unknown adapter.
 std::unique_ptr<iScsiInterface> FindAdapter(const InputPtr& input, const OutputPtr& output);
 
-/// Looks the adapter up, and runs @p body on it with library failures reported. The adapter object lives that
-/// long.
-template <class Body>
-void WithAdapter(const InputPtr& input, const OutputPtr& output, const FailureReport& report, Body&& body) {
+/// Looks the adapter up, and runs @p steps on it as Guarded does. The adapter object lives that long.
+template <class Steps>
+void WithAdapter(const InputPtr& input, const OutputPtr& output, const FailureReport& report, Steps&& steps) {
   const std::unique_ptr<iScsiInterface> adapter = FindAdapter(input, output);
-  if (adapter) Guarded(output, report, [&] { body(*adapter); });
+  if (adapter) Guarded(output, report, [&] { steps(*adapter); });
 }
 
 /// Posts @p result as the result of the run and ends the output.

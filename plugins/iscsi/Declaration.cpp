@@ -8,31 +8,27 @@ using Plinth::CallSpec::ParameterConstraint;
 using Plinth::CallSpec::ParameterConstraintType;
 using Plinth::CallSpec::ParameterSpec;
 using Plinth::MetaObj::MetaBool;
-using Plinth::MetaObj::MetaInt;
-using Plinth::MetaObj::MetaList;
 using Plinth::MetaObj::MetaString;
-using Plinth::MetaObj::MetaStruct;
 
 InputSpecPtr MakeInputSpec(const Declaration& declaration) {
   InputSpecPtr spec = InputSpec::New();
-  for (const Parameter& parameter : declaration.parameters) {
-    const auto parameterSpec = ParameterSpec::New(parameter.name, parameter.type);
-    parameterSpec->SetShortName(std::string(1, parameter.letter));
-    parameterSpec->SetHelp(parameter.help);
-    if (!parameter.values.empty()) {
+  for (const Option& option : declaration.options) {
+    const auto parameterSpec = ParameterSpec::New(option.name, option.type);
+    parameterSpec->SetShortName(std::string(1, option.letter));
+    parameterSpec->SetHelp(option.help);
+    if (!option.values.empty()) {
       const auto constraint = ParameterConstraint::New(ParameterConstraintType::StringEnum);
-      for (const char* value : parameter.values) constraint->AddStringEnum(value, "");
+      for (const char* value : option.values) constraint->AddStringEnum(value, "");
       parameterSpec->SetConstraint(constraint);
     }
-    parameterSpec->SetRequired(parameter.required);
-    if (parameter.sensitive) parameterSpec->SetSensitive(true);
+    parameterSpec->SetRequired(option.required);
+    if (option.sensitive) parameterSpec->SetSensitive(true);
     spec->AddParameter(parameterSpec);
   }
   return spec;
 }
 
-OutputSpecPtr MakeOutputSpec(const Declaration& declaration) {
-  const Result& result = declaration.result;
+OutputSpecPtr MakeOutputSpec(const Result& result, const StructPtr& element) {
   OutputSpecPtr spec = OutputSpec::New();
   switch (result.kind) {
     case ResultKind::Success:
@@ -45,9 +41,8 @@ OutputSpecPtr MakeOutputSpec(const Declaration& declaration) {
       spec->SetResultType(NewPrototype(*result.structure));
       break;
     case ResultKind::List: {
-      const StructPtr prototype = NewPrototype(*result.structure);
-      const ListPtr list = MetaList::New(MetaType::Struct, prototype);
-      if (result.hasSample) list->Append(prototype);
+      const ListPtr list = NewList(element);
+      if (result.hasSample) list->Append(element);
       spec->SetResultType(list);
       break;
     }
@@ -55,36 +50,15 @@ OutputSpecPtr MakeOutputSpec(const Declaration& declaration) {
   return spec;
 }
 
-std::string SettingText(const FormatterParameter& setting, const Declaration& declaration) {
-  if (setting.value != nullptr) return setting.value;
+std::string TextOf(const FormatterSetting& setting) {
+  if (const auto* text = std::get_if<const char*>(&setting.value)) return *text;
+  const auto& [structure, first] = std::get<FieldNames>(setting.value);
   std::string names;
-  for (const Field& field : declaration.result.structure->fields.subspan(setting.firstField)) {
+  for (const Field& field : structure->fields.subspan(first)) {
     if (!names.empty()) names += ',';
     names += field.name;
   }
   return names;
-}
-
-StructPtr NewPrototype(const Structure& structure) {
-  StructPtr prototype = MetaStruct::New(structure.name);
-  for (const Field& field : structure.fields) {
-    switch (field.type) {
-      case MetaType::Bool:
-        prototype->SetField(field.name, MetaBool::New());
-        break;
-      case MetaType::Int:
-        prototype->SetField(field.name, MetaInt::New());
-        break;
-      default:
-        prototype->SetField(field.name, MetaString::New());
-        break;
-    }
-  }
-  return prototype;
-}
-
-ListPtr NewList(const Structure& structure) {
-  return MetaList::New(MetaType::Struct, NewPrototype(structure));
 }
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -1,26 +1,26 @@
-/// What a command says of itself, as constant data: its help, its parameters and its result, each written
+/// What a command says of itself, as constant data: its help, its options and its result, each written
 /// once.
 ///
-/// A command's file lists its parameters one a line:
+/// A command's file lists its options one a line:
 ///
-///     constexpr Parameter kParameters[] = {
-///         Adapter(),
-///         String("name", 'n', "The iSCSI initiator name."),
+///     constexpr Option kOptions[] = {
+///         AdapterOption(),
+///         StringOption("name", 'n', "The iSCSI initiator name."),
 ///     };
 ///
-/// and, where it shows structures, a column a line: the field's name and where its value comes from. The type
-/// of the field follows from the value, so that declaration and rows cannot differ.
+/// and, where it shows structures, their columns (Rows.h).
 #pragma once
 
 #include <Plinth/CallSpec.h>
-#include <Plinth/MetaObj.h>
 
 #include <array>
 #include <cstddef>
-#include <cstdint>
+#include <optional>
 #include <span>
 #include <string>
-#include <type_traits>
+#include <variant>
+
+#include "Rows.h"
 
 namespace TessaroCli::IscsiNamespace {
 
@@ -28,14 +28,11 @@ using InputPtr = boost::shared_ptr<Plinth::CallSpec::Input>;
 using OutputPtr = boost::shared_ptr<Plinth::CallSpec::Output>;
 using InputSpecPtr = boost::shared_ptr<Plinth::CallSpec::InputSpec>;
 using OutputSpecPtr = boost::shared_ptr<Plinth::CallSpec::OutputSpec>;
-using StructPtr = boost::shared_ptr<Plinth::MetaObj::MetaStruct>;
-using ListPtr = boost::shared_ptr<Plinth::MetaObj::MetaList>;
 using Plinth::CallSpec::ParameterType;
-using Plinth::MetaObj::MetaType;
 
-// Parameters
+// Options
 
-struct Parameter {
+struct Option {
   const char* name;
   char letter;
   ParameterType type;
@@ -44,132 +41,94 @@ struct Parameter {
   bool sensitive = false;
   std::span<const char* const> values = {};  ///< the only values allowed; none for any
 
-  constexpr Parameter Required() const {
-    Parameter changed = *this;
+  constexpr Option Required() const {
+    Option changed = *this;
     changed.required = true;
     return changed;
   }
-  constexpr Parameter Sensitive() const {
-    Parameter changed = *this;
+  constexpr Option Sensitive() const {
+    Option changed = *this;
     changed.sensitive = true;
     return changed;
   }
   /// @p allowed outlives the declaration.
-  constexpr Parameter OneOf(std::span<const char* const> allowed) const {
-    Parameter changed = *this;
+  constexpr Option OneOf(std::span<const char* const> allowed) const {
+    Option changed = *this;
     changed.values = allowed;
     return changed;
   }
 };
 
-constexpr Parameter String(const char* name, char letter, const char* help) {
+constexpr Option StringOption(const char* name, char letter, const char* help) {
   return {name, letter, ParameterType::String, help};
 }
-constexpr Parameter Integer(const char* name, char letter, const char* help) {
+constexpr Option IntegerOption(const char* name, char letter, const char* help) {
   return {name, letter, ParameterType::Int, help};
 }
-constexpr Parameter Boolean(const char* name, char letter, const char* help) {
+constexpr Option BooleanOption(const char* name, char letter, const char* help) {
   return {name, letter, ParameterType::Bool, help};
 }
-constexpr Parameter Flag(const char* name, char letter, const char* help) {
+constexpr Option FlagOption(const char* name, char letter, const char* help) {
   return {name, letter, ParameterType::Flag, help};
 }
-constexpr Parameter StringList(const char* name, char letter, const char* help) {
+constexpr Option StringListOption(const char* name, char letter, const char* help) {
   return {name, letter, ParameterType::StringList, help};
 }
 /// The adapter that a listing may be limited to.
-constexpr Parameter AdapterFilter() { return String("adapter", 'A', "The iSCSI adapter name."); }
+constexpr Option AdapterFilter() { return StringOption("adapter", 'A', "The iSCSI adapter name."); }
 /// The target that a listing may be limited to.
-constexpr Parameter TargetFilter() { return String("name", 'n', "The iSCSI target name."); }
+constexpr Option TargetFilter() { return StringOption("name", 'n', "The iSCSI target name."); }
 /// The adapter that a command works on.
-constexpr Parameter Adapter() { return AdapterFilter().Required(); }
+constexpr Option AdapterOption() { return AdapterFilter().Required(); }
 
 // Results
 
-struct Field {
-  const char* name = nullptr;
-  MetaType type = MetaType::String;
-};
-
-struct Structure {
-  const char* name;
-  std::span<const Field> fields;
-};
-
-/// A field of a row made from a Source, and how to get its value.
-template <class Source>
-struct Column {
-  Field field;
-  void (*set)(Plinth::MetaObj::MetaStruct& row, const char* name, const Source& source);
-
-  /// @p Get is a lambda without captures that takes the source and yields a bool, an int, a long long or a
-  /// text.
-  template <class Get>
-  constexpr Column(const char* name, Get)
-      : field{name, TypeOf<std::invoke_result_t<Get, const Source&>>()},
-        set([](Plinth::MetaObj::MetaStruct& row, const char* fieldName, const Source& source) {
-          row.SetField(fieldName, Get{}(source));
-        }) {}
-
- private:
-  template <class Value>
-  static constexpr MetaType TypeOf() {
-    if constexpr (std::is_same_v<Value, bool>) return MetaType::Bool;
-    if constexpr (std::is_integral_v<Value>) return MetaType::Int;
-    return MetaType::String;
-  }
-};
-
-/// The fields of an array of columns.
-template <const auto& columns>
-inline constexpr auto kFieldsOf = [] {
-  std::array<Field, std::size(columns)> fields;
-  for (std::size_t i = 0; i < fields.size(); ++i) fields[i] = columns[i].field;
-  return fields;
-}();
-
-/// The structure @p name with a field for each of the @p columns.
-template <const auto& columns>
-constexpr Structure StructureOf(const char* name) {
-  return {name, kFieldsOf<columns>};
-}
-
 enum class ResultKind { Success, Text, Structure, List };
 
+/// What a command posts. The elements of a list are such as the class tells by its operation GetListType or
+/// GetOutputStructure.
 struct Result {
   ResultKind kind;
   const char* sample = "";               ///< a word for a text result
-  const Structure* structure = nullptr;  ///< of the structure, or of the elements of the list
+  const Structure* structure = nullptr;  ///< of the one structure
   bool hasSample = false;                ///< the declared list holds a prototype as an example
 };
 
-constexpr Result Success() { return {ResultKind::Success}; }
-constexpr Result Text(const char* sample) { return {ResultKind::Text, sample}; }
-constexpr Result One(const Structure& structure) { return {ResultKind::Structure, "", &structure}; }
-constexpr Result ListOf(const Structure& structure) { return {ResultKind::List, "", &structure, true}; }
-constexpr Result BareListOf(const Structure& structure) { return {ResultKind::List, "", &structure}; }
+constexpr Result SuccessResult() { return {.kind = ResultKind::Success}; }
+constexpr Result TextResult(const char* sample) { return {.kind = ResultKind::Text, .sample = sample}; }
+constexpr Result StructureResult(const Structure& structure) {
+  return {.kind = ResultKind::Structure, .structure = &structure};
+}
+constexpr Result ListResult() { return {.kind = ResultKind::List, .hasSample = true}; }
+/// A list that is declared without an example.
+constexpr Result BareListResult() { return {.kind = ResultKind::List}; }
 
 // Commands
 
-/// A setting of the default formatter.
-struct FormatterParameter {
-  const char* key;
-  const char* value;       ///< null for the names of all fields from firstField on
-  std::size_t firstField;  ///< counts from 0
+/// The names of all fields of a structure from number `first` on, with commas between.
+struct FieldNames {
+  const Structure* structure;
+  std::size_t first;  ///< counts from 0
 };
 
-constexpr FormatterParameter Setting(const char* key, const char* value) { return {key, value, 0}; }
-/// All fields of the result from number @p firstField on, in order.
-constexpr FormatterParameter FieldsFrom(std::size_t firstField, const char* key) {
-  return {key, nullptr, firstField};
+/// A setting of the default formatter.
+struct FormatterSetting {
+  const char* key;
+  std::variant<const char*, FieldNames> value;
+};
+
+constexpr FormatterSetting Setting(const char* key, const char* value) { return {key, value}; }
+/// The fields of @p structure from number @p first on, in order.
+constexpr FormatterSetting FieldsFrom(std::size_t first, const Structure& structure, const char* key) {
+  return {key, FieldNames{&structure, first}};
 }
 
 struct Declaration {
   const char* description;
   const char* type = nullptr;       ///< "fetcher" reads, "operation" changes; null says nothing
   const char* formatter = nullptr;  ///< null for the framework's own choice
-  std::array<FormatterParameter, 2> formatterParameters = {};
-  std::span<const Parameter> parameters = {};
+  std::array<std::optional<FormatterSetting>, 2> formatterSettings = {};
+  std::span<const Option> options = {};
   Result result;
 };
 
@@ -179,20 +138,9 @@ inline constexpr char kOperation[] = "operation";
 // What the framework is told, made from the declaration.
 
 InputSpecPtr MakeInputSpec(const Declaration& declaration);
-OutputSpecPtr MakeOutputSpec(const Declaration& declaration);
+/// @p element is the structure of a list's elements; of no matter for other results.
+OutputSpecPtr MakeOutputSpec(const Result& result, const StructPtr& element);
 /// The value of a formatter setting.
-std::string SettingText(const FormatterParameter& setting, const Declaration& declaration);
-/// A fresh structure with a field of each type and no values.
-StructPtr NewPrototype(const Structure& structure);
-/// A fresh empty list of such structures.
-ListPtr NewList(const Structure& structure);
-
-/// A row with all its fields set from @p source, in the order of the columns.
-template <class Source, std::size_t count>
-StructPtr NewRow(const Structure& structure, const Column<Source> (&columns)[count], const Source& source) {
-  StructPtr row = Plinth::MetaObj::MetaStruct::New(structure.name);
-  for (const Column<Source>& column : columns) column.set(*row, column.field.name, source);
-  return row;
-}
+std::string TextOf(const FormatterSetting& setting);
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -1,7 +1,7 @@
 /// Texts that several commands show, and two texts of the library that some commands know.
 #pragma once
 
-namespace TessaroCli::IscsiNamespace {
+namespace TessaroCli {
 
 inline constexpr char InvalidAdapterMessage[] = "Invalid adapter specified or unable to get adapter.";
 inline constexpr char OperationNotSupportedMessage[] = "Operation not supported for this adapter.";
@@ -33,4 +33,4 @@ inline constexpr char LnpListNotSupportedMessage[] =
 inline constexpr char NicPropertiesNotSupportedMessage[] =
     "iScsiLibException: status(80000001): Not supported; Message= IMA_TSR_GetNicProperties";
 
-}  // namespace TessaroCli::IscsiNamespace
+}  // namespace TessaroCli

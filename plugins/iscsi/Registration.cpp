@@ -1,7 +1,6 @@
 /// The entry point, and the tree that it builds: one line a node.
 #include "Registration.h"
 
-#include <algorithm>
 #include <iterator>
 #include <string_view>
 
@@ -16,8 +15,13 @@ struct Node {
   const char* description;
   NodePtr (*make)() = nullptr;
 
-  std::ptrdiff_t Depth() const { return std::count(path.begin(), path.end(), ' '); }
-  std::string_view Name() const { return path.substr(path.rfind(' ') + 1); }
+  constexpr std::string_view Name() const { return path.substr(path.rfind(' ') + 1); }
+  /// The path of the namespace that it stands in; empty for the root.
+  constexpr std::string_view Parent() const {
+    const std::size_t blank = path.rfind(' ');
+    return blank == path.npos ? std::string_view() : path.substr(0, blank);
+  }
+  constexpr bool IsNamespace() const { return description != nullptr; }
 };
 
 template <class CommandClass>
@@ -27,8 +31,9 @@ constexpr Node Command(std::string_view path) {
 
 }  // namespace
 
-/// A namespace stands ahead of its children, and siblings stand in the order in which they are shown. The
-/// classes that are named here are those of other files, so this stands in no unnamed namespace.
+/// A namespace stands ahead of its children, and siblings stand in the order in which they are shown. A class
+/// is declared where it is named, and this stands in no unnamed namespace, as the classes are those of other
+/// files: a name that none of them has stays undefined when the plug-in is linked.
 static constexpr Node kTree[] = {
     {"iscsi", "Tessaro iSCSI commands."},
     {"iscsi plugin", "Operations that can be performed on iSCSI management plugins"},
@@ -130,13 +135,26 @@ static constexpr Node kTree[] = {
 
 namespace {
 
+/// Moves @p next behind the node there and all that stands in it.
+constexpr void Pass(const Node*& next) {
+  const Node& node = *next++;
+  while (node.IsNamespace() && next != std::end(kTree) && next->Parent() == node.path) Pass(next);
+}
+
+constexpr bool IsOneTree() {
+  const Node* next = std::begin(kTree);
+  Pass(next);
+  return next == std::end(kTree);
+}
+static_assert(IsOneTree(), "a path does not begin with that of the namespace that it stands in");
+
 /// Makes the node at @p next with everything below it, and moves @p next behind them.
 NodePtr Build(const Node*& next) {
   const Node& node = *next++;
-  if (node.make != nullptr) return node.make();
+  if (!node.IsNamespace()) return node.make();
   const auto made = Namespace::New();
   made->SetDescription(node.description);
-  while (next != std::end(kTree) && next->Depth() > node.Depth()) {
+  while (next != std::end(kTree) && next->Parent() == node.path) {
     const std::string name(next->Name());
     const NodePtr child = Build(next);
     made->RegisterNamespaceNode(child, name);
@@ -147,6 +165,7 @@ NodePtr Build(const Node*& next) {
 }  // namespace
 }  // namespace TessaroCli::IscsiNamespace
 
+// The framework looks this one up by its plain name.
 extern "C" __attribute__((visibility("default"))) void AutoCli_RegisterNamespaces(
     boost::shared_ptr<Plinth::AutoCli::Namespace> parent) {
   using namespace TessaroCli::IscsiNamespace;

@@ -2,10 +2,12 @@
 
 import os
 import resource
+import signal
 import sqlite3
 import subprocess
 
-from support.program import HCLI, READ, SET_NAME, WRITE, Host, check, contents, refused, write
+from support.program import (DAMAGED, DENIED, HCLI, NO_SPACE, NOT_SUPPORTED, READ, SET_NAME, WRITE, Host, check,
+                             contents, refused, run, succeeded, write)
 
 BIG = '{"adapters": [{"name": "x", "alias": "' + "x" * 200000 + '"}]}'
 
@@ -27,7 +29,7 @@ DAMAGES = {
     "a newer version": (lambda path: sql(path, "PRAGMA user_version=99"), "belongs to a newer version of this program"),
     "no version": (lambda path: sql(path, "PRAGMA user_version=0"), "is damaged: it has no schema version"),
     "records that are none": (lambda path: sql(path, "UPDATE object SET record = '[]'"), "is damaged: a record is not"),
-    "records without keys": (lambda path: sql(path, "UPDATE object SET record = '{}'"), "is damaged: a record has nothing"),
+    "records without keys": (lambda path: sql(path, "UPDATE object SET record = x'0500000000'"), "is damaged: a record has nothing"),
 }
 
 
@@ -38,7 +40,8 @@ def damaged():
         damage(host.database)
         before = contents(host.root)
         for line in READ, WRITE:
-            refused(f"{case}, {line}", host.run(line), host.database, text)
+            status = NOT_SUPPORTED if case == "a newer version" else DAMAGED
+            refused(f"{case}, {line}", host.run("--exit-codes " + line), host.database, text, status=status)
             check(contents(host.root) == before, f"{case}: {line} has changed the files")
 
 
@@ -92,7 +95,8 @@ def unwritable(way):
         (SET_NAME, host.names, "", "4k,nr_inodes=1", "", "cannot be written: No space left on device"),
     ]
     for line, file, kept, size, options, text in cases:
-        refused(f"{size} {options}, {line}", run(line, file, kept, size, options), f"{file} {text}")
+        refused(f"{size} {options}, {line}", run("--exit-codes " + line, file, kept, size, options), f"{file} {text}",
+                status=DENIED if options == "ro" else NO_SPACE)
 
 
 def limited():
@@ -101,8 +105,8 @@ def limited():
     host.show()
     before = contents(host.root)
     for line, most in ("simulator load -", os.path.getsize(host.database)), (WRITE, 1024):
-        done = host.run(line, BIG, preexec_fn=lambda: resource.setrlimit(resource.RLIMIT_FSIZE, (most, most)))
-        refused(f"limited to {most} bytes, {line}", done, host.database, "File too large")
+        done = host.run("--exit-codes " + line, BIG, preexec_fn=lambda: resource.setrlimit(resource.RLIMIT_FSIZE, (most, most)))
+        refused(f"limited to {most} bytes, {line}", done, host.database, "File too large", status=NO_SPACE)
         check(contents(host.root) == before, f"limited to {most} bytes: {line} has changed the files")
 
 
@@ -113,6 +117,22 @@ def full_output():
         done = host.run(WRITE, stdout=full)
     check(done.returncode == 4 and "No space left on device" in done.stderr, done)
     check(host.show()["adapters"][2]["alias"] == "other", "the change is lost")
+    # Where nobody reads, it is the end that the signal brings; for a caller that ignores it, a status without a text.
+    for ignored, status in (False, -signal.SIGPIPE), (True, 4):
+        reader, writer = os.pipe()
+        os.close(reader)
+        done = host.run("simulator show", stdout=writer, restore_signals=not ignored)
+        os.close(writer)
+        check(done.returncode == status and not done.stderr, done)
+
+
+def without_proc(way):
+    """The program finds its plug-ins, wherever it is called, where nothing but the kernel's word tells its place."""
+    host = Host()
+    libraries = os.path.join(os.path.dirname(os.path.dirname(HCLI)), "lib")
+    mounted = 'mount -t tmpfs none /proc && cd / && exec env LD_LIBRARY_PATH="$1" "$0" iscsi adapter list'
+    done = run(*way.split(), "sh", "-c", mounted, HCLI, libraries, HCLI_ROOT=host.root)
+    check("hba0" in succeeded(done), done)
 
 
 damaged()
@@ -121,5 +141,6 @@ full_output()
 way = next(filter(can_mount, ["unshare --mount", "unshare --map-root-user --mount"]), None)
 if way:
     unwritable(way)
+    without_proc(way)
 else:
     print("left out, for no file system can be mounted here: read-only and full ones")

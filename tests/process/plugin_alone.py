@@ -29,14 +29,22 @@ with tempfile.TemporaryDirectory(prefix="hcli-plugin-") as folder:
     configure = ["cmake", "-S", tree, "-B", build, "-G", "Ninja", "-DHCLI_PLUGIN_ONLY=ON", *same]
     expect(run(*configure), 1, "set HCLI_FRAMEWORK_LIBRARY to the library to link")
     expect(run(*configure, "-DHCLI_FRAMEWORK_LIBRARY=/no/such.so"), 1, "no such file: /no/such.so")
-    expect(run(*configure, f"-DHCLI_FRAMEWORK_LIBRARY={LIBRARIES}/libplinth.so",
-              f"-DHCLI_STORAGE_LIBRARIES={LIBRARIES}/libcorectl.so;{LIBRARIES}/libhost.so",
-              f"-DHCLI_IMA_LIBRARY={LIBRARIES}/libima.so"), 0, "")
+    os.chdir(BUILD)  # paths are seen from the folder in which the command is given
+    expect(run(*configure, "-DHCLI_FRAMEWORK_LIBRARY=lib/libplinth.so",
+               "-DHCLI_STORAGE_LIBRARIES=lib/libcorectl.so;lib/libhost.so",
+               "-DHCLI_IMA_LIBRARY=lib/libima.so"), 0, "")
     expect(run("ninja", "-C", build), 0, "")
     plugins = os.path.join(build, "lib/hcli/plugins")
     check(os.listdir(plugins) == ["iscsi.so"], os.listdir(plugins))
     # What stands on no path can be made from outside all the same.
-    exported = run("nm", "-DC", "--defined-only", os.path.join(plugins, "iscsi.so"))
-    for name in UNREGISTERED:
-        expect(exported, 0, f"Make<TessaroCli::IscsiNamespace::{name}>()")
+    source, program = os.path.join(folder, "program.cpp"), os.path.join(folder, "program")
+    made = " && ".join(f"{name}::New()->GetInputSpec()" for name in UNREGISTERED)
+    with open(source, "w", encoding="utf-8") as file:
+        file.write("#include <UnregisteredCommands.h>\nusing namespace TessaroCli::IscsiNamespace;\n"
+                   f"int main() {{ return {made} ? 0 : 1; }}\n")
+    compiler = re.search(r"^CMAKE_CXX_COMPILER:\w+=(.*)$", read(os.path.join(build, "CMakeCache.txt")), re.MULTILINE)
+    expect(run(compiler.group(1), "-std=c++20", "-I" + os.path.join(tree, "contracts"),
+               "-I" + os.path.join(tree, "plugins/iscsi"), source, os.path.join(plugins, "iscsi.so"), "-o", program,
+               "-Wl,-rpath-link," + LIBRARIES), 0, "")
+    expect(run(program, LD_LIBRARY_PATH=LIBRARIES), 0, "")
     expect(run(HCLI, "iscsi", "adapter", "--help", HCLI_PLUGINS=plugins, HCLI_ROOT=folder), 0, "list")

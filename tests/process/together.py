@@ -1,12 +1,14 @@
 """Several hcli at once on one host: no change is lost, nobody is turned away, and one first run makes the host.
 together.py [SECONDS] lets eight writers and eight readers work for so long."""
 
+import fcntl
 import itertools
+import os
 import sys
 import time
 from concurrent.futures import ThreadPoolExecutor
 
-from support.program import SET_NAME, Host, beside, check, finished, read, succeeded
+from support.program import SET_NAME, Host, beside, check, finished, read, succeeded, until_asleep
 
 ADAPTERS = 4  # writers share them, so that they change the same lists
 SENDTARGET = "iscsi adapter discovery sendtarget"
@@ -64,6 +66,19 @@ def at_once(host, lines):
         succeeded(finished(process))
 
 
+def keys_at_once(pairs):
+    """Both keys of one record are set at once; each command writes the record back as a whole."""
+    host = with_adapters(1)
+    places = {"-A hba0": "iscsi adapter param", "-A hba0 -a 10.0.0.1": f"{SENDTARGET} param"}
+    host.succeed(f"{SENDTARGET} add -A hba0 -a 10.0.0.1:3260")
+    for number in range(pairs):
+        wanted = {"LoginTimeout": str(number % 50 + 1), "LogoutTimeout": str(number % 50 + 2)}
+        for place, command in places.items():
+            at_once(host, [f"{command} set {place} -k {key} -v {value}" for key, value in wanted.items()])
+            found = {row["Name"]: row["Current"] for row in host.result(f"{command} get {place}")}
+            check(found.items() >= wanted.items(), f"of {wanted} at {command} one is lost:", found)
+
+
 def unread_trace():
     """Whoever does not read on keeps one command waiting, and no other."""
     host = with_adapters(1000)
@@ -72,6 +87,21 @@ def unread_trace():
     host.succeed("iscsi adapter set -A hba1 -a other")
     check(waiting.poll() is None, "all of the trace was written at once")
     waiting.kill()
+    waiting.communicate()
+
+
+def unread_report():
+    """Nor does a report that nobody reads: what the command held of the host is released before it is written."""
+    host = with_adapters(2)
+    reader, writer = os.pipe()
+    os.write(writer, bytes(fcntl.fcntl(writer, fcntl.F_SETPIPE_SZ, 4096)))
+    waiting = host.start("iscsi adapter param set -A hba0 -k Nothing -v 1", stderr=writer)
+    os.close(writer)
+    until_asleep(waiting)
+    host.succeed("iscsi adapter set -A hba1 -a other")
+    check(waiting.poll() is None, "the report was written nowhere")
+    with open(reader, "rb") as full:
+        check(b"Unable to set parameters." in full.read(), "the report is lost")
     waiting.communicate()
 
 
@@ -97,7 +127,9 @@ else:
     for _ in range(3):
         first_runs(8)
         names_at_once(8)
+    keys_at_once(20)
     unread_trace()
+    unread_report()
     work(1, 1)
     work(2, 0)
     work(5, 3)

@@ -4,7 +4,8 @@ import os
 import shutil
 import stat
 
-from support.program import HCLI, NAME_FILE, READ, SET_NAME, WRITE, Host, beside, check, contents, refused
+from support.program import (DENIED, HCLI, NAME_FILE, READ, SET_NAME, WRITE, Host, beside, check, contents, refused,
+                             write)
 
 # Where every user can run it.
 TREE = Host()
@@ -48,6 +49,18 @@ def kept():
     check((mode(host.names), os.stat(host.names).st_uid) == (0o646, owner), "another owner or mode", os.stat(host.names))
 
 
+def taken_back():
+    """What a copy or another program has opened to others is its owner's alone again."""
+    host = Host()
+    host.show()
+    journal = host.database + "-journal"
+    write(journal, "")
+    for path in host.database, journal:
+        os.chmod(path, 0o664)
+    host.succeed("iscsi adapter list")
+    check(mode(host.database) == mode(journal) == 0o600, "modes", mode(host.database), mode(journal))
+
+
 def modes():
     """Whom a file's mode keeps out is told so, and makes nothing."""
     host = Host()
@@ -56,7 +69,8 @@ def modes():
     nobody = {"user": 65534, "executable": PROGRAM}
     for mode_, line, text in (0o600, READ, "opened: Permission denied"), (0o644, WRITE, "written: it is read-only"):
         os.chmod(host.database, mode_)
-        refused(f"mode {mode_:o}", host.run(line, **nobody), f"{host.database} cannot be {text}")
+        refused(f"mode {mode_:o}", host.run("--exit-codes " + line, **nobody), f"{host.database} cannot be {text}",
+                status=DENIED)
     host.succeed("iscsi adapter list", **nobody)
     os.remove(host.database)
     refused("a folder of others", host.run(READ, **nobody), f"{host.database} cannot be written: Permission denied")
@@ -77,7 +91,7 @@ PLACES = {
     "var/lib/tessaro/host.db-journal": [READ, WRITE],
     "var/lib/tessaro/host.db-wal": [READ, WRITE],
     "var/lib/tessaro/host.db-shm": [READ, WRITE],
-    NAME_FILE: [SET_NAME, "--trace iscsi software set --enabled true"],
+    NAME_FILE: [SET_NAME, "iscsi software set --enabled true"],
     os.path.join(os.path.dirname(NAME_FILE), ".initiatorname.iscsi.new"): [SET_NAME],
 }
 
@@ -115,7 +129,8 @@ def lone_journal():
     host = Host()
     host.show()
     os.rename(host.database, host.database + "-journal")
-    refused("a lone journal", host.run(READ), f"its journal {host.database}-journal is still there")
+    refused("a lone journal", host.run(READ), f"its journal {host.database}-journal is still there: put the database "
+            "back, or remove the journal for a new host.")
     check(not os.path.exists(host.database), "a new host beside an old journal")
 
 
@@ -149,6 +164,7 @@ def plugins():
 
 masks()
 kept()
+taken_back()
 strangers()
 linked_folder()
 lone_journal()

@@ -4,13 +4,13 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
-#include <set>
 
 #include "host/Host.h"
 #include "ima/Memory.h"
 #include "plinth/Declarations.h"
 #include "plinth/Formatter.h"
 #include "plinth/OwnCommands.h"
+#include "support/ProjectFile.h"
 #include "support/Words.h"
 
 extern "C" void AutoCli_RegisterNamespaces(boost::shared_ptr<Plinth::AutoCli::Namespace> parent);
@@ -51,43 +51,18 @@ json ToJson(const MetaObject& object) {
   return {};
 }
 
-/// Which commands succeeded and which failed in some test: one that lacks either has no test worth the name.
-std::set<std::string> succeeded;
-std::set<std::string> failed;
-
-/// Commands of which a success or a failure cannot be tested here. This list only ever shrinks.
-const std::set<std::string> kUntested = {
-    "catalogue",   // cannot fail
-    "completion",  // a wrong shell is a usage error
-};
-
-class EveryCommandIsTested : public testing::Environment {
- public:
-  void TearDown() override {
-    if (testing::GTEST_FLAG(filter) != "*") return;
-    std::set<std::string> commands;
-    Plinth::WalkTree(CommandTree(), "", [&](const std::string& path, const auto& node) {
-      if (Plinth::AutoCli::NodeData::Of(node).isCommand) commands.insert(path);
-    });
-    commands.insert(succeeded.begin(), succeeded.end());
-    commands.insert(failed.begin(), failed.end());
-    for (const std::string& name : commands) {
-      if (kUntested.contains(name)) continue;
-      EXPECT_TRUE(succeeded.contains(name)) << name << ": no test in which it succeeds";
-      EXPECT_TRUE(failed.contains(name)) << name << ": no test in which it fails";
-    }
-  }
-};
-
-[[maybe_unused]] const testing::Environment* const kGate =
-    testing::AddGlobalTestEnvironment(new EveryCommandIsTested);
-
 }  // namespace
 
 std::vector<std::string> Outcome::Calls() const {
   std::vector<std::string> names;
   for (const std::string& line : trace) names.push_back(line.substr(0, line.find('(')));
   return names;
+}
+
+std::vector<std::string> Outcome::Column(const char* field) const {
+  std::vector<std::string> values;
+  for (const json& row : result) values.push_back(row.at(field));
+  return values;
 }
 
 std::string WithAnswers(const std::string& description, const std::string& answers) {
@@ -123,29 +98,25 @@ Outcome Harness::operator()(const std::vector<std::string>& words) {
   console.input = input;
   trace.clear();
   Plinth::RunRecord record = Plinth::RunCommandLine(CommandTree(), words, console, {.checked = true});
-  const std::string name = record.executed ? record.path : "";
-  return Finish(std::move(record), console, name);
+  return Finish(std::move(record), console);
 }
 
-Outcome Harness::operator()(const std::string& name,
-                            const boost::shared_ptr<Plinth::AutoCli::NamespaceNode>& command,
+Outcome Harness::operator()(const boost::shared_ptr<Plinth::AutoCli::NamespaceNode>& command,
                             const std::string& options) {
   Plinth::TextConsole console;
   console.input = input;
   trace.clear();
   auto& runnable = dynamic_cast<Plinth::AutoCli::Command&>(*command);
-  return Finish(Plinth::RunCommand(runnable, SplitWords(options), console, {.checked = true}), console, name);
+  return Finish(Plinth::RunCommand(runnable, SplitWords(options), console, {.checked = true}), console);
 }
 
-Outcome Harness::Finish(Plinth::RunRecord record, Plinth::TextConsole& console, const std::string& name) {
-  EXPECT_EQ(ima::OutstandingAllocations(), 0u) << name << " kept memory of the management API";
-  if (counts && !name.empty()) {
-    if (record.result) succeeded.insert(name);
-    if (!record.messages.empty() || record.status == Plinth::kFailure) failed.insert(name);
-  }
+Outcome Harness::Finish(Plinth::RunRecord record, Plinth::TextConsole& console) {
+  EXPECT_EQ(ima::OutstandingAllocations(), 0u) << "memory of the management API is kept";
   Outcome run;
   run.status = record.status;
   run.messages = std::move(record.messages);
+  run.reasons = std::move(record.reasons);
+  run.notes = std::move(record.notes);
   if (record.result) run.result = ToJson(*record.result);
   run.closed = record.closed;
   run.failure = std::move(record.failure);
@@ -158,6 +129,17 @@ Outcome Harness::Finish(Plinth::RunRecord record, Plinth::TextConsole& console, 
 json Harness::Show() const { return json::parse(host::Host::Current().Show(true)); }
 
 json Harness::Show(const std::string& pointer) const { return Show().at(json::json_pointer(pointer)); }
+
+void ExpectFile(const std::string& name, const std::string& text) {
+  if (std::getenv("UPDATE_GOLDEN") != nullptr) std::ofstream(ProjectFile(name)) << text;
+  const std::string kept = FileText(name);
+  const auto at = std::mismatch(kept.begin(), kept.end(), text.begin(), text.end()).first - kept.begin();
+  const std::size_t from = std::min(kept.rfind("\n\n", static_cast<std::size_t>(at)), text.size());
+  const auto part = [&](const std::string& all) { return all.substr(std::min(from, all.size()), 1500); };
+  EXPECT_TRUE(kept == text) << name << " has\n"
+                            << part(kept) << "\nnow it is\n"
+                            << part(text) << "\nIf that is meant, UPDATE_GOLDEN=1 writes the file anew.";
+}
 
 TemporaryRoot::TemporaryRoot() {
   std::string name = (std::filesystem::temp_directory_path() / "hcli-test-XXXXXX").string();

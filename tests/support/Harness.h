@@ -21,9 +21,11 @@
 
 /// All that came out of a run.
 struct Outcome {
-  int status = 0;                     ///< as the process would exit
-  std::vector<std::string> messages;  ///< what was reported, in order and to the letter
-  nlohmann::json result;              ///< what was posted; null where nothing was
+  int status = 0;                       ///< as the process would exit
+  std::vector<std::string> messages;    ///< what was reported, in order and to the letter
+  std::vector<Plinth::Reason> reasons;  ///< of the reports
+  std::vector<std::string> notes;       ///< what was done besides
+  nlohmann::json result;                ///< what was posted; null where nothing was
   bool closed = false;
   std::string failure;             ///< of a usage error or an escaped exception
   std::vector<std::string> trace;  ///< a line for each call of the library, in order
@@ -32,6 +34,8 @@ struct Outcome {
 
   /// The names of the operations in the trace.
   std::vector<std::string> Calls() const;
+  /// The texts of a field in each row of the result.
+  std::vector<std::string> Column(const char* field) const;
 };
 
 /// @p json as a host description with @p answers, JSON objects with commas between, added.
@@ -48,9 +52,8 @@ class Harness {
   /// @p line is split as SplitWords does.
   Outcome operator()(const std::string& line);
   Outcome operator()(const std::vector<std::string>& words);
-  /// Runs a command that stands on no path. @p name is its class, for the count of what is tested.
-  Outcome operator()(const std::string& name,
-                     const boost::shared_ptr<Plinth::AutoCli::NamespaceNode>& command,
+  /// Runs a command that stands on no path.
+  Outcome operator()(const boost::shared_ptr<Plinth::AutoCli::NamespaceNode>& command,
                      const std::string& options);
 
   /// The host as it is now, secrets included.
@@ -60,14 +63,16 @@ class Harness {
 
   /// What the next commands read from standard input.
   std::string input;
-  /// The runs count as tests of their commands.
-  bool counts = true;
   /// What was called on the host since the last run began.
   std::vector<std::string> trace;
 
  private:
-  Outcome Finish(Plinth::RunRecord record, Plinth::TextConsole& console, const std::string& name);
+  Outcome Finish(Plinth::RunRecord record, Plinth::TextConsole& console);
 };
+
+/// Expects the file @p name of the source tree to be @p text. With UPDATE_GOLDEN in the environment it is
+/// from now on.
+void ExpectFile(const std::string& name, const std::string& text);
 
 /// The command tree as the plug-in registers it, with the framework's own commands behind it.
 Plinth::AutoCli::Namespace& CommandTree();

@@ -3,20 +3,9 @@
 #include <nlohmann/json.hpp>
 #include <regex>
 
+#include "UnregisteredCommands.h"
 #include "host/Schema.h"
-
-namespace TessaroCli::IscsiNamespace {
-class AdapterDiscoveryIsnsAdd;
-class AdapterDiscoveryIsnsList;
-class AdapterDiscoveryIsnsParamGet;
-class AdapterDiscoveryIsnsParamSet;
-class AdapterDiscoveryIsnsRemove;
-class AdapterIsnsParamGet;
-class AdapterIsnsParamSet;
-class RouteAdd;
-class RouteList;
-class RouteRemove;
-}  // namespace TessaroCli::IscsiNamespace
+#include "support/ProjectFile.h"
 
 namespace sweep {
 
@@ -117,10 +106,6 @@ constexpr ExceptionToTheRule kExceptions[] = {
     {"RouteAdd", "IMA_TSR_AssociateRoute", "", Behind::TakesBack},
     // Built on statuses alone, it has no handler for what this helper throws.
     {"adapter discovery statictarget list", "ConvertHostAddress", "", Behind::ToFramework},
-    // For iSNS every failure of the lookup is an unknown adapter. Elsewhere the lookup has a handler for what
-    // lookups throw, and its own failure is none of the work's behind it.
-    {"Isns", "GetScsiInterface", "", Behind::TheRule},
-    {"", "GetScsiInterface", "NodeCtlException", Behind::ToFramework},
 };
 
 }  // namespace
@@ -137,12 +122,12 @@ const std::vector<SweptCommand>& Commands() {
        "Failed to enable software iSCSI: %REASON%"},
       {"software set", "--enabled=false", "Failed to disable software iSCSI: %REASON%"},
       {"adapter list", "| -A ind", "Unable to list adapters."},
-      {"adapter get", kAdapter, "Unable to get adapter information."},
+      {"adapter get", "-A ind | -A soft", "Unable to get adapter information."},
       {"adapter set", "-A ind -n iqn.2026-11.org.example:one -a lab | -A soft -a lab",
        "Unable to set name or alias.", nullptr, Shown},
       {"adapter param get", kAdapter, kNoParms},
       {"adapter param set", ParmLines(kAdapter), kUnsetParms, nullptr, Shown},
-      {"adapter capabilities get", kAdapter, "Unable to get adapter properties."},
+      {"adapter capabilities get", "-A ind | -A dep", "Unable to get adapter properties."},
       {"adapter auth chap get", "-A ind | -A ind -d mutual",
        "Failed to get iSCSI CHAP authentication configuration."},
       {"adapter auth chap set", ChapLines(kAdapter),
@@ -219,22 +204,22 @@ const std::vector<SweptCommand>& Commands() {
       {"ibftboot import", "", "Unable to import IBFT Boot table."},
 
       {"AdapterDiscoveryIsnsAdd", "-A ind -m static -a 192.0.2.97",
-       "%REASON% | Unable to add iSNS discovery address.", Make<AdapterDiscoveryIsnsAdd>},
+       "%REASON% | Unable to add iSNS discovery address.", AdapterDiscoveryIsnsAdd::New},
       {"AdapterDiscoveryIsnsList", "| -A ind", "%REASON% | Failed to list isns discovery addresses.",
-       Make<AdapterDiscoveryIsnsList>},
-      {"AdapterDiscoveryIsnsParamGet", kServer, kNoIsnsParms, Make<AdapterDiscoveryIsnsParamGet>},
+       AdapterDiscoveryIsnsList::New},
+      {"AdapterDiscoveryIsnsParamGet", kServer, kNoIsnsParms, AdapterDiscoveryIsnsParamGet::New},
       {"AdapterDiscoveryIsnsParamSet",
        Text(kServer) + " -k PollInterval -v 60 | " + kServer + " -k PollInterval --inherit | " + kServer +
            " -k PollInterval --default",
-       "%REASON% | Unable to set isns parameters. " + kRange, Make<AdapterDiscoveryIsnsParamSet>},
+       "%REASON% | Unable to set isns parameters. " + kRange, AdapterDiscoveryIsnsParamSet::New},
       {"AdapterDiscoveryIsnsRemove", kServer, "%REASON% | Unable to remove iSNS discovery address.",
-       Make<AdapterDiscoveryIsnsRemove>},
-      {"AdapterIsnsParamGet", kAdapter, kNoIsnsParms, Make<AdapterIsnsParamGet>},
+       AdapterDiscoveryIsnsRemove::New},
+      {"AdapterIsnsParamGet", kAdapter, kNoIsnsParms, AdapterIsnsParamGet::New},
       {"AdapterIsnsParamSet", "-A ind -k PollInterval -v 60 | -A ind -k PollInterval --default",
-       "%REASON% | Unable to set iSNS parameters. " + kRange, Make<AdapterIsnsParamSet>, Shown},
-      {"RouteAdd", "-A ind -s 203.0.113.0/24 -g 192.0.2.1 -n port0", kRoute, Make<RouteAdd>},
-      {"RouteList", "| -A ind -n port0", kRoute, Make<RouteList>},
-      {"RouteRemove", "-A ind -s 198.51.100.0/24 -g 192.0.2.1 -n port0", kRoute, Make<RouteRemove>},
+       "%REASON% | Unable to set iSNS parameters. " + kRange, AdapterIsnsParamSet::New, Shown},
+      {"RouteAdd", "-A ind -s 203.0.113.0/24 -g 192.0.2.1 -n port0", kRoute, RouteAdd::New},
+      {"RouteList", "| -A ind -n port0", kRoute, RouteList::New},
+      {"RouteRemove", "-A ind -s 198.51.100.0/24 -g 192.0.2.1 -n port0", kRoute, RouteRemove::New},
   };
   return commands;
 }
@@ -268,59 +253,9 @@ Behind BehindOf(const SweptCommand& command, const std::string& operation, const
 }
 
 std::string HostDescription() {
-  nlohmann::json host = nlohmann::json::parse(R"({
-    "plugins": [{"fileName": "libfirst.so", "vendor": "One"}, {"fileName": "libsecond.so", "vendor": "Two"}],
-    "nics": [{"name": "nic1", "ipv4Address": "198.51.100.11", "ipv6Addresses": [{"address": "2001:db8:1::11"}]},
-             {"name": "nic2"}],
-    "bootTables": [{"enabled": 1, "macAddress": "02:54:53:52:01:02", "targetIP": "198.51.100.80",
-                    "targetName": "iqn.2026-11.org.example:boot", "initiatorName": "iqn.2026-11.org.example:host",
-                    "chapType": 2, "chapName": "boot", "chapPwd": "s3cr3t-boot-password",
-                    "reverseChapName": "toob", "reverseChapPwd": "s3cr3t-reverse-word"}],
-    "remoteTargets": [
-      {"name": "iqn.2026-11.org.example:boot", "portals": [{"host": "198.51.100.80"}]},
-      {"name": "iqn.2026-11.org.example:archive", "portals": [{"host": "192.0.2.10"}]},
-      {"name": "iqn.2026-11.org.example:told", "portals": [{"host": "192.0.2.31"}]},
-      {"name": "iqn.2026-11.org.example:mirror", "portals": [{"host": "198.51.100.20"}]},
-      {"name": "iqn.2026-11.org.example:vault", "portals": [{"host": "198.51.100.21"}],
-       "chap": {"level": "required", "name": "u", "secret": "s3cr3t-adapter-uni", "mutualName": "m",
-                "mutualSecret": "s3cr3t-adapter-mutual"}}],
-    "adapters": [
-      {"name": "disk0", "kind": "scsi"},
-      {"name": "soft", "kind": "software", "driver": "sw", "uid": "iqn.2026-11.org.example:soft",
-       "initiatorName": "iqn.2026-11.org.example:soft",
-       "networkPortals": [{"nic": "nic1"}],
-       "staticTargets": [{"name": "iqn.2026-11.org.example:archive", "host": "192.0.2.10"}],
-       "targets": [{"name": "iqn.2026-11.org.example:archive", "addresses": [{"address": "192.0.2.10"}]}]},
-      {"name": "dep", "kind": "dependent", "initiatorName": "iqn.2026-11.org.example:dep",
-       "physicalPortals": [{"name": "phy2", "mac": "02:54:53:52:01:02"}]},
-      {"name": "ind", "kind": "independent", "driver": "hq4", "uid": "hq4:1", "alias": "first", "applies": {"mtu": "now"},
-       "initiatorName": "iqn.2026-11.org.example:ind", "plugin": "libsecond.so",
-       "chap": {"uni": {"name": "u", "secret": "s3cr3t-adapter-uni", "level": "required"},
-                "mutual": {"name": "m", "secret": "s3cr3t-adapter-mutual", "level": "required"}},
-       "sendTargets": [
-         {"host": "192.0.2.31", "chap": {"uni": {"name": "u", "secret": "s3cr3t-sendtarget", "level": "required"}}},
-         {"host": "192.0.2.32", "port": 3261}],
-       "staticTargets": [
-         {"name": "iqn.2026-11.org.example:fixed", "host": "192.0.2.41",
-          "chap": {"uni": {"name": "u", "secret": "s3cr3t-target", "level": "required"},
-                   "mutual": {"name": "m", "secret": "s3cr3t-target-back", "level": "required"}}},
-         {"name": "iqn.2026-11.org.example:other", "host": "2001:db8::42"}],
-       "targets": [
-         {"name": "iqn.2026-11.org.example:vault", "addresses": [{"address": "198.51.100.21"}],
-          "sessions": [{"isid": "80107e020001", "connections": [
-            {"cid": 0, "remoteAddress": "198.51.100.21", "sessionCreateTime": "2026-11-02 08:15:00"}, {"cid": 1}]}]},
-         {"name": "iqn.2026-11.org.example:mirror", "addresses": [{"address": "198.51.100.20"}]}],
-       "network": {"ipv4Address": "192.0.2.20", "ipv4Netmask": "255.255.255.0", "gateway": "192.0.2.1",
-                   "ipv6Enabled": true, "ipv6PrefixLength": 64, "gateway6": "2001:db8:2::1",
-                   "ipv6Addresses": [{"address": "fe80::220"}, {"address": "2001:db8:2::20"},
-                                     {"address": "2001:db8:2::21"}]},
-       "logicalPortals": [{"name": "port0"}, {"name": "port1"}],
-       "physicalPortals": [{"name": "phy0", "mac": "02:54:53:52:02:20"}],
-       "isnsServers": [{"address": "192.0.2.60", "inherited": false, "parms": {"current": 20}}, {"method": "dhcp"}],
-       "routes": [{"destination": "198.51.100.0", "netmask": "255.255.255.0", "gateway": "192.0.2.1",
-                   "interface": "port0"}]}]})");
+  nlohmann::json host = nlohmann::json::parse(FileText("tests/support/host.json"));
   for (nlohmann::json& adapter : host["adapters"]) {
-    if (adapter["kind"] == "scsi") continue;
+    if (adapter["kind"] == "scsi" || adapter.contains("capabilities")) continue;
     for (const std::string_view capability : ::host::kCapabilities) {
       adapter["capabilities"][std::string(capability)] = true;
     }

@@ -2,10 +2,11 @@
 /// and what each command says of a call that fails.
 #pragma once
 
+#include <Plinth/AutoCli.h>
+
+#include <functional>
 #include <string>
 #include <vector>
-
-#include "Registration.h"
 
 namespace sweep {
 
@@ -27,7 +28,8 @@ struct SweptCommand {
   /// What is reported, a bar between the texts: of an exception, whose own text %REASON% stands for; behind
   /// the name of an IMA call and a colon, of its failure.
   std::string reports;
-  TessaroCli::IscsiNamespace::NodePtr (*make)() = nullptr;  ///< of a class that stands on no path
+  /// Of a class that stands on no path.
+  std::function<boost::shared_ptr<Plinth::AutoCli::Command>()> make = nullptr;
   Statuses statuses = Statuses::Ignored;
 };
 

@@ -1,38 +1,37 @@
 #include "IscsiUtil/IscsiTools.h"
+#include "IscsiUtil/Refusal.h"
 #include "Messages.h"
 
 namespace IscsiUtil {
 
-using CoreCtl::Lib::CoreCtlException;
 using CoreCtl::Storage::iScsiInterfaceImpl;
 using CoreCtl::Storage::StorageInfoImpl;
 using NodeCtl::Storage::ScsiInterface;
-
-void IscsiTools::Refuse(const char* text, int line) {
-  throw CoreCtlException(text, "plugins/iscsi/IscsiUtil", line, NodeCtl::Lib::NoticeMessage());
-}
 
 std::unique_ptr<NodeCtl::Storage::iScsiInterface> IscsiTools::GetIscsiInterface(
     const std::string& adapterName) {
   StorageInfoImpl storage;
   std::unique_ptr<ScsiInterface> found(storage.GetScsiInterface(adapterName));
-  std::unique_ptr<iScsiInterface> adapter(dynamic_cast<iScsiInterfaceImpl*>(found.get()));
-  if (!adapter) Refuse("Not iSCSI adapter.");
-  static_cast<void>(found.release());  // the same object, now owned as what it is
-  return adapter;
+  auto* const adapter = dynamic_cast<iScsiInterfaceImpl*>(found.get());
+  if (adapter == nullptr) {
+    found.reset();  // gone by the time that the refusal is caught
+    Refuse("Not iSCSI adapter.");
+  }
+  static_cast<void>(found.release());
+  return std::unique_ptr<iScsiInterface>(adapter);
 }
 
 void IscsiTools::ProcessStatus(iScsiInterface* interface, iScsiStatus status,
                                boost::shared_ptr<Plinth::CallSpec::Output> output) {
   switch (status) {
     case iScsiStatus::RebootRequired:
-      output->ReportError(TessaroCli::IscsiNamespace::RebootRequiredMessage);
+      output->ReportError(TessaroCli::RebootRequiredMessage);
       break;
     case iScsiStatus::ResetRequired:
       interface->ResetAdapter();
       break;
     case iScsiStatus::NotSupported:
-      output->ReportError(TessaroCli::IscsiNamespace::OperationNotSupportedMessage);
+      output->ReportError(TessaroCli::OperationNotSupportedMessage);
       break;
     default:
       break;

@@ -5,6 +5,7 @@
 #include <sstream>
 
 #include "IscsiUtil/IscsiTools.h"
+#include "IscsiUtil/Refusal.h"
 
 namespace IscsiUtil {
 
@@ -37,12 +38,12 @@ std::optional<std::uint16_t> PortFrom(const std::string& text) {
 TargetAddress FromBrackets(const std::string& text) {
   constexpr char kNoPort[] = "Invalid address, expected format is [ipv6]:port)";
   const std::size_t closing = text.find(']');
-  if (closing == text.npos) IscsiTools::Refuse("Invalid address (expected format is [ipv6]:port)");
+  if (closing == text.npos) Refuse("Invalid address (expected format is [ipv6]:port)");
   const std::string address = text.substr(1, closing - 1);
-  if (closing + 1 == text.size() || text[closing + 1] != ':') IscsiTools::Refuse(kNoPort);
-  if (!IsIpv6(address)) IscsiTools::Refuse("Invalid IPv6 address");
+  if (closing + 1 == text.size() || text[closing + 1] != ':') Refuse(kNoPort);
+  if (!IsIpv6(address)) Refuse("Invalid IPv6 address");
   const auto port = PortFrom(text.substr(closing + 2));
-  if (!port) IscsiTools::Refuse("Invalid port number");
+  if (!port) Refuse("Invalid port number");
   return {HostAddress(address), *port};
 }
 
@@ -62,7 +63,7 @@ TargetAddress IscsiTools::GetTargetAddressFromString(const std::string& text) {
 }
 
 std::string IscsiTools::GetStringFromTargetAddress(const TargetAddress& address) {
-  std::ostringstream text;
+  std::ostringstream text;  // how a host is written is the library's, by its stream operator
   const bool bracketed = address.host.GetFamily() == AddressFamily::Ipv6;
   text << (bracketed ? "[" : "") << address.host << (bracketed ? "]:" : ":") << address.port;
   return text.str();

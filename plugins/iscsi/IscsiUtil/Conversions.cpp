@@ -8,6 +8,7 @@
 #include <span>
 
 #include "IscsiUtil/IscsiTools.h"
+#include "IscsiUtil/Refusal.h"
 
 namespace IscsiUtil {
 
@@ -27,18 +28,26 @@ constexpr const char* kPathStatuses[] = {"unused", "standby", "active", "last pa
 constexpr const char* kDiscoveryStatuses[] = {"Discovery Completed", "Discovery Timeout",
                                               "Discovery Completed, Some iSCSI Targets failed to login."};
 
-/// The word at @p number; @p otherwise where there is none.
-template <class Number>
-const char* WordAt(std::span<const char* const> words, Number number, const char* otherwise) {
-  const auto index = static_cast<std::size_t>(number);
-  return index < words.size() && words[index] != nullptr ? words[index] : otherwise;
+/// The word at @p number; @p otherwise where there is none, as for every negative number.
+const char* WordAt(std::span<const char* const> words, long long number, const char* otherwise) {
+  if (number < 0 || number >= std::ssize(words)) return otherwise;
+  const char* const word = words[static_cast<std::size_t>(number)];
+  return word == nullptr ? otherwise : word;
 }
 
-/// The number of @p word; the count of words where it is none of them.
-std::size_t NumberOf(std::span<const char* const> words, const std::string& word) {
-  std::size_t number = 0;
-  while (number < words.size() && (words[number] == nullptr || word != words[number])) ++number;
-  return number;
+/// The level that @p word names; @p refusal is thrown where it names none.
+int LevelFrom(const std::string& word, const char* refusal) {
+  for (int number = 0; number < std::ssize(kLevels); ++number) {
+    if (kLevels[number] != nullptr && word == kLevels[number]) return number;
+  }
+  Refuse(refusal);
+}
+
+/// The same the other way.
+const char* LevelWord(int number, const char* refusal) {
+  const char* const word = WordAt(kLevels, number, nullptr);
+  if (word == nullptr) Refuse(refusal);
+  return word;
 }
 
 constexpr char kInvalidDigest[] = "Invalid digest value";
@@ -47,37 +56,29 @@ constexpr char kInvalidChapLevel[] = "Invalid Chap Level value";
 }  // namespace
 
 std::string IscsiTools::GetStringFromDigest(iScsiDigestType digest) {
-  const char* word = WordAt(kLevels, digest, nullptr);
-  if (word == nullptr) Refuse(kInvalidDigest);
-  return word;
+  return LevelWord(static_cast<int>(digest), kInvalidDigest);
 }
 
 iScsiDigestType IscsiTools::GetDigestFromString(const std::string& word) {
-  const std::size_t number = NumberOf(kLevels, word);
-  if (number == std::size(kLevels)) Refuse(kInvalidDigest);
-  return static_cast<iScsiDigestType>(number);
+  return static_cast<iScsiDigestType>(LevelFrom(word, kInvalidDigest));
 }
 
 std::string IscsiTools::GetStringFromChapType(iScsiChapType level) {
-  const char* word = WordAt(kLevels, level, nullptr);
-  if (word == nullptr) Refuse(kInvalidChapLevel);
-  return word;
+  return LevelWord(static_cast<int>(level), kInvalidChapLevel);
 }
 
 iScsiChapType IscsiTools::GetChapTypeFromString(const std::string& word) {
-  const std::size_t number = NumberOf(kLevels, word);
-  if (number == std::size(kLevels)) Refuse(kInvalidChapLevel);
-  return static_cast<iScsiChapType>(number);
+  return static_cast<iScsiChapType>(LevelFrom(word, kInvalidChapLevel));
 }
 
 std::string IscsiTools::GetStringFromImaDigest(IMA_DIGEST_TYPE digest) {
-  const char* word = WordAt(kImaDigests, digest, nullptr);
+  const char* const word = WordAt(kImaDigests, digest, nullptr);
   if (word == nullptr) Refuse(kInvalidDigest);
   return word;
 }
 
 std::string IscsiTools::ConvertExtendedBoolToString(ExtendedBool value) {
-  return WordAt(kExtendedBools, value, "unknown");
+  return WordAt(kExtendedBools, static_cast<int>(value), "unknown");
 }
 
 std::string IscsiTools::GetStringFromComplianceCode(iScsiPortErrorCodes code) {
@@ -85,11 +86,11 @@ std::string IscsiTools::GetStringFromComplianceCode(iScsiPortErrorCodes code) {
 }
 
 std::string IscsiTools::GetStringFromPathStatus(iScsiNetworkPortalStatus status) {
-  return WordAt(kPathStatuses, status, "unknown");
+  return WordAt(kPathStatuses, static_cast<int>(status), "unknown");
 }
 
 std::string IscsiTools::GetStringFromDiscoveryStatus(iScsiInterface::iScsiDiscoveryStatus status) {
-  return WordAt(kDiscoveryStatuses, status, "unknown");
+  return WordAt(kDiscoveryStatuses, static_cast<int>(status), "unknown");
 }
 
 const char* IscsiTools::GetStringFromImaIpAddress(const IMA_IP_ADDRESS* address) {
@@ -104,7 +105,7 @@ const char* IscsiTools::GetStringFromImaIpAddress(const IMA_IP_ADDRESS* address)
   return text;
 }
 
-const IMA_IP_ADDRESS* IscsiTools::GetImaIpAddressFromString(const char* text) {
+IMA_IP_ADDRESS* IscsiTools::GetImaIpAddressFromString(const char* text) {
   static IMA_IP_ADDRESS address;
   address = {};
   if (inet_pton(AF_INET, text, address.ipAddress) == 1) {

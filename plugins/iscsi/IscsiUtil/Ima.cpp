@@ -1,6 +1,12 @@
 #include "IscsiUtil/Ima.h"
 
+#include <text/text.h>
+
+#include <algorithm>
 #include <cstdio>
+#include <cstdlib>
+#include <memory>
+#include <new>
 
 #include "IscsiUtil/IscsiTools.h"
 
@@ -10,28 +16,9 @@ namespace {
 /// Bytes that continue a UTF-8 character are 10xxxxxx.
 bool ContinuesCharacter(char byte) { return (static_cast<unsigned char>(byte) & 0xc0) == 0x80; }
 
-void AppendUtf8(std::string& text, char32_t character) {
-  const auto append = [&text](char32_t bits) { text += static_cast<char>(bits); };
-  const auto continueFrom = [&](unsigned shift) { append(0x80 | ((character >> shift) & 0x3f)); };
-  if (character < 0x80) {
-    append(character);
-  } else if (character < 0x800) {
-    append(0xc0 | (character >> 6));
-    continueFrom(0);
-  } else if (character >= 0xd800 && character < 0xe000) {
-    text += '?';
-  } else if (character < 0x10000) {
-    append(0xe0 | (character >> 12));
-    continueFrom(6);
-    continueFrom(0);
-  } else if (character < 0x110000) {
-    append(0xf0 | (character >> 18));
-    continueFrom(12);
-    continueFrom(6);
-    continueFrom(0);
-  } else {
-    text += '?';
-  }
+bool IsCharacter(IMA_WCHAR character) {
+  const auto number = static_cast<char32_t>(character);
+  return number < 0xd800 || (number >= 0xe000 && number < 0x110000);
 }
 
 }  // namespace
@@ -45,12 +32,19 @@ std::string CutText(std::string text, std::size_t size) {
 }
 
 std::string NarrowText(std::span<const IMA_WCHAR> wide, std::size_t size) {
-  std::string text;
+  // Most are ASCII, which needs no conversion.
+  const auto end = std::find_if(wide.begin(), wide.end(), [](IMA_WCHAR c) { return c <= 0 || c >= 0x80; });
+  if (end != wide.end() && *end == 0) return CutText(std::string(wide.begin(), end), size);
+  std::wstring characters;  // as many as can fit
   for (const IMA_WCHAR character : wide) {
-    if (character == 0 || text.size() >= size) break;
-    AppendUtf8(text, static_cast<char32_t>(character));
+    if (character == 0 || characters.size() >= size) break;
+    characters += IsCharacter(character) ? character : L'?';
   }
-  return CutText(std::move(text), size);
+  char* converted = nullptr;
+  if (!CodeSet_UTF32ToUTF8(characters.c_str(), &converted))
+    throw std::bad_alloc();  // there is no other reason
+  const std::unique_ptr<char, decltype(&std::free)> text(converted, &std::free);
+  return CutText(text.get(), size);
 }
 
 std::string AddressText(const IMA_IP_ADDRESS& address) {

@@ -21,24 +21,22 @@
 
 namespace IscsiUtil {
 
-/// Ends the steps of a command. Never leaves ReportingImaFailures.
+/// A call that failed: thrown to end the steps of a command. Never leaves ReportingImaFailures.
 struct ImaFailure {
-  const char* text;
+  const char* text;  ///< what the command shows of it
 };
 
 inline void CheckIma(IMA_STATUS status, const char* failure) {
   if (status != IMA_STATUS_SUCCESS) throw ImaFailure{failure};
 }
 
-/// Runs @p steps and reports the failure that ends them. False then.
+/// Runs @p steps; a call that fails ends them and is reported.
 template <class Steps>
-bool ReportingImaFailures(Plinth::CallSpec::Output& output, Steps&& steps) {
+void ReportingImaFailures(Plinth::CallSpec::Output& output, Steps&& steps) {
   try {
     steps();
-    return true;
   } catch (const ImaFailure& failure) {
     output.ReportError(failure.text);
-    return false;
   }
 }
 

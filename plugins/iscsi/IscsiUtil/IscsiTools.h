@@ -50,7 +50,7 @@ class IscsiTools {
   /// The text of @p address in a static buffer that the next call overwrites; null when it has none.
   static const char* GetStringFromImaIpAddress(const IMA_IP_ADDRESS* address);
   /// The address in @p text in a static record that the next call overwrites; null when it is none.
-  static const IMA_IP_ADDRESS* GetImaIpAddressFromString(const char* text);
+  static IMA_IP_ADDRESS* GetImaIpAddressFromString(const char* text);
   /// Writes @p source as UTF-8, with its terminator, to @p destination of @p size bytes. Anything that cannot
   /// be converted or does not fit is IMA_ERROR_INVALID_PARAMETER, and @p destination stays as it was.
   static IMA_STATUS GetUtf8StringFromWideCharString(char* destination, const wchar_t* source,
@@ -79,7 +79,7 @@ class IscsiTools {
   static NodeCtl::Network::Ipv4Address GetIpv4AddressFromString(const std::string& text);
   static NodeCtl::Network::Ipv6Address GetIpv6AddressFromString(const std::string& text);
 
-  // Parameters.cpp: session parameters by their keys; all but the first refuse a key that they do not know
+  // Parameters.cpp: session parameters by their keys; a key that is not known is refused
 
   /// A fresh prototype of the rows of ParmFill.
   static boost::shared_ptr<Plinth::MetaObj::MetaStruct> ParmStructure();
@@ -115,9 +115,6 @@ class IscsiTools {
   /// Appends a row for each network parameter of the physical portal @p phynic to @p list.
   static void NetParmFill(const std::string& phynic, const boost::shared_ptr<Plinth::MetaObj::MetaList>& list,
                           const NodeCtl::Storage::iScsiCapabilities& capabilities, int mtu, bool arpRedirect);
-
-  /// Throws CoreCtlException with @p text.
-  [[noreturn]] static void Refuse(const char* text, int line = __builtin_LINE());
 };
 
 }  // namespace IscsiUtil

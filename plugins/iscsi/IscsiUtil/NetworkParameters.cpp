@@ -1,13 +1,13 @@
 #include "IscsiUtil/IscsiTools.h"
-#include "IscsiUtil/Parameters.h"
+#include "IscsiUtil/ParmRows.h"
 
 namespace IscsiUtil {
 
-using TessaroCli::IscsiNamespace::Column;
-using TessaroCli::IscsiNamespace::NewPrototype;
-using TessaroCli::IscsiNamespace::NewRow;
-using TessaroCli::IscsiNamespace::Structure;
-using TessaroCli::IscsiNamespace::StructureOf;
+using TessaroCli::Column;
+using TessaroCli::NewPrototype;
+using TessaroCli::NewRow;
+using TessaroCli::Structure;
+using TessaroCli::StructureOf;
 
 namespace {
 
@@ -24,10 +24,11 @@ constexpr Column<Shown> kColumns[] = {
     {"Value", [](const Shown& shown) { return shown.value; }},
     {"Settable", [](const Shown& shown) { return shown.settable; }},
 };
+constexpr auto kRow = StructureOf<kColumns>("iScsiNetParm");
 
 }  // namespace
 
-constinit const Structure kNetParm = StructureOf<kColumns>("iScsiNetParm");
+constinit const Structure kNetParm = static_cast<const Structure&>(kRow);  // without its columns
 
 boost::shared_ptr<Plinth::MetaObj::MetaStruct> IscsiTools::NetParmStructure() {
   return NewPrototype(kNetParm);
@@ -37,9 +38,8 @@ void IscsiTools::NetParmFill(const std::string& phynic,
                              const boost::shared_ptr<Plinth::MetaObj::MetaList>& list,
                              const NodeCtl::Storage::iScsiCapabilities& capabilities, int mtu,
                              bool arpRedirect) {
-  list->Append(NewRow(kNetParm, kColumns, {phynic, "MTU", mtu, capabilities.mtuSettable}));
-  list->Append(NewRow(kNetParm, kColumns,
-                      {phynic, "ArpRedirect", int{arpRedirect}, capabilities.arpRedirectSettable}));
+  list->Append(NewRow(kRow, {phynic, "MTU", mtu, capabilities.mtuSettable}));
+  list->Append(NewRow(kRow, {phynic, "ArpRedirect", int{arpRedirect}, capabilities.arpRedirectSettable}));
 }
 
 }  // namespace IscsiUtil

@@ -1,10 +1,9 @@
-#include "IscsiUtil/Parameters.h"
-
 #include <cstdlib>
-#include <string_view>
 #include <variant>
 
 #include "IscsiUtil/IscsiTools.h"
+#include "IscsiUtil/ParmRows.h"
+#include "IscsiUtil/Refusal.h"
 
 namespace IscsiUtil {
 
@@ -13,106 +12,74 @@ using NodeCtl::Storage::iScsiDigestType;
 using NodeCtl::Storage::iScsiIntegerParm;
 using NodeCtl::Storage::iScsiParms;
 using NodeCtl::Storage::iSnsParms;
-using TessaroCli::IscsiNamespace::Column;
-using TessaroCli::IscsiNamespace::NewPrototype;
-using TessaroCli::IscsiNamespace::NewRow;
-using TessaroCli::IscsiNamespace::Structure;
-using TessaroCli::IscsiNamespace::StructureOf;
+using TessaroCli::Column;
+using TessaroCli::NewPrototype;
+using TessaroCli::NewRow;
+using TessaroCli::Structure;
+using TessaroCli::StructureOf;
 
 namespace {
 
-// Tables of parameters
+// The table of session parameters
 
-enum class ParmType { Integer, Boolean, HeaderDigest, DataDigest };
-
-/// The place of a value that passes beside the record.
-using Beside = std::monostate;
-/// The place of a value that is the record itself.
-struct Whole {};
-
-/// A parameter: its key, and where value and inherit mark stand in the record.
-template <class Parms, class... Places>
-struct ParmRow {
-  const char* key;
-  ParmType type;
-  std::variant<Beside, Places...> value;
-  bool Parms::*inherited;
-
-  constexpr bool IsDigest() const { return type == ParmType::HeaderDigest || type == ParmType::DataDigest; }
-};
-
-using Row = ParmRow<iScsiParms, iScsiIntegerParm<std::int32_t> iScsiParms::*,
-                    iScsiIntegerParm<std::int64_t> iScsiParms::*, iScsiBoolParm iScsiParms::*>;
-
-using enum ParmType;
 using P = iScsiParms;
 
+/// A digest has no value in the record: it passes beside it.
+enum class Digest { Header, Data };
+
+/// A parameter: its key, and where its value and its inherit mark stand in the record.
+struct Row {
+  const char* key;
+  std::variant<iScsiIntegerParm<std::int32_t> P::*, iScsiIntegerParm<std::int64_t> P::*, iScsiBoolParm P::*,
+               Digest>
+      value;
+  bool P::*inherited;
+};
+
 constexpr Row kTable[] = {
-    {"ErrorRecoveryLevel", Integer, &P::errorRecoveryLevel, &P::errorRecoveryLevelInherited},
-    {"InitialLoginRetryMax", Integer, &P::initialLoginRetryMax, &P::initialLoginRetryMaxInherited},
-    {"InitialR2T", Boolean, &P::initialR2T, &P::initialR2TInherited},
-    {"FirstBurstLength", Integer, &P::firstBurstLength, &P::firstBurstLengthInherited},
-    {"MaxBurstLength", Integer, &P::maxBurstLength, &P::maxBurstLengthInherited},
-    {"MaxRecvDataSegment", Integer, &P::maxRecvDataSegment, &P::maxRecvDataSegmentInherited},
-    {"MaxOutstandingR2T", Integer, &P::maxOutstandingR2T, &P::maxOutstandingR2TInherited},
-    {"MaxCmds", Integer, &P::maxCmds, &P::maxCmdsInherited},
-    {"ImmediateData", Boolean, &P::immediateData, &P::immediateDataInherited},
-    {"DefaultTime2Retain", Integer, &P::defaultTime2Retain, &P::defaultTime2RetainInherited},
-    {"DefaultTime2Wait", Integer, &P::defaultTime2Wait, &P::defaultTime2WaitInherited},
-    {"LoginTimeout", Integer, &P::loginTimeout, &P::loginTimeoutInherited},
-    {"LogoutTimeout", Integer, &P::logoutTimeout, &P::logoutTimeoutInherited},
-    {"NoopOutInterval", Integer, &P::noopOutInterval, &P::noopOutIntervalInherited},
-    {"NoopOutTimeout", Integer, &P::noopOutTimeout, &P::noopOutTimeoutInherited},
-    {"RecoveryTimeout", Integer, &P::recoveryTimeout, &P::recoveryTimeoutInherited},
-    {"DelayedAck", Boolean, &P::delayedAck, &P::delayedAckInherited},
-    {"HeaderDigest", HeaderDigest, Beside(), &P::headerDigestInherited},
-    {"DataDigest", DataDigest, Beside(), &P::dataDigestInherited},
+    {"ErrorRecoveryLevel", &P::errorRecoveryLevel, &P::errorRecoveryLevelInherited},
+    {"InitialLoginRetryMax", &P::initialLoginRetryMax, &P::initialLoginRetryMaxInherited},
+    {"InitialR2T", &P::initialR2T, &P::initialR2TInherited},
+    {"FirstBurstLength", &P::firstBurstLength, &P::firstBurstLengthInherited},
+    {"MaxBurstLength", &P::maxBurstLength, &P::maxBurstLengthInherited},
+    {"MaxRecvDataSegment", &P::maxRecvDataSegment, &P::maxRecvDataSegmentInherited},
+    {"MaxOutstandingR2T", &P::maxOutstandingR2T, &P::maxOutstandingR2TInherited},
+    {"MaxCmds", &P::maxCmds, &P::maxCmdsInherited},
+    {"ImmediateData", &P::immediateData, &P::immediateDataInherited},
+    {"DefaultTime2Retain", &P::defaultTime2Retain, &P::defaultTime2RetainInherited},
+    {"DefaultTime2Wait", &P::defaultTime2Wait, &P::defaultTime2WaitInherited},
+    {"LoginTimeout", &P::loginTimeout, &P::loginTimeoutInherited},
+    {"LogoutTimeout", &P::logoutTimeout, &P::logoutTimeoutInherited},
+    {"NoopOutInterval", &P::noopOutInterval, &P::noopOutIntervalInherited},
+    {"NoopOutTimeout", &P::noopOutTimeout, &P::noopOutTimeoutInherited},
+    {"RecoveryTimeout", &P::recoveryTimeout, &P::recoveryTimeoutInherited},
+    {"DelayedAck", &P::delayedAck, &P::delayedAckInherited},
+    {"HeaderDigest", Digest::Header, &P::headerDigestInherited},
+    {"DataDigest", Digest::Data, &P::dataDigestInherited},
 };
 
-constexpr ParmRow<iSnsParms, Whole> kIsnsTable[] = {
-    {"PollInterval", Integer, Whole(), &iSnsParms::inherited},
-};
+constexpr char kUnknownKey[] = "Invalid parameter key";
 
-template <class AnyRow, std::size_t count>
-const AnyRow& RowOf(const AnyRow (&table)[count], const std::string& key) {
-  for (const AnyRow& row : table) {
+const Row& RowOf(const std::string& key) {
+  for (const Row& row : kTable) {
     if (key == row.key) return row;
   }
-  IscsiTools::Refuse("Invalid parameter key");
+  Refuse(kUnknownKey);
 }
 
-template <class Parms, class Place>
-auto& ValueAt(Parms& parms, Place place) {
-  return parms.*place;
-}
-template <class Parms>
-Parms& ValueAt(Parms& parms, Whole) {
-  return parms;
+void RequirePollInterval(const std::string& key) {
+  if (key != "PollInterval") Refuse(kUnknownKey);
 }
 
-/// Runs @p use on the value of the parameter in @p parms. False when it stands beside the record.
-template <class AnyRow, class Parms, class Use>
-bool WithValue(const AnyRow& row, Parms& parms, Use&& use) {
-  return std::visit(
-      [&](auto place) {
-        if constexpr (std::is_same_v<decltype(place), Beside>) {
-          return false;
-        } else {
-          use(ValueAt(parms, place));
-          return true;
-        }
-      },
-      row.value);
-}
+/// One function for each kind of value. The one that takes any place serves the numbers of both widths.
+template <class... Functions>
+struct ByKind : Functions... {
+  using Functions::operator()...;
+};
+template <class... Functions>
+ByKind(Functions...) -> ByKind<Functions...>;
 
-/// The same for a change, which ends the inheritance too.
-template <class AnyRow, class Parms, class Use>
-void ChangeValue(const AnyRow& row, Parms& parms, Use&& use) {
-  if (!WithValue(row, parms, use) && !row.IsDigest()) IscsiTools::Refuse("Invalid parameter type");
-  parms.*row.inherited = false;
-}
-
-// Values of one parameter. All numbers are handled in 32 bits: of wider ones, the low half.
+// All numbers are handled in 32 bits: of wider ones, the low half.
 
 std::int32_t LowHalf(std::int64_t number) { return static_cast<std::int32_t>(number); }
 
@@ -122,28 +89,20 @@ void SetLowHalf(std::int64_t& number, std::int32_t half) {
   number = static_cast<std::int64_t>(high | static_cast<std::uint32_t>(half));
 }
 
-template <class Numeric>
-void StoreValue(Numeric& parm, const std::string& text) {
-  SetLowHalf(parm.current, LowHalf(std::strtol(text.c_str(), nullptr, 10)));
-}
+// The words of the command line
 
-void StoreValue(iScsiBoolParm& parm, const std::string& text) {
+/// What strtol makes of @p text: no digits are 0, and nothing is said of what stands behind them.
+std::int32_t NumberFrom(const std::string& text) { return LowHalf(std::strtol(text.c_str(), nullptr, 10)); }
+
+bool TruthFrom(const std::string& text) {
   for (const char* word : {"yes", "y", "true", "1"}) {
-    if (text == word) return static_cast<void>(parm.current = true);
+    if (text == word) return true;
   }
   for (const char* word : {"no", "n", "false", "0"}) {
-    if (text == word) return static_cast<void>(parm.current = false);
+    if (text == word) return false;
   }
-  IscsiTools::Refuse(
-      "Invalid data type for bool parameter expected one of [0, 1, y, n, true, false, yes, no]");
+  Refuse("Invalid data type for bool parameter expected one of [0, 1, y, n, true, false, yes, no]");
 }
-
-template <class Numeric>
-void StoreDefault(Numeric& parm) {
-  SetLowHalf(parm.current, LowHalf(parm.defaultValue));
-}
-
-void StoreDefault(iScsiBoolParm& parm) { parm.current = parm.defaultValue; }
 
 // The rows of a listing
 
@@ -160,22 +119,7 @@ struct Shown {
   bool inherited = false;
 };
 
-template <class Numeric>
-void Show(Shown& shown, const Numeric& parm) {
-  if (!parm.valid) return;
-  shown.current = std::to_string(LowHalf(parm.current));
-  shown.defaultValue = std::to_string(LowHalf(parm.defaultValue));
-  shown.min = std::to_string(LowHalf(parm.min));
-  shown.max = std::to_string(LowHalf(parm.max));
-  shown.settable = parm.settable;
-}
-
-void Show(Shown& shown, const iScsiBoolParm& parm) {
-  if (!parm.valid) return;
-  shown.current = parm.current ? "true" : "false";
-  shown.defaultValue = parm.defaultValue ? "true" : "false";
-  shown.settable = parm.settable;
-}
+const char* TruthText(bool truth) { return truth ? "true" : "false"; }
 
 constexpr Column<Shown> kColumns[] = {
     {"ID", [](const Shown& shown) { return shown.id; }},
@@ -187,10 +131,11 @@ constexpr Column<Shown> kColumns[] = {
     {"Settable", [](const Shown& shown) { return shown.settable; }},
     {"Inherit", [](const Shown& shown) { return shown.inherited; }},
 };
+constexpr auto kShown = StructureOf<kColumns>("iScsiParm");
 
 }  // namespace
 
-constinit const Structure kParm = StructureOf<kColumns>("iScsiParm");
+constinit const Structure kParm = static_cast<const Structure&>(kShown);  // without its columns
 
 boost::shared_ptr<Plinth::MetaObj::MetaStruct> IscsiTools::ParmStructure() { return NewPrototype(kParm); }
 
@@ -202,55 +147,91 @@ void IscsiTools::ParmFill(const std::string& id, const boost::shared_ptr<Plinth:
     shown.id = id;
     shown.key = row.key;
     shown.inherited = parms.*row.inherited;
-    WithValue(row, parms, [&](const auto& parm) { Show(shown, parm); });
-    if (row.IsDigest()) {
-      const bool header = row.type == HeaderDigest;
-      shown.current = GetStringFromDigest(header ? headerDigest : dataDigest);
-      shown.defaultValue = GetStringFromDigest(iScsiDigestType::Prohibited);
-      shown.settable = header ? headerSettable : dataSettable;
-    }
-    list->Append(NewRow(kParm, kColumns, shown));
+    const ByKind show = {
+        [&](Digest digest) {
+          shown.current = GetStringFromDigest(digest == Digest::Header ? headerDigest : dataDigest);
+          shown.defaultValue = GetStringFromDigest(iScsiDigestType::Prohibited);
+          shown.settable = digest == Digest::Header ? headerSettable : dataSettable;
+        },
+        [&](iScsiBoolParm P::*place) {
+          const iScsiBoolParm& parm = parms.*place;
+          if (!parm.valid) return;
+          shown.current = TruthText(parm.current);
+          shown.defaultValue = TruthText(parm.defaultValue);
+          shown.settable = parm.settable;
+        },
+        [&](auto place) {
+          const auto& parm = parms.*place;
+          if (!parm.valid) return;
+          shown.current = std::to_string(LowHalf(parm.current));
+          shown.defaultValue = std::to_string(LowHalf(parm.defaultValue));
+          shown.min = std::to_string(LowHalf(parm.min));
+          shown.max = std::to_string(LowHalf(parm.max));
+          shown.settable = parm.settable;
+        },
+    };
+    std::visit(show, row.value);
+    list->Append(NewRow(kShown, shown));
   }
 }
 
 bool IscsiTools::IsParmSettable(const std::string& key, const iScsiParms& parms, bool headerSettable,
                                 bool dataSettable) {
-  const Row& row = RowOf(kTable, key);
-  bool settable = false;
-  if (row.type == HeaderDigest) settable = headerSettable;
-  if (row.type == DataDigest) settable = dataSettable;
-  WithValue(row, parms, [&](const auto& parm) { settable = parm.settable; });
-  return settable;
+  const ByKind isSettable = {
+      [&](Digest digest) { return digest == Digest::Header ? headerSettable : dataSettable; },
+      [&](auto place) { return (parms.*place).settable; },
+  };
+  return std::visit(isSettable, RowOf(key).value);
 }
 
 void IscsiTools::ParmSet(const std::string& key, const std::string& value, iScsiParms& parms) {
-  ChangeValue(RowOf(kTable, key), parms, [&](auto& parm) { StoreValue(parm, value); });
+  const Row& row = RowOf(key);
+  const ByKind set = {
+      [](Digest) {},
+      [&](iScsiBoolParm P::*place) { (parms.*place).current = TruthFrom(value); },
+      [&](auto place) { SetLowHalf((parms.*place).current, NumberFrom(value)); },
+  };
+  std::visit(set, row.value);
+  parms.*row.inherited = false;
 }
 
 void IscsiTools::ParmInherit(const std::string& key, iScsiParms& parms) {
-  parms.*RowOf(kTable, key).inherited = true;
+  parms.*RowOf(key).inherited = true;
 }
 
 void IscsiTools::ParmDefault(const std::string& key, iScsiParms& parms) {
-  ChangeValue(RowOf(kTable, key), parms, [](auto& parm) { StoreDefault(parm); });
+  const Row& row = RowOf(key);
+  const ByKind setDefault = {
+      [](Digest) {},
+      [&](iScsiBoolParm P::*place) { (parms.*place).current = (parms.*place).defaultValue; },
+      [&](auto place) { SetLowHalf((parms.*place).current, LowHalf((parms.*place).defaultValue)); },
+  };
+  std::visit(setDefault, row.value);
+  parms.*row.inherited = false;
 }
 
+// The one parameter of iSNS discovery
+
 bool IscsiTools::IsIsnsParmSettable(const std::string& key, const iSnsParms& parms) {
-  bool settable = false;
-  WithValue(RowOf(kIsnsTable, key), parms, [&](const auto& parm) { settable = parm.settable; });
-  return settable;
+  RequirePollInterval(key);
+  return parms.settable;
 }
 
 void IscsiTools::IsnsParmSet(const std::string& key, const std::string& value, iSnsParms& parms) {
-  ChangeValue(RowOf(kIsnsTable, key), parms, [&](auto& parm) { StoreValue(parm, value); });
+  RequirePollInterval(key);
+  parms.current = NumberFrom(value);
+  parms.inherited = false;
 }
 
 void IscsiTools::IsnsParmInherit(const std::string& key, iSnsParms& parms) {
-  parms.*RowOf(kIsnsTable, key).inherited = true;
+  RequirePollInterval(key);
+  parms.inherited = true;
 }
 
 void IscsiTools::IsnsParmDefault(const std::string& key, iSnsParms& parms) {
-  ChangeValue(RowOf(kIsnsTable, key), parms, [](auto& parm) { StoreDefault(parm); });
+  RequirePollInterval(key);
+  parms.current = parms.defaultValue;
+  parms.inherited = false;
 }
 
 }  // namespace IscsiUtil

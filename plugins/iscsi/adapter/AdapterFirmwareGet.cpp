@@ -44,11 +44,11 @@ constexpr Column<Shown> kColumns[] = {
            static_cast<NodeCtl::Storage::ExtendedBool>(shown.image.upgrade));
      }},
 };
-constexpr Structure kFirmware = StructureOf<kColumns>("AdapterFirmware");
+constexpr auto kFirmware = StructureOf<kColumns>("AdapterFirmware");
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("file", 'f', "Path to the firmware file to retrieve information from.").Required(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("file", 'f', "Path to the firmware file to retrieve information from.").Required(),
 };
 
 }  // namespace
@@ -59,20 +59,25 @@ class AdapterFirmwareGet : public CommandFrame<AdapterFirmwareGet> {
       .description = "Validate the iSCSI firmware for the iSCSI Host Bus Adapter.",
       .type = kFetcher,
       .formatter = "simple",
-      .formatterParameters = {Setting("header:AdapterFirmware", "%File%"),
-                              FieldsFrom(0, "fields:AdapterFirmware")},
-      .parameters = kParameters,
-      .result = ListOf(kFirmware),
+      .formatterSettings = {Setting("header:AdapterFirmware", "%File%"),
+                            FieldsFrom(0, kFirmware, "fields:AdapterFirmware")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kFirmware); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithFirmwareFile(input, output, [&](const FirmwareFile& file) {
-      const ListPtr list = NewList(kFirmware);
-      list->Append(
-          NewRow(kFirmware, kColumns, {input->GetString("file"), file.Image("Invalid file provided.")}));
+    const std::string name = input->GetString("adapter");
+    const std::string path = input->GetString("file");
+    const ListPtr list = NewList(GetListType());
+    ReportingImaFailures(*output, [&] {
+      const WideText widePath = WidePath(path);
+      const auto adapter = FindPhysicalAdapter(name, output);
+      if (!adapter) return;
+      ReadDownloadProperties(*adapter);  // an adapter without them takes no file
+      list->Append(NewRow(kFirmware, {path, ReadImage(*adapter, widePath, "Invalid file provided.")}));
       Post(output, list);
     });
   }

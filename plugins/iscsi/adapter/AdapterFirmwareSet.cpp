@@ -3,9 +3,9 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("file", 'f', "Path to the firmware file to download.").Required(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("file", 'f', "Path to the firmware file to download.").Required(),
 };
 
 /// Why an image of that type is not downloaded; null where it is. Only the kinds that carry an option ROM are
@@ -33,16 +33,22 @@ class AdapterFirmwareSet : public CommandFrame<AdapterFirmwareSet> {
   static constexpr Declaration kDeclaration{
       .description = "Upload the iSCSI firmware for the iSCSI Host Bus Adapter.",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithFirmwareFile(input, output, [&](const FirmwareFile& file) {
-      const auto type = file.Image("Invalid download file provided.").imageType;
-      if (const char* refusal = Refusal(type, file.download)) return output->ReportError(refusal);
-      CheckIma(IMA_PhbaDownload(file.adapter, type, file.path.get()), "Firmware download failed.");
+    const std::string name = input->GetString("adapter");
+    const std::string path = input->GetString("file");
+    ReportingImaFailures(*output, [&] {
+      const WideText widePath = WidePath(path);
+      const auto adapter = FindPhysicalAdapter(name, output);
+      if (!adapter) return;
+      const auto download = ReadDownloadProperties(*adapter);
+      const auto type = ReadImage(*adapter, widePath, "Invalid download file provided.").imageType;
+      if (const char* refusal = Refusal(type, download)) return output->ReportError(refusal);
+      CheckIma(IMA_PhbaDownload(*adapter, type, widePath.get()), "Firmware download failed.");
       PostSuccess(output);
     });
   }

@@ -10,9 +10,6 @@ struct Shown {
   Properties properties;
 };
 
-template <auto member>
-constexpr auto Property = [](const Shown& shown) { return shown.properties.*member; };
-
 /// A property that may be unknown, as a word.
 template <auto member>
 constexpr auto Known =
@@ -42,9 +39,9 @@ constexpr Column<Shown> kColumns[] = {
     {"Using TCP Offload Engine", Known<&Properties::usingTcpOffloadEngine>},
     {"Using ISCSI Offload Engine", Known<&Properties::usingIscsiOffloadEngine>},
 };
-constexpr Structure kInfo = StructureOf<kColumns>("AdapterInfo");
+constexpr auto kInfo = StructureOf<kColumns>("AdapterInfo");
 
-constexpr Parameter kParameters[] = {Adapter()};
+constexpr Option kOptions[] = {AdapterOption()};
 
 }  // namespace
 
@@ -54,18 +51,18 @@ class AdapterGet : public CommandFrame<AdapterGet> {
       .description = "List the iSCSI information for the iSCSI Host Bus Adapter.",
       .type = kFetcher,
       .formatter = "simple",
-      .formatterParameters = {Setting("header:AdapterInfo", "%ID%"), FieldsFrom(1, "fields")},
-      .parameters = kParameters,
-      .result = ListOf(kInfo),
+      .formatterSettings = {Setting("header:AdapterInfo", "%ID%"), FieldsFrom(1, kInfo, "fields")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetOutputStructure() const { return NewPrototype(kInfo); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithAdapter(input, output, {"Unable to get adapter information."}, [&](iScsiInterface& adapter) {
-      const ListPtr list = NewList(kInfo);
-      list->Append(NewRow(kInfo, kColumns, {adapter, adapter.GetPhysicalHbaProperties()}));
+    WithAdapter(input, output, Reporting("Unable to get adapter information."), [&](iScsiInterface& adapter) {
+      const ListPtr list = NewList(GetOutputStructure());
+      list->Append(NewRow(kInfo, {adapter, adapter.GetPhysicalHbaProperties()}));
       Post(output, list);
     });
   }

@@ -1,3 +1,4 @@
+#include "UnregisteredCommands.h"
 #include "discovery/IsnsRules.h"
 
 namespace TessaroCli::IscsiNamespace {
@@ -5,32 +6,28 @@ namespace {
 
 constexpr char kFailure[] = "Failed to get iSNS parameter configuration.";
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
 };
 
 }  // namespace
 
-class __attribute__((visibility("default"))) AdapterIsnsParamGet : public CommandFrame<AdapterIsnsParamGet> {
- public:
-  static constexpr Declaration kDeclaration{
-      .description = "Get the iSNS parameters for the iSCSI Host Bus Adapter.",
-      .type = kFetcher,
-      .formatter = "table",
-      .formatterParameters = {FieldsFrom(1, "fields")},
-      .parameters = kParameters,
-      .result = ListOf(kParm),
-  };
-
-  StructPtr GetOutputStructure() const { return IscsiTools::ParmStructure(); }
-
- private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithIsnsAdapter(input, output, kFailure,
-                    [&](iScsiInterface& adapter) { ShowIsnsParm(adapter.GetAdapterIsnsParms(), output); });
-  }
+constexpr Declaration AdapterIsnsParamGet::kDeclaration{
+    .description = "Get the iSNS parameters for the iSCSI Host Bus Adapter.",
+    .type = kFetcher,
+    .formatter = "table",
+    .formatterSettings = {FieldsFrom(1, kParm, "fields")},
+    .options = kOptions,
+    .result = ListResult(),
 };
 
-template __attribute__((visibility("default"))) NodePtr Make<AdapterIsnsParamGet>();
+boost::shared_ptr<AdapterIsnsParamGet> AdapterIsnsParamGet::New() { return CommandFrame::New(); }
+
+StructPtr AdapterIsnsParamGet::GetOutputStructure() const { return IscsiTools::ParmStructure(); }
+
+void AdapterIsnsParamGet::ExecuteInternal(InputPtr input, OutputPtr output) {
+  WithAdapter(input, output, ReportingReasonThen(kFailure),
+              [&](iScsiInterface& adapter) { ShowIsnsParm(adapter.GetAdapterIsnsParms(), output); });
+}
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -1,47 +1,47 @@
+#include "UnregisteredCommands.h"
 #include "discovery/IsnsRules.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("key", 'k', "The iSNS parameter key.").Required(),
-    String("value", 'v', "The iSNS parameter value."),
-    Flag("default", 'D', "Resetting iSNS parameter setting to default."),
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("key", 'k', "The iSNS parameter key.").Required(),
+    StringOption("value", 'v', "The iSNS parameter value."),
+    FlagOption("default", 'D', "Resetting iSNS parameter setting to default."),
 };
 
-constexpr IsnsPlace kAdapterPlace{
-    .inherits = false,
-    .failureText =
-        "Unable to set iSNS parameters. Please make sure parameter input is settable and within MAX/MIN "
-        "range (integer takes numbers, bool takes [true/false,yes/no,y/n]).",
-    .get = [](iScsiInterface& adapter, const iSnsConfig&) { return adapter.GetAdapterIsnsParms(); },
-    .set =
-        [](iScsiInterface& adapter, const iSnsConfig&, const iSnsParms& parms, const OutputPtr& output) {
-          IscsiTools::ProcessStatus(&adapter, adapter.SetAdapterIsnsParms(parms), output);
-        },
-};
+constexpr char kFailure[] =
+    "Unable to set iSNS parameters. Please make sure parameter input is settable and within MAX/MIN "
+    "range (integer takes numbers, bool takes [true/false,yes/no,y/n]).";
 
 }  // namespace
 
-class __attribute__((visibility("default"))) AdapterIsnsParamSet : public CommandFrame<AdapterIsnsParamSet> {
- public:
-  static constexpr Declaration kDeclaration{
-      .description = "Set the iSNS parameter for the iSCSI Host Bus Adapter.",
-      .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
-  };
-
- private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    if (CountIsnsSources(input, kAdapterPlace.inherits) != 1) {
-      return output->ReportError("The value and default options cannot be used together.");
-    }
-    SetIsnsParm(kAdapterPlace, {}, input, output);
-  }
+constexpr Declaration AdapterIsnsParamSet::kDeclaration{
+    .description = "Set the iSNS parameter for the iSCSI Host Bus Adapter.",
+    .type = kOperation,
+    .options = kOptions,
+    .result = SuccessResult(),
 };
 
-template __attribute__((visibility("default"))) NodePtr Make<AdapterIsnsParamSet>();
+boost::shared_ptr<AdapterIsnsParamSet> AdapterIsnsParamSet::New() { return CommandFrame::New(); }
+
+void AdapterIsnsParamSet::ExecuteInternal(InputPtr input, OutputPtr output) {
+  if (CountGiven(input, {"value", "default"}) != 1) return output->ReportError(kValueOrDefaultMessage);
+  if (!KeyAndValueAreSound(input, output)) return;
+  WithAdapter(input, output, ReportingReasonThen(kFailure), [&](iScsiInterface& adapter) {
+    const std::string key = input->GetString("key");
+    iSnsParms parms = adapter.GetAdapterIsnsParms();
+    if (!IscsiTools::IsIsnsParmSettable(key, parms)) return output->ReportError(NotSettableText(key));
+    if (input->HasParameter("value")) {
+      IscsiTools::IsnsParmSet(key, input->GetString("value"), parms);
+    } else {
+      if (!input->GetFlag("default")) return output->ReportError(InvalidDefaultUseMessage);
+      IscsiTools::IsnsParmDefault(key, parms);
+    }
+    IscsiTools::ProcessStatus(&adapter, adapter.SetAdapterIsnsParms(parms), output);
+    PostSuccess(output);
+  });
+}
 
 }  // namespace TessaroCli::IscsiNamespace

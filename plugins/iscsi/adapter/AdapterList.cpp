@@ -29,9 +29,9 @@ constexpr Column<Listed> kColumns[] = {
     {"UID", [](const Listed& listed) { return listed.adapter.GetAdapterUid(); }},
     {"Description", [](const Listed& listed) { return listed.properties.description; }},
 };
-constexpr Structure kAdapter = StructureOf<kColumns>("iScsiAdapter");
+constexpr auto kAdapter = StructureOf<kColumns>("iScsiAdapter");
 
-constexpr Parameter kParameters[] = {AdapterFilter()};
+constexpr Option kOptions[] = {AdapterFilter()};
 
 }  // namespace
 
@@ -41,33 +41,39 @@ class AdapterList : public CommandFrame<AdapterList> {
       .description = "List all the iSCSI Host Bus Adapters on the system.",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {Setting("fields:iScsiAdapter", "Adapter,Driver,State,UID,Description")},
-      .parameters = kParameters,
-      .result = BareListOf(kAdapter),
+      .formatterSettings = {Setting("fields:iScsiAdapter", "Adapter,Driver,State,UID,Description")},
+      .options = kOptions,
+      .result = BareListResult(),
   };
 
   StructPtr GetOutputStructure() const { return NewPrototype(kAdapter); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    const ListPtr list = NewList(kAdapter);
-    const bool limited = input->HasParameter("adapter");
-    bool found = !limited;
-    const bool listed = Guarded(output, {"Unable to list adapters."}, [&] {
-      CoreCtl::Storage::StorageInfoImpl storage;
-      const OwnedVector<iScsiInterface> adapters(storage.GetiScsiInterfaces());
-      for (iScsiInterface* adapter : adapters) {
-        if (adapter == nullptr) continue;
-        if (limited && adapter->GetName() != input->GetString("adapter")) continue;
-        const auto properties = adapter->GetPhysicalHbaProperties();
-        const auto state = adapter->GetAdapterState();
-        list->Append(NewRow(kAdapter, kColumns, {*adapter, properties, state}));
-        found = true;
-      }
+    const ListPtr list = NewList(GetOutputStructure());
+    Guarded(output, Reporting("Unable to list adapters."), [&] {
+      if (!AppendAdapters(*input, *list)) return output->ReportError(InvalidAdapterMessage);
+      Post(output, list);
     });
-    if (!listed) return;
-    if (!found) return output->ReportError(InvalidAdapterMessage);
-    Post(output, list);
+  }
+
+  /// A row for each adapter, or for the one that was named; false where the host has none of that name. This
+  /// is not the walk of ListAdapters: that takes an empty name for none given, and ends at the adapter that
+  /// it names.
+  static bool AppendAdapters(const Plinth::CallSpec::Input& input, Plinth::MetaObj::MetaList& list) {
+    const bool named = input.HasParameter("adapter");
+    bool found = !named;
+    CoreCtl::Storage::StorageInfoImpl storage;
+    const OwnedVector<iScsiInterface> adapters(storage.GetiScsiInterfaces());
+    for (iScsiInterface* adapter : adapters) {
+      if (adapter == nullptr) continue;
+      if (named && adapter->GetName() != input.GetString("adapter")) continue;
+      const auto properties = adapter->GetPhysicalHbaProperties();
+      const auto state = adapter->GetAdapterState();
+      list.Append(NewRow(kAdapter, {*adapter, properties, state}));
+      found = true;
+    }
+    return found;
   }
 };
 

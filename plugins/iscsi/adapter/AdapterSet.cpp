@@ -3,10 +3,10 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("name", 'n', "The iSCSI initiator name."),
-    String("alias", 'a', "The iSCSI initiator alias."),
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("name", 'n', "The iSCSI initiator name."),
+    StringOption("alias", 'a', "The iSCSI initiator alias."),
 };
 
 }  // namespace
@@ -16,8 +16,8 @@ class AdapterSet : public CommandFrame<AdapterSet> {
   static constexpr Declaration kDeclaration{
       .description = "Set the iSCSI name and alias for the iSCSI Host Bus Adapter.",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
@@ -27,7 +27,7 @@ class AdapterSet : public CommandFrame<AdapterSet> {
     if (!hasName && !hasAlias) return output->ReportError(InvalidNameOrAliasMessage);
     if (hasName && input->GetString("name").empty()) return output->ReportError(InvalidNameMessage);
 
-    WithAdapter(input, output, {"Unable to set name or alias."}, [&](iScsiInterface& adapter) {
+    WithAdapter(input, output, Reporting("Unable to set name or alias."), [&](iScsiInterface& adapter) {
       if (hasName) {
         IscsiTools::ProcessStatus(&adapter, adapter.SetInitiatorName(input->GetString("name")), output);
       }

@@ -42,9 +42,9 @@ constexpr Column<Listed> kColumns[] = {
      [](const Listed& listed) { return listed.target.properties.sendTargetsDiscoveryEnabled != 0; }},
     {"Last Error", [](const Listed& listed) { return listed.lastError; }},
 };
-constexpr Structure kTarget = StructureOf<kColumns>("Target");
+constexpr auto kTarget = StructureOf<kColumns>("Target");
 
-constexpr Parameter kParameters[] = {
+constexpr Option kOptions[] = {
     AdapterFilter(),
     TargetFilter(),
 };
@@ -82,19 +82,19 @@ class AdapterTargetList : public CommandFrame<AdapterTargetList> {
       .description = "List iSCSI targets.",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {Setting("header:Target", "%ID%"),
-                              Setting("fields:Target", "Adapter,Target,Alias,Discovery Method,Last Error")},
-      .parameters = kParameters,
-      .result = ListOf(kTarget),
+      .formatterSettings = {Setting("header:Target", "%ID%"),
+                            Setting("fields:Target", "Adapter,Target,Alias,Discovery Method,Last Error")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kTarget); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    PostImaList(output, kTarget, [&](auto& list) {
-      ImaWalk(input, {}).Targets([&](const ImaWalk::Target& target) {
-        list.Append(NewRow(kTarget, kColumns, {target, LastError(target.oid)}));
+    PostImaList(output, GetListType(), [&](auto& list) {
+      ImaWalk(input).Targets([&](const ImaWalk::Target& target) {
+        list.Append(NewRow(kTarget, {target, LastError(target.oid)}));
       });
     });
   }

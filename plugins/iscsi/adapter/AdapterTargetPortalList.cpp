@@ -20,9 +20,9 @@ constexpr Column<Listed> kColumns[] = {
     {"Port", [](const Listed& listed) { return listed.IfPresent(listed.key.portNumber); }},
     {"Tpgt", [](const Listed& listed) { return listed.IfPresent(listed.key.targetPortalGroupTag); }},
 };
-constexpr Structure kTargetPortal = StructureOf<kColumns>("TargetPortal");
+constexpr auto kTargetPortal = StructureOf<kColumns>("TargetPortal");
 
-constexpr Parameter kParameters[] = {
+constexpr Option kOptions[] = {
     AdapterFilter(),
     TargetFilter(),
 };
@@ -35,20 +35,20 @@ class AdapterTargetPortalList : public CommandFrame<AdapterTargetPortalList> {
       .description = "List iSCSI target portals.",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {Setting("fields:TargetPortal", "Adapter,Target,IP,Port,Tpgt")},
-      .parameters = kParameters,
-      .result = ListOf(kTargetPortal),
+      .formatterSettings = {Setting("fields:TargetPortal", "Adapter,Target,IP,Port,Tpgt")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kTargetPortal); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    PostImaList(output, kTargetPortal, [&](auto& list) {
-      ImaWalk(input, {}).Targets([&](const ImaWalk::Target& target) {
+    PostImaList(output, GetListType(), [&](auto& list) {
+      ImaWalk(input).Targets([&](const ImaWalk::Target& target) {
         for (const IMA_ADDRESS_KEY& key :
              ImaAddressKeys("Unable to get address keys.", IMA_GetAddressKeys, target.oid)) {
-          list.Append(NewRow(kTargetPortal, kColumns, {target, key}));
+          list.Append(NewRow(kTargetPortal, {target, key}));
         }
       });
     });

@@ -3,14 +3,14 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     TargetName(),
     PortalAddress(),
-    String("key", 'k', "The iSCSI parameter key").Required(),
-    String("value", 'v', "The iSCSI parameter value"),
-    Flag("inherit", 'I', "Inheriting iSCSI parameter setting from parent."),
-    Flag("default", 'D', "Resetting iSCSI parameter setting to default."),
+    StringOption("key", 'k', "The iSCSI parameter key").Required(),
+    StringOption("value", 'v', "The iSCSI parameter value"),
+    FlagOption("inherit", 'I', "Inheriting iSCSI parameter setting from parent."),
+    FlagOption("default", 'D', "Resetting iSCSI parameter setting to default."),
 };
 
 }  // namespace
@@ -20,12 +20,22 @@ class AdapterTargetPortalParamSet : public CommandFrame<AdapterTargetPortalParam
   static constexpr Declaration kDeclaration{
       .description = "Set the iSCSI parameter for the iSCSI Target.",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override { SetParm(kTargetLevel, input, output); }
+  void ExecuteInternal(InputPtr input, OutputPtr output) override {
+    if (CountGiven(input, {"value", "inherit", "default"}) != 1) return output->ReportError(kOnlyOneMessage);
+    if (!KeyAndValueAreSound(input, output)) return;
+    WithAdapter(input, output, Reporting(kParmSetFailure), [&](iScsiInterface& adapter) {
+      const std::string name = input->GetString("name");
+      const std::string address = input->GetString("address");
+      const std::string key = input->GetString("key");
+      TargetPortalLevel level(adapter, {name, IscsiTools::GetTargetAddressFromString(address)});
+      SetInheritingParm(level, adapter.GetCapabilities(), key, input, output);
+    });
+  }
 };
 
 template NodePtr Make<AdapterTargetPortalParamSet>();

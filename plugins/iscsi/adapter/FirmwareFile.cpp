@@ -1,36 +1,32 @@
 #include "adapter/FirmwareFile.h"
 
 namespace TessaroCli::IscsiNamespace {
-namespace {
 
-IMA_OID FindPhysicalAdapter(const std::string& name) {
+WideText WidePath(const std::string& path) {
+  wchar_t* wide = nullptr;
+  CheckIma(IscsiTools::GetWideCharStringFromUtf8String(&wide, path.c_str()), "Filename conversion failed.");
+  return {wide, &std::free};
+}
+
+std::optional<IMA_OID> FindPhysicalAdapter(const std::string& name, const OutputPtr& output) {
   for (const IMA_OID& physical : ImaList("Unable to get physical adapter list.", IMA_GetPhbaOidList)) {
     static constexpr char kFailure[] = "Unable to get logical adapter list.";
     const ImaList logicals(kFailure, IMA_TSR_GetLhbaOidList, physical);
     if (IscsiUtil::FindLogicalAdapter(logicals, name, kFailure, IscsiUtil::kDeviceNameSize)) return physical;
   }
-  throw IscsiUtil::ImaFailure{"Invalid adapter provided."};
+  output->ReportError("Invalid adapter provided.");
+  return std::nullopt;
 }
 
-}  // namespace
+IMA_PHBA_DOWNLOAD_PROPERTIES ReadDownloadProperties(const IMA_OID& adapter) {
+  return ReadIma(IMA_GetPhbaDownloadProperties, adapter, "No download properties.");
+}
 
-IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES FirmwareFile::Image(const char* failure) const {
+IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES ReadImage(const IMA_OID& adapter, const WideText& path,
+                                             const char* failure) {
   IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES image{};
   CheckIma(IMA_IsPhbaDownloadFile(adapter, path.get(), &image), failure);
   return image;
-}
-
-void WithFirmwareFile(const InputPtr& input, const OutputPtr& output,
-                      const std::function<void(const FirmwareFile&)>& steps) {
-  ReportingImaFailures(*output, [&] {
-    wchar_t* path = nullptr;
-    CheckIma(IscsiTools::GetWideCharStringFromUtf8String(&path, input->GetString("file").c_str()),
-             "Filename conversion failed.");
-    FirmwareFile file{{}, WideText(path, &std::free), {}};
-    file.adapter = FindPhysicalAdapter(input->GetString("adapter"));
-    file.download = ReadIma(IMA_GetPhbaDownloadProperties, file.adapter, "No download properties.");
-    steps(file);
-  });
 }
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -1,8 +1,7 @@
-/// What the two firmware commands start with.
+/// What the two firmware commands share.
 #pragma once
 
 #include <cstdlib>
-#include <functional>
 #include <memory>
 
 #include "ImaWalk.h"
@@ -11,19 +10,15 @@ namespace TessaroCli::IscsiNamespace {
 
 using WideText = std::unique_ptr<wchar_t, decltype(&std::free)>;
 
-/// An image file, and the physical adapter that it is for.
-struct FirmwareFile {
-  IMA_OID adapter;
-  WideText path;
-  IMA_PHBA_DOWNLOAD_PROPERTIES download;
+// A failed call throws ImaFailure.
 
-  /// What the adapter says of the file. Throws ImaFailure with @p failure for one that it does not take.
-  IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES Image(const char* failure) const;
-};
-
-/// Finds the physical adapter behind the one that the user named, and runs @p steps on it and the file. A
-/// failed call is reported.
-void WithFirmwareFile(const InputPtr& input, const OutputPtr& output,
-                      const std::function<void(const FirmwareFile&)>& steps);
+/// The path of an image file as the management API takes it.
+WideText WidePath(const std::string& path);
+/// The physical adapter behind the logical adapter @p name. That there is none is reported.
+std::optional<IMA_OID> FindPhysicalAdapter(const std::string& name, const OutputPtr& output);
+IMA_PHBA_DOWNLOAD_PROPERTIES ReadDownloadProperties(const IMA_OID& adapter);
+/// What @p adapter says of the file @p path. @p failure is what is shown of a file that it does not take.
+IMA_PHBA_DOWNLOAD_IMAGE_PROPERTIES ReadImage(const IMA_OID& adapter, const WideText& path,
+                                             const char* failure);
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -4,17 +4,17 @@ namespace TessaroCli::IscsiNamespace {
 namespace {
 
 constexpr Column<ShownChap> kColumns[] = {
-    {"Sendtarget", [](const ShownChap& shown) { return shown.level.Address(); }},
+    {"Sendtarget", [](const ShownChap& shown) { return shown.place; }},
     kDirectionColumn,
     kNameColumn,
     kLevelColumn,
     kInheritanceColumn,
     kParentColumn,
 };
-constexpr Structure kChap = StructureOf<kColumns>("Sendtarget");
+constexpr auto kChap = StructureOf<kColumns>("Sendtarget");
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     SendTargetAddress(),
     ChapDirection("The iSCSI authentication direction. Options are:%ENUM%"),
 };
@@ -27,16 +27,30 @@ class AdapterDiscoverySendtargetAuthChapGet : public CommandFrame<AdapterDiscove
       .description = "Get iSCSI CHAP authentication on a sendtarget address",
       .type = kFetcher,
       .formatter = "simple",
-      .formatterParameters = {Setting("header:Sendtarget", "%Sendtarget%"), FieldsFrom(1, "fields")},
-      .parameters = kParameters,
-      .result = ListOf(kChap),
+      .formatterSettings = {Setting("header:Sendtarget", "%Sendtarget%"), FieldsFrom(1, kChap, "fields")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kChap); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ShowChap(kSendTargetLevel, kChap, NewRowOf<kChap, kColumns>, input, output);
+    constexpr char kFailure[] = "Failed to get iSCSI CHAP authentication configuration.";
+    WithAdapter(input, output, Reporting(kFailure), [&](iScsiInterface& adapter) {
+      const std::string text = input->GetString("address");
+      const std::string word = input->GetString("direction");
+      const TargetAddress address = IscsiTools::GetTargetAddressFromString(text);
+      const iScsiParms parms = adapter.GetSendTargetParms(address);
+      const auto direction = ChapDirectionFrom(word, output);
+      if (!direction) return;
+      iScsiChapParameters entry;
+      adapter.GetSendTargetChapParameters(address, entry, *direction);
+      const ListPtr list = NewList(GetListType());
+      list->Append(
+          NewRow(kChap, {IscsiTools::GetStringFromTargetAddress(address), *direction, entry, parms}));
+      Post(output, list);
+    });
   }
 };
 

@@ -3,15 +3,15 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     SendTargetAddress(),
     ChapDirection("The iSCSI authentication direction. Options are:%ENUM%"),
-    String("authname", 'N', "The iSCSI authentication name"),
-    String("secret", 'S', "The iSCSI authentication secret").Sensitive(),
+    StringOption("authname", 'N', "The iSCSI authentication name"),
+    StringOption("secret", 'S', "The iSCSI authentication secret").Sensitive(),
     ChapLevel("The iSCSI authentication level. Options are:%ENUM%"),
-    Flag("inherit", 'I', "Inheriting iSCSI authentication setting from parent."),
-    Flag("default", 'D', "Resetting iSCSI authentication setting to default."),
+    FlagOption("inherit", 'I', "Inheriting iSCSI authentication setting from parent."),
+    FlagOption("default", 'D', "Resetting iSCSI authentication setting to default."),
 };
 
 }  // namespace
@@ -21,13 +21,19 @@ class AdapterDiscoverySendtargetAuthChapSet : public CommandFrame<AdapterDiscove
   static constexpr Declaration kDeclaration{
       .description = "Set iSCSI CHAP authentication on a sendtarget address",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    SetChap(kSendTargetLevel, input, output);
+    constexpr char kFailure[] = "Failed to set CHAP authentication configuration.";
+    WithAdapter(input, output, Reporting(kFailure), [&](iScsiInterface& adapter) {
+      const std::string address = input->GetString("address");
+      const std::string word = input->GetString("direction");
+      SendTargetLevel level(adapter, IscsiTools::GetTargetAddressFromString(address));
+      SetInheritingChap(level, word, input, output);
+    });
   }
 };
 

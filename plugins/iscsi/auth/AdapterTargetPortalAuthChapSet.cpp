@@ -3,16 +3,16 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     TargetName(),
     PortalAddress(),
     ChapDirection("The iSCSI authentication direction. Options are:%ENUM%"),
-    String("authname", 'N', "The iSCSI authentication name"),
-    String("secret", 'S', "The iSCSI authentication password").Sensitive(),
+    StringOption("authname", 'N', "The iSCSI authentication name"),
+    StringOption("secret", 'S', "The iSCSI authentication password").Sensitive(),
     ChapLevel("The iSCSI authentication level. Options are:%ENUM%"),
-    Flag("inherit", 'I', "Inheriting iSCSI authentication setting from parent."),
-    Flag("default", 'D', "Resetting iSCSI authentication setting to default."),
+    FlagOption("inherit", 'I', "Inheriting iSCSI authentication setting from parent."),
+    FlagOption("default", 'D', "Resetting iSCSI authentication setting to default."),
 };
 
 }  // namespace
@@ -22,12 +22,21 @@ class AdapterTargetPortalAuthChapSet : public CommandFrame<AdapterTargetPortalAu
   static constexpr Declaration kDeclaration{
       .description = "Set the iSCSI CHAP authentication for the iSCSI Target.",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override { SetChap(kTargetLevel, input, output); }
+  void ExecuteInternal(InputPtr input, OutputPtr output) override {
+    constexpr char kFailure[] = "Unable to set CHAP authentication.";
+    WithAdapter(input, output, Reporting(kFailure), [&](iScsiInterface& adapter) {
+      const std::string name = input->GetString("name");
+      const std::string address = input->GetString("address");
+      const std::string word = input->GetString("direction");
+      TargetPortalLevel level(adapter, {name, IscsiTools::GetTargetAddressFromString(address)});
+      SetInheritingChap(level, word, input, output);
+    });
+  }
 };
 
 template NodePtr Make<AdapterTargetPortalAuthChapSet>();

@@ -1,37 +1,36 @@
+#include "UnregisteredCommands.h"
 #include "discovery/IsnsRules.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     IsnsAddress("The iSNS discovery address: <ip/dns>. Required only for static discovery method."),
     IsnsMethod(),
 };
 
 }  // namespace
 
-class __attribute__((visibility("default"))) AdapterDiscoveryIsnsAdd
-    : public CommandFrame<AdapterDiscoveryIsnsAdd> {
- public:
-  static constexpr Declaration kDeclaration{
-      .description = "Add iSNS discovery address",
-      .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
-  };
-
- private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    const auto server = ServerFrom(input, output, "Unable to add iSNS discovery address.");
-    if (!server) return;
-    WithIsnsAdapter(input, output, "Unable to add iSNS discovery address.", [&](iScsiInterface& adapter) {
-      adapter.AddIsnsConfig(*server);
-      PostSuccess(output);
-    });
-  }
+constexpr Declaration AdapterDiscoveryIsnsAdd::kDeclaration{
+    .description = "Add iSNS discovery address",
+    .type = kOperation,
+    .options = kOptions,
+    .result = SuccessResult(),
 };
 
-template __attribute__((visibility("default"))) NodePtr Make<AdapterDiscoveryIsnsAdd>();
+boost::shared_ptr<AdapterDiscoveryIsnsAdd> AdapterDiscoveryIsnsAdd::New() { return CommandFrame::New(); }
+
+void AdapterDiscoveryIsnsAdd::ExecuteInternal(InputPtr input, OutputPtr output) {
+  constexpr char kFailure[] = "Unable to add iSNS discovery address.";
+  const std::string method = input->GetString("method");
+  const std::string address = input->GetString("address");
+  const auto server = ServerNamed(method, address, kFailure, output);
+  if (!server) return;
+  WithAdapter(input, output, ReportingReasonThen(kFailure), [&](iScsiInterface& adapter) {
+    adapter.AddIsnsConfig(*server);
+    PostSuccess(output);
+  });
+}
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -1,4 +1,6 @@
 #include "AdapterWalk.h"
+#include "IscsiUtil/Refusal.h"
+#include "UnregisteredCommands.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
@@ -20,53 +22,50 @@ std::string MethodText(iSnsDiscoveryMethod method) {
     case iSnsDiscoveryMethod::Slp:
       return "slp";
   }
-  throw CoreCtl::Lib::CoreCtlException("Invalid isns discovery method", "plugins/iscsi/discovery", __LINE__,
-                                       NodeCtl::Lib::NoticeMessage());
+  IscsiUtil::Refuse("Invalid isns discovery method", "plugins/iscsi/discovery");
 }
 
 /// Only a static server has an address of its own.
-std::string AddressText(const iSnsConfig& config) {
+std::string OwnAddress(const iSnsConfig& config) {
   return config.method == iSnsDiscoveryMethod::Static ? config.address.GetStringAddress() : "";
 }
 
 constexpr Column<Server> kColumns[] = {
     {"Adapter", [](const Server& server) { return server.adapter; }},
     {"Method", [](const Server& server) { return MethodText(server.config.method); }},
-    {"iSNS", [](const Server& server) { return AddressText(server.config); }},
+    {"iSNS", [](const Server& server) { return OwnAddress(server.config); }},
 };
-constexpr Structure kServer = StructureOf<kColumns>("Isns");
+constexpr auto kServer = StructureOf<kColumns>("Isns");
 
-constexpr Parameter kParameters[] = {AdapterFilter()};
+constexpr Option kOptions[] = {AdapterFilter()};
 
 }  // namespace
 
-class __attribute__((visibility("default"))) AdapterDiscoveryIsnsList
-    : public CommandFrame<AdapterDiscoveryIsnsList> {
- public:
-  static constexpr Declaration kDeclaration{
-      .description = "List iSNS discovery addresses",
-      .type = kFetcher,
-      .formatter = "table",
-      .formatterParameters = {FieldsFrom(0, "fields")},
-      .parameters = kParameters,
-      .result = ListOf(kServer),
-  };
+constexpr Declaration AdapterDiscoveryIsnsList::kDeclaration{
+    .description = "List iSNS discovery addresses",
+    .type = kFetcher,
+    .formatter = "table",
+    .formatterSettings = {FieldsFrom(0, kServer, "fields")},
+    .options = kOptions,
+    .result = ListResult(),
+};
 
-  StructPtr GetListType() const { return NewPrototype(kServer); }
+boost::shared_ptr<AdapterDiscoveryIsnsList> AdapterDiscoveryIsnsList::New() { return CommandFrame::New(); }
 
- private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ListAdapters(input, output, {"Failed to list isns discovery addresses.", FailureReport::Reason::First},
-                 kServer, NothingPassedOver,
+StructPtr AdapterDiscoveryIsnsList::GetListType() const { return NewPrototype(kServer); }
+
+void AdapterDiscoveryIsnsList::ExecuteInternal(InputPtr input, OutputPtr output) {
+  constexpr FailureReport kReport = ReportingReasonThen("Failed to list isns discovery addresses.");
+  // Unlike the other listings, this one reports also what fails ahead of the walk.
+  Guarded(output, kReport, [&] {
+    ListAdapters(input, output, kReport, GetListType(), NothingPassedOver,
                  [](const ListedAdapter& listed, Plinth::MetaObj::MetaList& list) {
                    const OwnedVector<iSnsConfig> servers(listed.adapter.GetIsnsConfigs());
                    for (const iSnsConfig* server : servers) {
-                     list.Append(NewRow(kServer, kColumns, {listed.name, *server}));
+                     list.Append(NewRow(kServer, {listed.name, *server}));
                    }
                  });
-  }
-};
-
-template __attribute__((visibility("default"))) NodePtr Make<AdapterDiscoveryIsnsList>();
+  });
+}
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -1,3 +1,4 @@
+#include "UnregisteredCommands.h"
 #include "discovery/IsnsRules.h"
 
 namespace TessaroCli::IscsiNamespace {
@@ -5,37 +6,36 @@ namespace {
 
 constexpr char kFailure[] = "Failed to get iSNS parameter configuration.";
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     IsnsAddress("The iSNS discovery address: <ip/dns>. Required for only static discovery method."),
     IsnsMethod(),
 };
 
 }  // namespace
 
-class __attribute__((visibility("default"))) AdapterDiscoveryIsnsParamGet
-    : public CommandFrame<AdapterDiscoveryIsnsParamGet> {
- public:
-  static constexpr Declaration kDeclaration{
-      .description = "Get parameters on iSNS discovery address",
-      .type = kFetcher,
-      .formatter = "table",
-      .formatterParameters = {FieldsFrom(1, "fields")},
-      .parameters = kParameters,
-      .result = ListOf(kParm),
-  };
-
-  StructPtr GetOutputStructure() const { return IscsiTools::ParmStructure(); }
-
- private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    const auto server = ServerFrom(input, output, kFailure);
-    if (!server) return;
-    WithIsnsAdapter(input, output, kFailure,
-                    [&](iScsiInterface& adapter) { ShowIsnsParm(adapter.GetIsnsParms(*server), output); });
-  }
+constexpr Declaration AdapterDiscoveryIsnsParamGet::kDeclaration{
+    .description = "Get parameters on iSNS discovery address",
+    .type = kFetcher,
+    .formatter = "table",
+    .formatterSettings = {FieldsFrom(1, kParm, "fields")},
+    .options = kOptions,
+    .result = ListResult(),
 };
 
-template __attribute__((visibility("default"))) NodePtr Make<AdapterDiscoveryIsnsParamGet>();
+boost::shared_ptr<AdapterDiscoveryIsnsParamGet> AdapterDiscoveryIsnsParamGet::New() {
+  return CommandFrame::New();
+}
+
+StructPtr AdapterDiscoveryIsnsParamGet::GetOutputStructure() const { return IscsiTools::ParmStructure(); }
+
+void AdapterDiscoveryIsnsParamGet::ExecuteInternal(InputPtr input, OutputPtr output) {
+  const std::string method = input->GetString("method");
+  const std::string address = input->GetString("address");
+  const auto server = ServerNamed(method, address, kFailure, output);
+  if (!server) return;
+  WithAdapter(input, output, ReportingReasonThen(kFailure),
+              [&](iScsiInterface& adapter) { ShowIsnsParm(adapter.GetIsnsParms(*server), output); });
+}
 
 }  // namespace TessaroCli::IscsiNamespace

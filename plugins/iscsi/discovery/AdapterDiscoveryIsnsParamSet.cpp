@@ -1,50 +1,62 @@
+#include "UnregisteredCommands.h"
 #include "discovery/IsnsRules.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     IsnsAddress("The iSNS discovery address: <ip/dns>. Required only for static method."),
     IsnsMethod("The iSNS discovery method: <static/dhcp/slp>. Only static supported"),
-    String("key", 'k', "The iSNS parameter key").Required(),
-    String("value", 'v', "The iSNS parameter value"),
-    Flag("inherit", 'I', "Inheriting iSNS parameter setting from parent."),
-    Flag("default", 'D', "Resetting iSNS parameter setting to default."),
+    StringOption("key", 'k', "The iSNS parameter key").Required(),
+    StringOption("value", 'v', "The iSNS parameter value"),
+    FlagOption("inherit", 'I', "Inheriting iSNS parameter setting from parent."),
+    FlagOption("default", 'D', "Resetting iSNS parameter setting to default."),
 };
 
-constexpr IsnsPlace kServerPlace{
-    .inherits = true,
-    .failureText =
-        "Unable to set isns parameters. Please make sure parameter input is settable and within MAX/MIN "
-        "range (integer takes numbers, bool takes [true/false,yes/no,y/n]).",
-    .get = [](iScsiInterface& adapter, const iSnsConfig& server) { return adapter.GetIsnsParms(server); },
-    .set = [](iScsiInterface& adapter, const iSnsConfig& server, const iSnsParms& parms,
-              const OutputPtr&) { adapter.SetIsnsParms(server, parms); },
-};
+constexpr char kFailure[] =
+    "Unable to set isns parameters. Please make sure parameter input is settable and within MAX/MIN "
+    "range (integer takes numbers, bool takes [true/false,yes/no,y/n]).";
 
 }  // namespace
 
-class __attribute__((visibility("default"))) AdapterDiscoveryIsnsParamSet
-    : public CommandFrame<AdapterDiscoveryIsnsParamSet> {
- public:
-  static constexpr Declaration kDeclaration{
-      .description = "Set iSNS discovery parameters.",
-      .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
-  };
-
- private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    if (CountIsnsSources(input, kServerPlace.inherits) != 1) {
-      return output->ReportError("Only one options value, inherit, default can be used at once.");
-    }
-    const auto server = ServerFrom(input, output, "Unnable to set isns parameters.");
-    if (server) SetIsnsParm(kServerPlace, *server, input, output);
-  }
+constexpr Declaration AdapterDiscoveryIsnsParamSet::kDeclaration{
+    .description = "Set iSNS discovery parameters.",
+    .type = kOperation,
+    .options = kOptions,
+    .result = SuccessResult(),
 };
 
-template __attribute__((visibility("default"))) NodePtr Make<AdapterDiscoveryIsnsParamSet>();
+boost::shared_ptr<AdapterDiscoveryIsnsParamSet> AdapterDiscoveryIsnsParamSet::New() {
+  return CommandFrame::New();
+}
+
+void AdapterDiscoveryIsnsParamSet::ExecuteInternal(InputPtr input, OutputPtr output) {
+  const std::string method = input->GetString("method");
+  const std::string address = input->GetString("address");
+  if (CountGiven(input, {"value", "inherit", "default"}) != 1) return output->ReportError(kOnlyOneMessage);
+  const auto server = ServerNamed(method, address, "Unnable to set isns parameters.", output);
+  if (!server) return;
+  if (!KeyAndValueAreSound(input, output)) return;
+  WithAdapter(input, output, ReportingReasonThen(kFailure), [&](iScsiInterface& adapter) {
+    const std::string key = input->GetString("key");
+    iSnsParms parms = adapter.GetIsnsParms(*server);
+    if (!IscsiTools::IsIsnsParmSettable(key, parms)) return output->ReportError(NotSettableText(key));
+    if (input->HasParameter("value")) {
+      IscsiTools::IsnsParmSet(key, input->GetString("value"), parms);
+      adapter.SetIsnsParms(*server, parms);
+    } else if (input->HasParameter("inherit")) {
+      if (input->GetFlag("inherit")) {
+        IscsiTools::IsnsParmInherit(key, parms);
+        adapter.SetIsnsParms(*server, parms);
+      }
+    } else {
+      if (!input->GetFlag("default")) return output->ReportError(InvalidDefaultUseMessage);
+      IscsiTools::IsnsParmDefault(key, parms);
+      adapter.SetIsnsParms(*server, parms);
+    }
+    PostSuccess(output);
+  });
+}
 
 }  // namespace TessaroCli::IscsiNamespace

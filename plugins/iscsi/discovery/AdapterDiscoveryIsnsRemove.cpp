@@ -1,37 +1,38 @@
+#include "UnregisteredCommands.h"
 #include "discovery/IsnsRules.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     IsnsAddress("The iSCSI iSNS discovery address: <ip/dns>. Required only for static discovery method."),
     IsnsMethod(),
 };
 
 }  // namespace
 
-class __attribute__((visibility("default"))) AdapterDiscoveryIsnsRemove
-    : public CommandFrame<AdapterDiscoveryIsnsRemove> {
- public:
-  static constexpr Declaration kDeclaration{
-      .description = "Remove iSNS discovery address",
-      .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
-  };
-
- private:
-  void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    const auto server = ServerFrom(input, output, "Failed to remove iSNS discovery address..");
-    if (!server) return;
-    WithIsnsAdapter(input, output, "Unable to remove iSNS discovery address.", [&](iScsiInterface& adapter) {
-      adapter.RemoveIsnsConfig(*server);
-      PostSuccess(output);
-    });
-  }
+constexpr Declaration AdapterDiscoveryIsnsRemove::kDeclaration{
+    .description = "Remove iSNS discovery address",
+    .type = kOperation,
+    .options = kOptions,
+    .result = SuccessResult(),
 };
 
-template __attribute__((visibility("default"))) NodePtr Make<AdapterDiscoveryIsnsRemove>();
+boost::shared_ptr<AdapterDiscoveryIsnsRemove> AdapterDiscoveryIsnsRemove::New() {
+  return CommandFrame::New();
+}
+
+void AdapterDiscoveryIsnsRemove::ExecuteInternal(InputPtr input, OutputPtr output) {
+  const std::string method = input->GetString("method");
+  const std::string address = input->GetString("address");
+  const auto server = ServerNamed(method, address, "Failed to remove iSNS discovery address..", output);
+  if (!server) return;
+  WithAdapter(input, output, ReportingReasonThen("Unable to remove iSNS discovery address."),
+              [&](iScsiInterface& adapter) {
+                adapter.RemoveIsnsConfig(*server);
+                PostSuccess(output);
+              });
+}
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -3,7 +3,7 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {Adapter()};
+constexpr Option kOptions[] = {AdapterOption()};
 
 }  // namespace
 
@@ -13,13 +13,13 @@ class AdapterDiscoveryRediscover : public CommandFrame<AdapterDiscoveryRediscove
       .description = "Do the iSCSI Discovery for the iSCSI Host Bus Adapter.",
       .type = kOperation,
       .formatter = "simple",
-      .parameters = kParameters,
-      .result = Text("RediscoveryStatus"),
+      .options = kOptions,
+      .result = TextResult("RediscoveryStatus"),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithAdapter(input, output, {"Unable to discover targets."}, [&](iScsiInterface& adapter) {
+    WithAdapter(input, output, Reporting("Unable to discover targets."), [&](iScsiInterface& adapter) {
       adapter.Rediscover();
       PostText(output, "Rediscovery started");
     });

@@ -3,7 +3,7 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {Adapter(), ListedSendTarget()};
+constexpr Option kOptions[] = {AdapterOption(), ListedSendTarget()};
 
 }  // namespace
 
@@ -12,14 +12,19 @@ class AdapterDiscoverySendtargetAdd : public CommandFrame<AdapterDiscoverySendta
   static constexpr Declaration kDeclaration{
       .description = "Add a sendtarget address",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
     if (input->GetString("address").empty()) return output->ReportError(InvalidAddressMessage);
-    ChangeList(&iScsiInterface::AddSendTargetAddress, "Unable to add sendtarget address.", input, output);
+    WithAdapter(
+        input, output, ReportingReasonThen("Unable to add sendtarget address."),
+        [&](iScsiInterface& adapter) {
+          adapter.AddSendTargetAddress(IscsiTools::GetTargetAddressFromString(input->GetString("address")));
+          PostSuccess(output);
+        });
   }
 };
 

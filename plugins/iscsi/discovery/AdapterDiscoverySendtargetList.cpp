@@ -15,9 +15,9 @@ constexpr Column<Listed> kColumns[] = {
     {"Sendtarget",
      [](const Listed& listed) { return IscsiTools::GetStringFromTargetAddress(listed.address); }},
 };
-constexpr Structure kSendtarget = StructureOf<kColumns>("Sendtarget");
+constexpr auto kSendtarget = StructureOf<kColumns>("Sendtarget");
 
-constexpr Parameter kParameters[] = {AdapterFilter()};
+constexpr Option kOptions[] = {AdapterFilter()};
 
 }  // namespace
 
@@ -27,20 +27,20 @@ class AdapterDiscoverySendtargetList : public CommandFrame<AdapterDiscoverySendt
       .description = "List sendtarget addresses",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {FieldsFrom(0, "fields:Sendtarget")},
-      .parameters = kParameters,
-      .result = ListOf(kSendtarget),
+      .formatterSettings = {FieldsFrom(0, kSendtarget, "fields:Sendtarget")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kSendtarget); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ListAdapters(input, output, {"Failed to list sendtargets."}, kSendtarget, NothingPassedOver,
+    ListAdapters(input, output, Reporting("Failed to list sendtargets."), GetListType(), NothingPassedOver,
                  [](const ListedAdapter& listed, Plinth::MetaObj::MetaList& list) {
                    const OwnedVector<TargetAddress> addresses(listed.adapter.GetSendTargetAddresses());
                    for (const TargetAddress* address : addresses) {
-                     list.Append(NewRow(kSendtarget, kColumns, {listed.name, *address}));
+                     list.Append(NewRow(kSendtarget, {listed.name, *address}));
                    }
                  });
   }

@@ -3,13 +3,13 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     SendTargetAddress(),
-    String("key", 'k', "The iSCSI parameter key").Required(),
-    String("value", 'v', "The iSCSI parameter value"),
-    Flag("inherit", 'I', "Inheriting iSCSI parameter setting from parent."),
-    Flag("default", 'D', "Resetting iSCSI parameter setting to default."),
+    StringOption("key", 'k', "The iSCSI parameter key").Required(),
+    StringOption("value", 'v', "The iSCSI parameter value"),
+    FlagOption("inherit", 'I', "Inheriting iSCSI parameter setting from parent."),
+    FlagOption("default", 'D', "Resetting iSCSI parameter setting to default."),
 };
 
 }  // namespace
@@ -19,13 +19,20 @@ class AdapterDiscoverySendtargetParamSet : public CommandFrame<AdapterDiscoveryS
   static constexpr Declaration kDeclaration{
       .description = "Set the iSCSI parameter for the iSCSI Sendtarget.",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    SetParm(kSendTargetLevel, input, output);
+    if (CountGiven(input, {"value", "inherit", "default"}) != 1) return output->ReportError(kOnlyOneMessage);
+    if (!KeyAndValueAreSound(input, output)) return;
+    WithAdapter(input, output, Reporting(kParmSetFailure), [&](iScsiInterface& adapter) {
+      const std::string address = input->GetString("address");
+      const std::string key = input->GetString("key");
+      SendTargetLevel level(adapter, IscsiTools::GetTargetAddressFromString(address));
+      SetInheritingParm(level, adapter.GetCapabilities(), key, input, output);
+    });
   }
 };
 

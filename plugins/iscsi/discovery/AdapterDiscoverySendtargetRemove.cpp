@@ -3,7 +3,7 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {Adapter(), ListedSendTarget()};
+constexpr Option kOptions[] = {AdapterOption(), ListedSendTarget()};
 
 }  // namespace
 
@@ -12,13 +12,18 @@ class AdapterDiscoverySendtargetRemove : public CommandFrame<AdapterDiscoverySen
   static constexpr Declaration kDeclaration{
       .description = "Remove a sendtarget address",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ChangeList(&iScsiInterface::RemoveSendTargetAddress, "Failed to remove sendtarget.", input, output);
+    WithAdapter(input, output, ReportingReasonThen("Failed to remove sendtarget."),
+                [&](iScsiInterface& adapter) {
+                  adapter.RemoveSendTargetAddress(
+                      IscsiTools::GetTargetAddressFromString(input->GetString("address")));
+                  PostSuccess(output);
+                });
   }
 };
 

@@ -3,7 +3,7 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {Adapter(), ListedTargetName(), ListedTarget()};
+constexpr Option kOptions[] = {AdapterOption(), ListedTargetName(), ListedTarget()};
 
 }  // namespace
 
@@ -12,15 +12,20 @@ class AdapterDiscoveryStatictargetAdd : public CommandFrame<AdapterDiscoveryStat
   static constexpr Declaration kDeclaration{
       .description = "Add a static target address",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
     if (input->GetString("address").empty()) return output->ReportError(InvalidAddressMessage);
     if (input->GetString("name").empty()) return output->ReportError(InvalidNameMessage);
-    ChangeList(&iScsiInterface::AddStaticTarget, "Failed to add static target.", input, output);
+    WithAdapter(input, output, ReportingReasonThen("Failed to add static target."),
+                [&](iScsiInterface& adapter) {
+                  const auto address = IscsiTools::GetTargetAddressFromString(input->GetString("address"));
+                  adapter.AddStaticTarget({input->GetString("name"), address});
+                  PostSuccess(output);
+                });
   }
 };
 

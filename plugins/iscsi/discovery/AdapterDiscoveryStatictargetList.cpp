@@ -38,9 +38,9 @@ constexpr Column<Listed> kColumns[] = {
     {"TPGT", [](const Listed& listed) { return PortalGroupOf(listed); }},
     {"Boot", [](const Listed& listed) { return BootMarkOf(listed); }},
 };
-constexpr Structure kStatictarget = StructureOf<kColumns>("Statictarget");
+constexpr auto kStatictarget = StructureOf<kColumns>("Statictarget");
 
-constexpr Parameter kParameters[] = {AdapterFilter()};
+constexpr Option kOptions[] = {AdapterFilter()};
 
 constexpr char kListFailure[] = "Unable to get static target list.";
 constexpr char kPropertiesFailure[] = "Unable to get logical adapter properties.";
@@ -53,20 +53,20 @@ class AdapterDiscoveryStatictargetList : public CommandFrame<AdapterDiscoverySta
       .description = "List static target addresses",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {FieldsFrom(0, "fields:Statictarget")},
-      .parameters = kParameters,
-      .result = ListOf(kStatictarget),
+      .formatterSettings = {FieldsFrom(0, kStatictarget, "fields:Statictarget")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kStatictarget); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    PostImaList(output, kStatictarget, [&](Plinth::MetaObj::MetaList& list) {
-      ImaWalk(input, {}).Adapters([&](const ImaWalk::Adapter& adapter) {
+    PostImaList(output, GetListType(), [&](Plinth::MetaObj::MetaList& list) {
+      ImaWalk(input).Adapters([&](const ImaWalk::Adapter& adapter) {
         for (const IMA_OID& oid : ImaList(kListFailure, IMA_GetStaticDiscoveryTargetOidList, adapter.oid)) {
           const auto properties = ReadIma(IMA_GetStaticDiscoveryTargetProperties, oid, kPropertiesFailure);
-          list.Append(NewRow(kStatictarget, kColumns, {adapter, oid, properties}));
+          list.Append(NewRow(kStatictarget, {adapter, oid, properties}));
         }
       });
     });

@@ -3,7 +3,7 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {Adapter(), ListedTargetName(), ListedTarget()};
+constexpr Option kOptions[] = {AdapterOption(), ListedTargetName(), ListedTarget()};
 
 }  // namespace
 
@@ -12,13 +12,18 @@ class AdapterDiscoveryStatictargetRemove : public CommandFrame<AdapterDiscoveryS
   static constexpr Declaration kDeclaration{
       .description = "Remove a static target",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ChangeList(&iScsiInterface::RemoveStaticTarget, "Failed to remove static target.", input, output);
+    WithAdapter(input, output, ReportingReasonThen("Failed to remove static target."),
+                [&](iScsiInterface& adapter) {
+                  const auto address = IscsiTools::GetTargetAddressFromString(input->GetString("address"));
+                  adapter.RemoveStaticTarget({input->GetString("name"), address});
+                  PostSuccess(output);
+                });
   }
 };
 

@@ -3,7 +3,7 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {Adapter()};
+constexpr Option kOptions[] = {AdapterOption()};
 
 }  // namespace
 
@@ -13,13 +13,13 @@ class AdapterDiscoveryStatusGet : public CommandFrame<AdapterDiscoveryStatusGet>
       .description = "Get the iSCSI adapter discovery status for the iSCSI Host Bus Adapter.",
       .type = kFetcher,
       .formatter = "simple",
-      .parameters = kParameters,
-      .result = Text("DiscoveryStatus"),
+      .options = kOptions,
+      .result = TextResult("DiscoveryStatus"),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithAdapter(input, output, {"Unable to get discovery status."}, [&](iScsiInterface& adapter) {
+    WithAdapter(input, output, Reporting("Unable to get discovery status."), [&](iScsiInterface& adapter) {
       PostText(output, IscsiTools::GetStringFromDiscoveryStatus(adapter.GetDiscoveryStatus()));
     });
   }

@@ -5,32 +5,33 @@ namespace {
 
 using Table = NodeCtl::Storage::iScsiBootTable;
 
-template <auto getter>
-constexpr auto Member = [](const Table& table) { return (table.*getter)(); };
-
-constexpr Column<Table> kColumns[] = {
-    {"Target Name", Member<&Table::GetTargetName>},
-    {"Target IP", Member<&Table::GetTargetIP>},
-    {"Target Port", Member<&Table::GetTargetPort>},
-    {"Target Boot Flags", Member<&Table::GetTargetBootFlags>},
-    {"Lun", [](const Table& table) { return static_cast<long long>(table.GetLun()); }},
-    {"MAC Address", Member<&Table::GetMacAddress>},
-    {"IP Address", Member<&Table::GetNicIP>},
-    {"Subnet Mask", Member<&Table::GetNicSubnetMask>},
-    {"Gateway", Member<&Table::GetNicGateway>},
-    {"Dhcp", [](const Table& table) { return table.GetNicDhcp() != 0; }},
-    {"Vlan", Member<&Table::GetNicVlan>},
-    {"NIC Flags", Member<&Table::GetNicFlags>},
-    {"Chap Type", Member<&Table::GetChapType>},
-    {"Chap Name", Member<&Table::GetChapName>},
-    {"Mutual Chap Name", Member<&Table::GetReverseChapName>},
-    {"SLP Server IP", Member<&Table::GetSlpIP>},
-    {"Initiator Name", Member<&Table::GetInitiatorName>},
-    {"Initiator Alias", Member<&Table::GetInitiatorAlias>},
-    {"Initiator Boot Flags", Member<&Table::GetInitiatorBootFlags>},
-    {"Enabled", [](const Table& table) { return table.GetEnabled() != 0; }},
+struct Shown {
+  Table properties;
 };
-constexpr Structure kBoot = StructureOf<kColumns>("IbftBoot");
+
+constexpr Column<Shown> kColumns[] = {
+    {"Target Name", Property<&Table::GetTargetName>},
+    {"Target IP", Property<&Table::GetTargetIP>},
+    {"Target Port", Property<&Table::GetTargetPort>},
+    {"Target Boot Flags", Property<&Table::GetTargetBootFlags>},
+    {"Lun", Property<&Table::GetLun>},
+    {"MAC Address", Property<&Table::GetMacAddress>},
+    {"IP Address", Property<&Table::GetNicIP>},
+    {"Subnet Mask", Property<&Table::GetNicSubnetMask>},
+    {"Gateway", Property<&Table::GetNicGateway>},
+    {"Dhcp", IsSet<&Table::GetNicDhcp>},
+    {"Vlan", Property<&Table::GetNicVlan>},
+    {"NIC Flags", Property<&Table::GetNicFlags>},
+    {"Chap Type", Property<&Table::GetChapType>},
+    {"Chap Name", Property<&Table::GetChapName>},
+    {"Mutual Chap Name", Property<&Table::GetReverseChapName>},
+    {"SLP Server IP", Property<&Table::GetSlpIP>},
+    {"Initiator Name", Property<&Table::GetInitiatorName>},
+    {"Initiator Alias", Property<&Table::GetInitiatorAlias>},
+    {"Initiator Boot Flags", Property<&Table::GetInitiatorBootFlags>},
+    {"Enabled", IsSet<&Table::GetEnabled>},
+};
+constexpr auto kBoot = StructureOf<kColumns>("IbftBoot");
 
 }  // namespace
 
@@ -40,13 +41,13 @@ class IbftBootGet : public CommandFrame<IbftBootGet> {
       .description = "Get iSCSI IBFT Boot details.",
       .type = kFetcher,
       .formatter = "simple",
-      .formatterParameters = {Setting("header:IbftBoot", "%Target Name%"),
-                              Setting(
-                                  "fields",
-                                  "Target IP,Target Port,Lun,Target Boot Flags,MAC Address,IP Address,Subnet "
-                                  "Mask,Gateway,Dhcp,Vlan,NIC Flags,Chap Type,Chap Name,Mutual Chap Name,SLP "
-                                  "Server IP,Initiator Name,Initiator Alias,Initiator Boot Flags,Enabled")},
-      .result = ListOf(kBoot),
+      .formatterSettings = {Setting("header:IbftBoot", "%Target Name%"),
+                            Setting(
+                                "fields",
+                                "Target IP,Target Port,Lun,Target Boot Flags,MAC Address,IP Address,Subnet "
+                                "Mask,Gateway,Dhcp,Vlan,NIC Flags,Chap Type,Chap Name,Mutual Chap Name,SLP "
+                                "Server IP,Initiator Name,Initiator Alias,Initiator Boot Flags,Enabled")},
+      .result = ListResult(),
   };
 
   StructPtr GetOutputStructure() const { return NewPrototype(kBoot); }
@@ -54,9 +55,9 @@ class IbftBootGet : public CommandFrame<IbftBootGet> {
  private:
   void ExecuteInternal(InputPtr, OutputPtr output) override {
     CoreCtl::Storage::StorageInfoImpl storage;
-    const ListPtr list = NewList(kBoot);
-    Guarded(output, {"Unable to get boot tables."}, [&] {
-      list->Append(NewRow(kBoot, kColumns, storage.GetiScsiBootTables().GetPrimary()));
+    const ListPtr list = NewList(GetOutputStructure());
+    Guarded(output, Reporting("Unable to get boot tables."), [&] {
+      list->Append(NewRow(kBoot, {storage.GetiScsiBootTables().GetPrimary()}));
       Post(output, list);
     });
   }

@@ -9,13 +9,13 @@ class IbftBootImport : public CommandFrame<IbftBootImport> {
           "Import iSCSI target configuration from iBFT to Halden iSCSI initiators. The boot target "
           "recorded in iBFT is added to all the eligible 'dependent' iSCSI adapters.",
       .type = kOperation,
-      .result = Success(),
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr, OutputPtr output) override {
     CoreCtl::Storage::StorageInfoImpl storage;
-    Guarded(output, {"Unable to import IBFT Boot table."}, [&] {
+    Guarded(output, Reporting("Unable to import IBFT Boot table."), [&] {
       storage.MountiScsiBootLun(true, true);
       PostSuccess(output);
     });

@@ -21,8 +21,7 @@ struct Listed {
 };
 
 constexpr Column<Listed> kColumns[] = {
-    {"Supported Ima Version",
-     [](const Listed& listed) { return static_cast<long long>(listed.properties.supportedImaVersion); }},
+    {"Supported Ima Version", Property<&IMA_PLUGIN_PROPERTIES::supportedImaVersion>},
     {"Vendor", [](const Listed& listed) { return BytesOf(listed.properties.vendor); }},
     {"Implementation Version",
      [](const Listed& listed) { return BytesOf(listed.properties.implementationVersion); }},
@@ -33,14 +32,14 @@ constexpr Column<Listed> kColumns[] = {
     {"Lhbas Can Be Created And Destroyed",
      [](const Listed& listed) { return listed.properties.lhbasCanBeCreatedAndDestroyed == 1; }},
 };
-constexpr Structure kPlugin = StructureOf<kColumns>("iScsiPlugin");
+constexpr auto kPlugin = StructureOf<kColumns>("iScsiPlugin");
 
-constexpr Parameter kParameters[] = {
-    String("plugin", 'p', "The IMA plugin file name."),
+constexpr Option kOptions[] = {
+    StringOption("plugin", 'p', "The IMA plugin file name."),
     AdapterFilter(),
 };
 
-constexpr IscsiUtil::ImaFailure kNoMatch{"Unable to find matching plugin."};
+constexpr char kNoMatch[] = "Unable to find matching plugin.";
 
 }  // namespace
 
@@ -50,51 +49,48 @@ class PluginList : public CommandFrame<PluginList> {
       .description = "List IMA plugins.",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {Setting(
+      .formatterSettings = {Setting(
           "fields:iScsiPlugin", "File Name,Vendor,Supported Ima Version,Implementation Version,Build Time")},
-      .parameters = kParameters,
-      .result = ListOf(kPlugin),
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kPlugin); }
 
  private:
-  using List = Plinth::MetaObj::MetaList;
-
   /// Posts what was found even where a failure ended the search.
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
     const bool ofAdapter = input->HasParameter("adapter");
     if (ofAdapter && input->HasParameter("plugin")) {
       return output->ReportError("adapter and plugin options are mutually exclusive.");
     }
-    const ListPtr list = NewList(kPlugin);
+    const ListPtr list = NewList(GetListType());
     ReportingImaFailures(*output, [&] {
-      ofAdapter ? ExecuteInternalAdapter(*input, *list) : ExecuteInternalPlugin(*input, *list);
+      ofAdapter ? ExecuteInternalAdapter(input, output, list) : ExecuteInternalPlugin(input, output, list);
     });
     Post(output, list);
   }
 
-  static void ExecuteInternalPlugin(const Plinth::CallSpec::Input& input, List& list) {
-    const Filter filter(input, "plugin");
+  static void ExecuteInternalPlugin(const InputPtr& input, const OutputPtr& output, const ListPtr& list) {
     bool found = false;
     for (const IMA_OID& oid : ImaList("Unable to get plugin list.", IMA_GetPluginOidList)) {
       const auto properties = PropertiesOf(oid);
       const std::string fileName = BytesOf(properties.fileName);
-      if (!filter.Passes(fileName)) continue;
+      if (!Passes(*input, "plugin", fileName)) continue;
       ExecuteInternalAdd(list, properties, fileName);
       found = true;
-      if (input.HasParameter("plugin")) break;
+      if (input->HasParameter("plugin")) break;
     }
-    if (!found) throw kNoMatch;
+    if (!found) output->ReportError(kNoMatch);
   }
 
-  static void ExecuteInternalAdapter(const Plinth::CallSpec::Input& input, List& list) {
+  static void ExecuteInternalAdapter(const InputPtr& input, const OutputPtr& output, const ListPtr& list) {
     const ImaList adapters("Unable to get logical adapter list.", IMA_GetLhbaOidList);
     const auto adapter = FindIma(adapters, IMA_GetLhbaProperties, "Unable to get logical adapter properties.",
-                                 [name = input.GetString("adapter")](const IMA_LHBA_PROPERTIES& properties) {
+                                 [name = input->GetString("adapter")](const IMA_LHBA_PROPERTIES& properties) {
                                    return BytesOf(properties.osDeviceName) == name;
                                  });
-    if (!adapter) throw kNoMatch;
+    if (!adapter) return output->ReportError(kNoMatch);
     const auto properties =
         PropertiesOf(ReadIma(IMA_GetAssociatedPluginOid, *adapter, "Unable to get plugin identifier."));
     ExecuteInternalAdd(list, properties, BytesOf(properties.fileName));
@@ -104,9 +100,9 @@ class PluginList : public CommandFrame<PluginList> {
     return ReadIma(IMA_GetPluginProperties, oid, "Unable to get plugin properties.");
   }
 
-  static void ExecuteInternalAdd(List& list, const IMA_PLUGIN_PROPERTIES& properties,
+  static void ExecuteInternalAdd(const ListPtr& list, const IMA_PLUGIN_PROPERTIES& properties,
                                  const std::string& fileName) {
-    list.Append(NewRow(kPlugin, kColumns, {properties, fileName}));
+    list->Append(NewRow(kPlugin, {properties, fileName}));
   }
 };
 

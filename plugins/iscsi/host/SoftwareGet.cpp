@@ -8,13 +8,13 @@ class SoftwareGet : public CommandFrame<SoftwareGet> {
       .description = "Software iSCSI information.",
       .type = kFetcher,
       .formatter = "simple",
-      .result = Success(),
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr, OutputPtr output) override {
     CoreCtl::Storage::StorageInfoImpl storage;
-    Guarded(output, {"Unable to get Software iSCSI information."},
+    Guarded(output, Reporting("Unable to get Software iSCSI information."),
             [&] { Post(output, Plinth::MetaObj::MetaBool::New(storage.HasSoftwareiScsiEnabled())); });
   }
 };

@@ -5,11 +5,11 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Boolean("enabled", 'e', "Enable or disable the module.").Required(),
-    String("name", 'n',
-           "The iSCSI initiator name.\n"
-           "The initiator name must not be specified when disabling software iSCSI."),
+constexpr Option kOptions[] = {
+    BooleanOption("enabled", 'e', "Enable or disable the module.").Required(),
+    StringOption("name", 'n',
+                 "The iSCSI initiator name.\n"
+                 "The initiator name must not be specified when disabling software iSCSI."),
 };
 
 /// Stores the name that the host's iSCSI daemon will use.
@@ -29,8 +29,8 @@ class SoftwareSet : public CommandFrame<SoftwareSet> {
       .description = "Enable or disable software iSCSI.",
       .type = kOperation,
       .formatter = "simple",
-      .parameters = kParameters,
-      .result = Text("Status"),
+      .options = kOptions,
+      .result = TextResult("Status"),
   };
 
  private:

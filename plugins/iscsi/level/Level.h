@@ -1,8 +1,9 @@
-/// The three levels at which an adapter keeps session parameters and CHAP entries: its own, a sendtarget's
-/// and a target portal's. What differs between them stands here and in Level.cpp, nowhere else.
+/// The levels below an adapter's own: a sendtarget and a target portal, which keep session parameters and
+/// CHAP entries of their own and may inherit each of them from their parent.
 #pragma once
 
-#include <memory>
+#include <string>
+#include <utility>
 #include <vector>
 
 #include "CommandFrame.h"
@@ -14,72 +15,88 @@ using NodeCtl::Storage::iScsiChapDirection;
 using NodeCtl::Storage::iScsiChapParameters;
 using NodeCtl::Storage::iScsiDigestType;
 using NodeCtl::Storage::iScsiParms;
+using NodeCtl::Storage::StaticTarget;
+using NodeCtl::Storage::TargetAddress;
 
-enum class Digest { Header, Data };
-
-/// One place that has parameters and CHAP entries. Lives no longer than its adapter object. Every operation
-/// is one call of the library, but for the texts of a key.
-class Level {
+/// What the setting commands use of such a place. Lives no longer than its adapter object. Every operation is
+/// one call of the library; the status of a store is not looked at.
+class InheritingLevel {
  public:
-  Level() = default;
-  Level(const Level&) = delete;
-  Level& operator=(const Level&) = delete;
-  virtual ~Level() = default;
-
-  /// The text by which users know the place.
-  virtual std::string Id() = 0;
-  /// The parts of it: empty where the level has none.
-  virtual std::string TargetName() = 0;
-  virtual std::string Address() = 0;
+  InheritingLevel() = default;
+  InheritingLevel(const InheritingLevel&) = delete;
+  InheritingLevel& operator=(const InheritingLevel&) = delete;
+  virtual ~InheritingLevel() = default;
 
   virtual iScsiParms GetParms() = 0;
-  virtual iScsiInterface::iScsiStatus SetParms(const iScsiParms& parms) = 0;
-  virtual iScsiDigestType GetDigest(Digest digest) = 0;
-  virtual iScsiInterface::iScsiStatus SetDigest(Digest digest, iScsiDigestType value) = 0;
+  virtual void SetParms(const iScsiParms& parms) = 0;
+  virtual void SetHeaderDigest(iScsiDigestType digest) = 0;
+  virtual void SetDataDigest(iScsiDigestType digest) = 0;
   virtual iScsiChapParameters GetChap(iScsiChapDirection direction) = 0;
-  virtual void SetChap(const iScsiChapParameters& chap, iScsiChapDirection direction) = 0;
+  virtual void SetChap(const iScsiChapParameters& entry, iScsiChapDirection direction) = 0;
 };
 
-using LevelPtr = std::unique_ptr<Level>;
+class SendTargetLevel final : public InheritingLevel {
+ public:
+  SendTargetLevel(iScsiInterface& adapter, TargetAddress address)
+      : adapter_(adapter), address_(std::move(address)) {}
 
-/// How a level is addressed, and how the commands treat it.
-struct LevelKind {
-  /// The place that the options name.
-  LevelPtr (*find)(iScsiInterface& adapter, const Plinth::CallSpec::Input& input);
-  /// The places that the options of a reading command name.
-  std::vector<LevelPtr> (*select)(iScsiInterface& adapter, const Plinth::CallSpec::Input& input);
+  iScsiParms GetParms() override { return adapter_.GetSendTargetParms(address_); }
+  void SetParms(const iScsiParms& parms) override { adapter_.SetSendTargetParms(address_, parms); }
+  void SetHeaderDigest(iScsiDigestType digest) override {
+    adapter_.SetSendTargetHeaderDigest(address_, digest);
+  }
+  void SetDataDigest(iScsiDigestType digest) override { adapter_.SetSendTargetDataDigest(address_, digest); }
+  iScsiChapParameters GetChap(iScsiChapDirection direction) override {
+    iScsiChapParameters entry;
+    adapter_.GetSendTargetChapParameters(address_, entry, direction);
+    return entry;
+  }
+  void SetChap(const iScsiChapParameters& entry, iScsiChapDirection direction) override {
+    adapter_.SetSendTargetChapParameters(address_, entry, direction);
+  }
 
-  /// The level has a parent: marks, and the option `inherit`.
-  bool inherits;
-
-  // Parameters
-  bool iScsiCapabilities::*headerDigestSettable;
-  bool iScsiCapabilities::*dataDigestSettable;
-  const char* optionsMessage;  ///< not exactly one of the options that say what to set
-  bool digestFirst;            ///< a digest is stored ahead of the record, not behind it
-  bool statusShown;            ///< the status of a store is acted on
-
-  // CHAP
-  bool hasMethod;    ///< the reading command has the option `method`
-  bool recordFirst;  ///< the record is read ahead of the test of the direction
-  const char* chapGetFailure;
-  const char* chapSetFailure;
+ private:
+  iScsiInterface& adapter_;
+  const TargetAddress address_;
 };
 
-extern const LevelKind kAdapterLevel;
-extern const LevelKind kSendTargetLevel;
-extern const LevelKind kTargetLevel;
+class TargetPortalLevel final : public InheritingLevel {
+ public:
+  TargetPortalLevel(iScsiInterface& adapter, StaticTarget target)
+      : adapter_(adapter), target_(std::move(target)) {}
 
-// Parameters by which the commands of a level name its place
+  iScsiParms GetParms() override { return adapter_.GetTargetParms(target_); }
+  void SetParms(const iScsiParms& parms) override { adapter_.SetTargetParms(target_, parms); }
+  void SetHeaderDigest(iScsiDigestType digest) override { adapter_.SetTargetHeaderDigest(target_, digest); }
+  void SetDataDigest(iScsiDigestType digest) override { adapter_.SetTargetDataDigest(target_, digest); }
+  iScsiChapParameters GetChap(iScsiChapDirection direction) override {
+    iScsiChapParameters entry;
+    adapter_.GetTargetChapParameters(target_, entry, direction);
+    return entry;
+  }
+  void SetChap(const iScsiChapParameters& entry, iScsiChapDirection direction) override {
+    adapter_.SetTargetChapParameters(target_, entry, direction);
+  }
 
-constexpr Parameter SendTargetAddress() {
-  return String("address", 'a', "The iSCSI sendtarget address: <ip/dns[:port]>").Required();
+ private:
+  iScsiInterface& adapter_;
+  const StaticTarget target_;
+};
+
+/// All static targets of the adapter where both texts are the word "all"; otherwise the one that they name.
+std::vector<StaticTarget> TargetsNamed(iScsiInterface& adapter, const std::string& name,
+                                       const std::string& address);
+
+// Options by which the commands of a level name its place
+
+constexpr Option SendTargetAddress() {
+  return StringOption("address", 'a', "The iSCSI sendtarget address: <ip/dns[:port]>").Required();
 }
-constexpr Parameter TargetName() {
-  return String("name", 'n', "The iSCSI target name: <iqn/eui>").Required();
+constexpr Option TargetName() {
+  return StringOption("name", 'n', "The iSCSI target name: <iqn/eui>").Required();
 }
-constexpr Parameter PortalAddress() {
-  return String("address", 'a', "The iSCSI target address: <ip/dns[:port]>").Required();
+constexpr Option PortalAddress() {
+  return StringOption("address", 'a', "The iSCSI target address: <ip/dns[:port]>").Required();
 }
 
 }  // namespace TessaroCli::IscsiNamespace

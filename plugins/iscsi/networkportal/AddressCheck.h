@@ -12,7 +12,7 @@
 namespace TessaroCli::IscsiNamespace {
 
 /// What adding and removing say in different words. The adapter's name goes behind the first three.
-struct AddressTexts {
+struct AddressCheckTexts {
   const char* disabled;
   const char* linkLocal;
   const char* routerAdvertisement;
@@ -25,7 +25,8 @@ class AddressCheck {
   using NetworkProperties = NodeCtl::Storage::iScsiNetworkProperties;
 
   /// @p adapterName is for the texts. All arguments live as long as this object.
-  AddressCheck(const NetworkProperties& network, const std::string& adapterName, const AddressTexts& texts)
+  AddressCheck(const NetworkProperties& network, const std::string& adapterName,
+               const AddressCheckTexts& texts)
       : network_(network), adapterName_(adapterName), texts_(texts) {}
 
   /// Why the adapter takes no address at all; empty when it does.
@@ -40,13 +41,13 @@ class AddressCheck {
 
   const NetworkProperties& network_;
   const std::string& adapterName_;
-  const AddressTexts& texts_;
+  const AddressCheckTexts& texts_;
   NodeCtl::Network::IpConfig accepted_;
   bool linkLocalSeen_ = false;
   unsigned routableCount_ = 0;
 };
 
 /// The option, of which the help @p help tells what becomes of the addresses.
-constexpr Parameter AddressList(const char* help) { return StringList("address-list", 'a', help); }
+constexpr Option AddressList(const char* help) { return StringListOption("address-list", 'a', help); }
 
 }  // namespace TessaroCli::IscsiNamespace

@@ -11,17 +11,18 @@
 
 namespace TessaroCli::IscsiNamespace {
 
-class ChangeSequence;
-
-/// The changes of a row; false where it refuses to go on.
-using ChangeRow = bool (*)(const Plinth::CallSpec::Input& input, iScsiInterface& adapter,
-                           ChangeSequence& sequence);
-
 class ChangeSequence {
  public:
   using Status = iScsiInterface::iScsiStatus;
+  /// The changes of a row; false where it refuses to go on.
+  using Row = bool (*)(const Plinth::CallSpec::Input& input, iScsiInterface& adapter,
+                       ChangeSequence& sequence);
 
   ChangeSequence(iScsiInterface& adapter, const OutputPtr& output) : adapter_(adapter), output_(output) {}
+
+  /// Makes the changes of @p row and ends it. @p failureText stands in front of the library's reason where
+  /// the library fails. Only a whole row has a result.
+  void Run(Row row, const Plinth::CallSpec::Input& input, const char* failureText);
 
   /// Notes what the change that gave @p status asks for. @p option names it to the user and may be empty.
   void Note(const std::string& option, Status status) {
@@ -38,52 +39,31 @@ class ChangeSequence {
   }
 
  private:
-  friend void ChangeInSequence(const InputPtr&, const OutputPtr&, const char*, ChangeRow);
-
-  void Reset() {
+  void ResetIfRequired() {
     if (resetRequired_) adapter_.ResetAdapter();
   }
 
   iScsiInterface& adapter_;
   const OutputPtr& output_;
   std::stringstream reboots_;
-  bool resetRequired_ = false;  // stays set behind the reset: a reset that failed is tried again
+  bool resetRequired_ = false;  // for good: where the reset is what fails, it is tried once more
 };
 
-/// Runs @p changes on the adapter that the user named. @p failureText stands in front of the library's reason
-/// where the library fails. Only a whole row has a result.
-inline void ChangeInSequence(const InputPtr& input, const OutputPtr& output, const char* failureText,
-                             ChangeRow changes) {
-  const std::unique_ptr<iScsiInterface> adapter = FindAdapter(input, output);
-  if (!adapter) return;
-  ChangeSequence sequence(*adapter, output);
-  const bool succeeded = Guarded(output, {failureText, FailureReport::Reason::Last}, [&] {
-    const bool whole = changes(*input, *adapter, sequence);
-    sequence.Reset();
-    if (whole) PostText(output, sequence.reboots_.str());
-  });
-  if (succeeded) return;
-  try {
-    sequence.Reset();
-  } catch (const NodeCtl::Lib::NodeCtlException& failure) {
-    output->ReportError(failure.GetDescription(0));
-  }
-}
-
 /// What is declared of a command that makes such a row.
-constexpr Declaration ChangeDeclaration(const char* description, std::span<const Parameter> parameters) {
+constexpr Declaration ChangeDeclaration(const char* description, std::span<const Option> options) {
   return {.description = description,
           .type = kOperation,
           .formatter = "simple",
-          .parameters = parameters,
-          .result = Text("Status")};
+          .options = options,
+          .result = TextResult("Status")};
 }
 
 /// A command that makes the row Derived::kRow, and reports Derived::kFailureText where the library fails.
 template <class Derived>
 class ChangeCommand : public CommandFrame<Derived> {
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ChangeInSequence(input, output, Derived::kFailureText, Derived::kRow);
+    const auto adapter = FindAdapter(input, output);
+    if (adapter) ChangeSequence(*adapter, output).Run(Derived::kRow, *input, Derived::kFailureText);
   }
 };
 

@@ -1,4 +1,5 @@
 #include "AdapterWalk.h"
+#include "networkportal/MissingCall.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
@@ -20,9 +21,9 @@ constexpr Column<Portal> kColumns[] = {
     {"MAC Address Valid", [](const Portal& listed) { return listed.portal.mac.IsValid(); }},
     {"Compliant", [](const Portal& listed) { return listed.compliant; }},
 };
-constexpr Structure kPortal = StructureOf<kColumns>("LogicalNetworkPortal");
+constexpr auto kPortal = StructureOf<kColumns>("LogicalNetworkPortal");
 
-constexpr Parameter kParameters[] = {AdapterFilter()};
+constexpr Option kOptions[] = {AdapterFilter()};
 
 bool IsCompliant(iScsiInterface& adapter, const std::string& portal) {
   iScsiNicProperties nic;
@@ -40,23 +41,22 @@ class LogicalNetworkPortalList : public CommandFrame<LogicalNetworkPortalList> {
       .description = "List Logical Network Portals for iSCSI Adapter",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {FieldsFrom(0, "fields:LogicalNetworkPortal")},
-      .parameters = kParameters,
-      .result = ListOf(kPortal),
+      .formatterSettings = {FieldsFrom(0, kPortal, "fields:LogicalNetworkPortal")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetOutputStructure() const { return NewPrototype(kPortal); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ListAdapters(input, output, {"Failed to list logical network portals."}, kPortal,
-                 LacksCall<LnpListNotSupportedMessage>,
-                 [](const ListedAdapter& listed, Plinth::MetaObj::MetaList& list) {
+    ListAdapters(input, output, Reporting("Failed to list logical network portals."), GetOutputStructure(),
+                 LacksLnpList, [](const ListedAdapter& listed, Plinth::MetaObj::MetaList& list) {
                    std::vector<iScsiLnpProperties> portals;
                    listed.adapter.GetLogicalNetworkPortals(portals);
                    for (const iScsiLnpProperties& portal : portals) {
                      const bool compliant = IsCompliant(listed.adapter, portal.name);
-                     list.Append(NewRow(kPortal, kColumns, {listed.name, portal, compliant}));
+                     list.Append(NewRow(kPortal, {listed.name, portal, compliant}));
                    }
                  });
   }

@@ -3,11 +3,12 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     BoundHostnic(),
-    Boolean("force", 'f',
-            "The force flag (force add of iSCSI hostnic even it's not compatible for iscsi multipathing)"),
+    BooleanOption(
+        "force", 'f',
+        "The force flag (force add of iSCSI hostnic even it's not compatible for iscsi multipathing)"),
 };
 
 }  // namespace
@@ -17,15 +18,23 @@ class NetworkPortalAdd : public CommandFrame<NetworkPortalAdd> {
   static constexpr Declaration kDeclaration{
       .description = "Add a network portal for iSCSI adapter",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ChangeBinding(input, output,
-                  {&iScsiInterface::BindHostnic,
-                   {"Unable to bind iscsi port. [force = 0]\n", "Unable to bind iscsi port. [force = 1]\n"}});
+    if (input->GetString("nic").empty()) return output->ReportError(InvalidNetworkPortalInputMessage);
+    const auto adapter = FindAdapter(input, output);
+    if (!adapter) return;
+    bool force = false;
+    try {
+      if (input->HasParameter("force")) force = input->GetBool("force");
+      adapter->BindHostnic(input->GetString("nic"), force);
+      PostSuccess(output);
+    } catch (const NodeCtl::Lib::NodeCtlException&) {
+      output->ReportError("Unable to bind iscsi port. [force = " + std::to_string(force) + "]\n");
+    }
   }
 };
 

@@ -1,5 +1,5 @@
-#include "AdapterWalk.h"
 #include "networkportal/Ipv6Text.h"
+#include "networkportal/MissingCall.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
@@ -24,24 +24,22 @@ constexpr Column<Portal> kColumns[] = {
     {"PrimaryDNS", [](const Portal& portal) { return portal.network.primaryDns; }},
     {"SecondaryDNS", [](const Portal& portal) { return portal.network.secondaryDns; }},
 };
-constexpr Structure kPortal = StructureOf<kColumns>("NetworkPortal");
+constexpr auto kPortal = StructureOf<kColumns>("NetworkPortal");
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("nic", 'n', "The iSCSI network portal (hostnic)"),
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("nic", 'n', "The iSCSI network portal (hostnic)"),
 };
 
-/// The logical portal that the configuration is shown for: the one that the user named, whether or not it
-/// exists, else the adapter's first.
-std::string PortalName(const Plinth::CallSpec::Input& input, iScsiInterface& adapter) {
-  const std::string nic = input.GetString("nic");
-  const bool named = input.HasParameter("nic");
+/// The logical portal that the configuration is shown for: @p nic where the user @p named it, whether or not
+/// it exists, else the adapter's first.
+std::string PortalName(const std::string& nic, bool named, iScsiInterface& adapter) {
   try {
     std::vector<NodeCtl::Storage::iScsiLnpProperties> portals;
     adapter.GetLogicalNetworkPortals(portals);
     return named || portals.empty() ? nic : portals.front().name;
   } catch (const NodeCtl::Lib::NodeCtlException& failure) {
-    if (!LacksCall<LnpListNotSupportedMessage>(adapter, failure)) throw;
+    if (!LacksLnpList(adapter, failure)) throw;
     return "N/A";
   }
 }
@@ -53,23 +51,23 @@ class NetworkPortalIpconfigGet : public CommandFrame<NetworkPortalIpconfigGet> {
   static constexpr Declaration kDeclaration{
       .description = "Get iSCSI network portal ipv4 configuration",
       .formatter = "simple",
-      .formatterParameters = {Setting("header:NetworkPortal", "%IscsiAdapter%"),
-                              FieldsFrom(1, "fields:NetworkPortal")},
-      .parameters = kParameters,
-      .result = ListOf(kPortal),
+      .formatterSettings = {Setting("header:NetworkPortal", "%IscsiAdapter%"),
+                            FieldsFrom(1, kPortal, "fields:NetworkPortal")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kPortal); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithAdapter(input, output,
-                {"Failed to get IP configuration for network portal.", FailureReport::Reason::Last},
+    WithAdapter(input, output, ReportingThenReason("Failed to get IP configuration for network portal."),
                 [&](iScsiInterface& adapter) {
+                  const std::string nic = input->GetString("nic");
                   const auto network = adapter.GetNetworkProperties();
-                  const std::string name = PortalName(*input, adapter);
-                  const ListPtr list = NewList(kPortal);
-                  list->Append(NewRow(kPortal, kColumns, {input->GetString("adapter"), name, network}));
+                  const std::string name = PortalName(nic, input->HasParameter("nic"), adapter);
+                  const ListPtr list = NewList(GetListType());
+                  list->Append(NewRow(kPortal, {input->GetString("adapter"), name, network}));
                   Post(output, list);
                 });
   }

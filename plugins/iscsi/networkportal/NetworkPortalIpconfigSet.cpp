@@ -6,17 +6,17 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("nic", 'n', "The iSCSI network portal (hostnic)"),
-    Boolean("enable", 'e',
-            "Enable/Disable IPv4. All other options will be ignored if IPv4 is being disabled."),
-    String("ip", 'i', "The iSCSI network portal IPv4 address"),
-    String("subnet", 's', "The iSCSI network portal IPv4 subnet mask"),
-    String("gateway", 'g', "The iSCSI network portal IPv4 gateway address"),
-    String("dns1", 'x', "The iSCSI network portal primary DNS address"),
-    String("dns2", 'y', "The iSCSI network portal secondary DNS address"),
-    Boolean(
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("nic", 'n', "The iSCSI network portal (hostnic)"),
+    BooleanOption("enable", 'e',
+                  "Enable/Disable IPv4. All other options will be ignored if IPv4 is being disabled."),
+    StringOption("ip", 'i', "The iSCSI network portal IPv4 address"),
+    StringOption("subnet", 's', "The iSCSI network portal IPv4 subnet mask"),
+    StringOption("gateway", 'g', "The iSCSI network portal IPv4 gateway address"),
+    StringOption("dns1", 'x', "The iSCSI network portal primary DNS address"),
+    StringOption("dns2", 'y', "The iSCSI network portal secondary DNS address"),
+    BooleanOption(
         "enable-dhcpv4", 'd',
         "Enable/Disable IPv4 configuration using DHCPv4. If DHCPv4 is being enabled, static configuration "
         "parameters (ip,subnet,gateway,dns1,dns2) are ignored."),
@@ -48,7 +48,9 @@ bool SetIpv4(const Plinth::CallSpec::Input& input, iScsiInterface& adapter, Chan
     sequence.Note("gateway", adapter.SetIpv4Gateway(gateway));
   }
   if (given("dns1") || given("dns2")) {
-    sequence.Note("dns", adapter.SetDnsServers(input.GetString("dns1"), input.GetString("dns2")));
+    const std::string primary = input.GetString("dns1");
+    const std::string secondary = input.GetString("dns2");
+    sequence.Note("dns", adapter.SetDnsServers(primary, secondary));
   }
   return true;
 }
@@ -58,9 +60,9 @@ bool SetIpv4(const Plinth::CallSpec::Input& input, iScsiInterface& adapter, Chan
 class NetworkPortalIpconfigSet : public ChangeCommand<NetworkPortalIpconfigSet> {
  public:
   static constexpr Declaration kDeclaration =
-      ChangeDeclaration("Set iSCSI network portal IPv4 configuration.", kParameters);
+      ChangeDeclaration("Set iSCSI network portal IPv4 configuration.", kOptions);
   static constexpr char kFailureText[] = "Failed to set IP configuration on network portal.";
-  static constexpr ChangeRow kRow = SetIpv4;
+  static constexpr ChangeSequence::Row kRow = SetIpv4;
 };
 
 template NodePtr Make<NetworkPortalIpconfigSet>();

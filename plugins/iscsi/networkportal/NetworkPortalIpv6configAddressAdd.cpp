@@ -1,3 +1,4 @@
+#include "IscsiUtil/Refusal.h"
 #include "networkportal/AddressCheck.h"
 #include "networkportal/ChangeSequence.h"
 #include "networkportal/Ipv6Text.h"
@@ -7,18 +8,18 @@ namespace {
 
 using NodeCtl::Network::Ipv6Network;
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     AddressList("An IPv6 address to add in X:X:X::/X format. Multiple addresses can be provided using format "
                 "-a address1 -a address2 -a address3."),
-    Flag(
+    FlagOption(
         "remove-all-existing", 'r',
         "Remove all existing routable IPv6 addresses before adding the addresses specified by "
         "--address-list. If this flag is passed and --address-list is empty, all existing routable addresses "
         "are removed."),
 };
 
-constexpr AddressTexts kTexts{
+constexpr AddressCheckTexts kTexts{
     .disabled = "Cannot add/remove IPv6 address as IPv6 is disabled for adapter ",
     .linkLocal =
         "Cannot add link-local address as auto configuration of link-local address is enabled for "
@@ -37,9 +38,8 @@ void RemoveRoutable(const std::vector<Ipv6Network>& existing, iScsiInterface& ad
     const std::string address = network.GetAddress().GetStringAddress();
     const std::optional<bool> linkLocal = IsLinkLocal(address);
     if (!linkLocal) {
-      throw CoreCtl::Lib::CoreCtlException(
-          "Failed to remove the address. Invalid IPv6 address found: " + address,
-          "plugins/iscsi/networkportal", __LINE__, NodeCtl::Lib::NoticeMessage());
+      IscsiUtil::Refuse("Failed to remove the address. Invalid IPv6 address found: " + address,
+                        "plugins/iscsi/networkportal");
     }
     if (!*linkLocal) sequence.NoteUntilReset(adapter.SetIpv6Address(address, network.GetNetmask(), false));
   }
@@ -75,9 +75,9 @@ bool AddAddresses(const Plinth::CallSpec::Input& input, iScsiInterface& adapter,
 class NetworkPortalIpv6configAddressAdd : public ChangeCommand<NetworkPortalIpv6configAddressAdd> {
  public:
   static constexpr Declaration kDeclaration =
-      ChangeDeclaration("Add IPv6 addresses to the given iSCSI network portal.", kParameters);
+      ChangeDeclaration("Add IPv6 addresses to the given iSCSI network portal.", kOptions);
   static constexpr char kFailureText[] = "Error adding IPv6 address list on network portal";
-  static constexpr ChangeRow kRow = AddAddresses;
+  static constexpr ChangeSequence::Row kRow = AddAddresses;
 };
 
 template NodePtr Make<NetworkPortalIpv6configAddressAdd>();

@@ -23,9 +23,9 @@ constexpr Column<Ipv6Network> kColumns[] = {
     {"IPv6PrefixLength", [](const Ipv6Network& network) { return network.GetNetmask(); }},
     {"Type", [](const Ipv6Network& network) { return TypeText(network.GetIpv6AddressType()); }},
 };
-constexpr Structure kAddress = StructureOf<kColumns>("IPv6Address");
+constexpr auto kAddress = StructureOf<kColumns>("IPv6Address");
 
-constexpr Parameter kParameters[] = {Adapter()};
+constexpr Option kOptions[] = {AdapterOption()};
 
 }  // namespace
 
@@ -35,9 +35,9 @@ class NetworkPortalIpv6configAddressList : public CommandFrame<NetworkPortalIpv6
       .description = "List the IPv6 addresses assigned to the iSCSI network portal.",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {FieldsFrom(0, "fields:IPv6Address")},
-      .parameters = kParameters,
-      .result = ListOf(kAddress),
+      .formatterSettings = {FieldsFrom(0, kAddress, "fields:IPv6Address")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   /// Virtual in this class alone: it has a place in its virtual table, behind those that are inherited.
@@ -45,12 +45,12 @@ class NetworkPortalIpv6configAddressList : public CommandFrame<NetworkPortalIpv6
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithAdapter(input, output, {"Unable to list IPv6 Addresses.", FailureReport::Reason::Last},
+    WithAdapter(input, output, ReportingThenReason("Unable to list IPv6 Addresses."),
                 [&](iScsiInterface& adapter) {
-                  const ListPtr list = NewList(kAddress);
+                  const ListPtr list = NewList(GetOutputStructure());
                   const auto properties = adapter.GetNetworkProperties();
                   for (const Ipv6Network& network : properties.ipConfig.GetIpv6Network()) {
-                    list->Append(NewRow(kAddress, kColumns, network));
+                    list->Append(NewRow(kAddress, network));
                   }
                   Post(output, list);
                 });

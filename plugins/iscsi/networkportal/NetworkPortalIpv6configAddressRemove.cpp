@@ -6,15 +6,15 @@ namespace {
 
 using NodeCtl::Network::Ipv6Network;
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     AddressList(
         "An IPv6 address to remove in X:X:X::/X format. Multiple addresses can be provided using format "
         "-a address1 -a address2 -a address3.")
         .Required(),
 };
 
-constexpr AddressTexts kTexts{
+constexpr AddressCheckTexts kTexts{
     .disabled = "Cannot remove IPv6 address as IPv6 is disabled for adapter ",
     .linkLocal =
         "Cannot remove link-local address as auto configuration of link-local address is enabled for "
@@ -46,9 +46,9 @@ bool RemoveAddresses(const Plinth::CallSpec::Input& input, iScsiInterface& adapt
 class NetworkPortalIpv6configAddressRemove : public ChangeCommand<NetworkPortalIpv6configAddressRemove> {
  public:
   static constexpr Declaration kDeclaration =
-      ChangeDeclaration("Remove IPv6 addresses from the given iSCSI network portal.", kParameters);
+      ChangeDeclaration("Remove IPv6 addresses from the given iSCSI network portal.", kOptions);
   static constexpr char kFailureText[] = "Error removing IPv6 address on network portal.";
-  static constexpr ChangeRow kRow = RemoveAddresses;
+  static constexpr ChangeSequence::Row kRow = RemoveAddresses;
 };
 
 template NodePtr Make<NetworkPortalIpv6configAddressRemove>();

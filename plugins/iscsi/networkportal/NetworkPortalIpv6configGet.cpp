@@ -7,32 +7,29 @@ using NetworkProperties = NodeCtl::Storage::iScsiNetworkProperties;
 
 struct Portal {
   std::string adapter;
-  NetworkProperties network;
+  NetworkProperties properties;
 };
-
-template <auto NetworkProperties::*member>
-constexpr auto Member = [](const Portal& portal) { return portal.network.*member; };
 
 /// True where the number is stated at all.
 template <std::int32_t NetworkProperties::*member>
-constexpr auto IsStated = [](const Portal& portal) { return portal.network.*member != -1; };
+constexpr auto IsStated = [](const Portal& portal) { return portal.properties.*member != -1; };
 
 constexpr Column<Portal> kColumns[] = {
     {"IscsiAdapter", [](const Portal& portal) { return portal.adapter; }},
-    {"IPv6 Supported", Member<&NetworkProperties::ipv6Supported>},
-    {"IPv6 Enabled", Member<&NetworkProperties::ipv6Enabled>},
-    {"Gateway6", [](const Portal& portal) { return portal.network.gateway6.GetStringAddress(); }},
-    {"Use IPv6 Router Advertisement", Member<&NetworkProperties::useRouterAdvertisement>},
-    {"Use Link Local Auto Configuration", Member<&NetworkProperties::useLinkLocalAutoConfiguration>},
-    {"Use Dhcpv6", Member<&NetworkProperties::useDhcpv6>},
+    {"IPv6 Supported", Property<&NetworkProperties::ipv6Supported>},
+    {"IPv6 Enabled", Property<&NetworkProperties::ipv6Enabled>},
+    {"Gateway6", [](const Portal& portal) { return portal.properties.gateway6.GetStringAddress(); }},
+    {"Use IPv6 Router Advertisement", Property<&NetworkProperties::useRouterAdvertisement>},
+    {"Use Link Local Auto Configuration", Property<&NetworkProperties::useLinkLocalAutoConfiguration>},
+    {"Use Dhcpv6", Property<&NetworkProperties::useDhcpv6>},
     {"IPv6 Prefix Length Valid", IsStated<&NetworkProperties::ipv6PrefixLength>},
-    {"IPv6 Prefix Length", Member<&NetworkProperties::ipv6PrefixLength>},
+    {"IPv6 Prefix Length", Property<&NetworkProperties::ipv6PrefixLength>},
     {"IPv6 Max Static Address Supported Valid", IsStated<&NetworkProperties::ipv6MaxStaticAddresses>},
-    {"IPv6 Max Static Address Supported", Member<&NetworkProperties::ipv6MaxStaticAddresses>},
+    {"IPv6 Max Static Address Supported", Property<&NetworkProperties::ipv6MaxStaticAddresses>},
 };
-constexpr Structure kPortal = StructureOf<kColumns>("NetworkPortal");
+constexpr auto kPortal = StructureOf<kColumns>("NetworkPortal");
 
-constexpr Parameter kParameters[] = {Adapter()};
+constexpr Option kOptions[] = {AdapterOption()};
 
 }  // namespace
 
@@ -41,19 +38,18 @@ class NetworkPortalIpv6configGet : public CommandFrame<NetworkPortalIpv6configGe
   static constexpr Declaration kDeclaration{
       .description = "Get iSCSI network portal ipv6 configuration",
       .formatter = "simple",
-      .formatterParameters = {Setting("header:NetworkPortal", "%IscsiAdapter%"),
-                              FieldsFrom(1, "fields:NetworkPortal")},
-      .parameters = kParameters,
-      .result = One(kPortal),
+      .formatterSettings = {Setting("header:NetworkPortal", "%IscsiAdapter%"),
+                            FieldsFrom(1, kPortal, "fields:NetworkPortal")},
+      .options = kOptions,
+      .result = StructureResult(kPortal),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithAdapter(input, output,
-                {"Failed to get IP configuration for network portal.", FailureReport::Reason::Last},
+    WithAdapter(input, output, ReportingThenReason("Failed to get IP configuration for network portal."),
                 [&](iScsiInterface& adapter) {
                   const auto network = adapter.GetNetworkProperties();
-                  Post(output, NewRow(kPortal, kColumns, {input->GetString("adapter"), network}));
+                  Post(output, NewRow(kPortal, {input->GetString("adapter"), network}));
                 });
   }
 };

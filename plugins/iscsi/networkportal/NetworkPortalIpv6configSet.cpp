@@ -10,23 +10,23 @@ using NodeCtl::Storage::iScsiCapabilities;
 using Input = Plinth::CallSpec::Input;
 using Status = ChangeSequence::Status;
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    Boolean("enable", 'e', "Enable/Disable IPv6"),
-    String("gateway6", 'g', "The iSCSI network portal IPv6 gateway address"),
-    Boolean("enable-dhcpv6", 'd', "Enable/Disable IPv6 configuration using DHCPv6"),
-    Boolean("enable-linklocal-autoconfiguration", 'l',
-            "Enable/Disable auto configuration of linklocal address"),
-    Boolean("enable-router-advertisement", 'r',
-            "Enable/Disable IPv6 configuration using Router Advertisement"),
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    BooleanOption("enable", 'e', "Enable/Disable IPv6"),
+    StringOption("gateway6", 'g', "The iSCSI network portal IPv6 gateway address"),
+    BooleanOption("enable-dhcpv6", 'd', "Enable/Disable IPv6 configuration using DHCPv6"),
+    BooleanOption("enable-linklocal-autoconfiguration", 'l',
+                  "Enable/Disable auto configuration of linklocal address"),
+    BooleanOption("enable-router-advertisement", 'r',
+                  "Enable/Disable IPv6 configuration using Router Advertisement"),
 };
 
 /// One option: what the adapter must be able to set for it, and how it is set.
-struct Option {
+struct Change {
   const char* name;
   bool iScsiCapabilities::*settable;
   const char* refusal[2];  ///< what is said where it is not settable, around the adapter's name
-  const char* change;      ///< the name under which a reboot is asked for
+  const char* reported;    ///< the name under which a reboot is asked for
   Status (*set)(iScsiInterface& adapter, const Input& input, const char* name);
 };
 
@@ -36,7 +36,7 @@ Status SetMethod(iScsiInterface& adapter, const Input& input, const char* name) 
 }
 
 /// In the order in which they are handled.
-constexpr Option kOptions[] = {
+constexpr Change kChanges[] = {
     {"enable",
      &iScsiCapabilities::ipv6EnableSettable,
      {"Enabling/Disabling IPv6 is not supported by adapter ", ". This parameter is not settable."},
@@ -69,20 +69,20 @@ constexpr Option kOptions[] = {
 };
 
 bool SetIpv6(const Input& input, iScsiInterface& adapter, ChangeSequence& sequence) {
-  const auto given = [&](const Option& option) { return input.HasParameter(option.name); };
-  if (std::none_of(std::begin(kOptions), std::end(kOptions), given)) return true;
+  const auto given = [&](const Change& change) { return input.HasParameter(change.name); };
+  if (std::none_of(std::begin(kChanges), std::end(kChanges), given)) return true;
 
   const std::string adapterName = input.GetString("adapter");
   const iScsiCapabilities capabilities = adapter.GetCapabilities();
   if (!capabilities.ipv6Supported) {
     return sequence.Refuse("IPv6 is not supported by adapter " + adapterName + ".");
   }
-  for (const Option& option : kOptions) {
-    if (!given(option)) continue;
-    if (!(capabilities.*option.settable)) {
-      return sequence.Refuse(option.refusal[0] + adapterName + option.refusal[1]);
+  for (const Change& change : kChanges) {
+    if (!given(change)) continue;
+    if (!(capabilities.*change.settable)) {
+      return sequence.Refuse(change.refusal[0] + adapterName + change.refusal[1]);
     }
-    sequence.Note(option.change, option.set(adapter, input, option.name));
+    sequence.Note(change.reported, change.set(adapter, input, change.name));
   }
   return true;
 }
@@ -92,9 +92,9 @@ bool SetIpv6(const Input& input, iScsiInterface& adapter, ChangeSequence& sequen
 class NetworkPortalIpv6configSet : public ChangeCommand<NetworkPortalIpv6configSet> {
  public:
   static constexpr Declaration kDeclaration =
-      ChangeDeclaration("Set iSCSI network portal IPv6 configuration.", kParameters);
+      ChangeDeclaration("Set iSCSI network portal IPv6 configuration.", kOptions);
   static constexpr char kFailureText[] = "Failed to set IPv6 configuration on network portal.";
-  static constexpr ChangeRow kRow = SetIpv6;
+  static constexpr ChangeSequence::Row kRow = SetIpv6;
 };
 
 template NodePtr Make<NetworkPortalIpv6configSet>();

@@ -3,13 +3,11 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr char kFailure[] = "Unable to unbind iscsi port.";
-
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     BoundHostnic(),
-    Boolean("force", 'f',
-            "The force flag (force removal of iSCSI hostnic when sessions are active using it)"),
+    BooleanOption("force", 'f',
+                  "The force flag (force removal of iSCSI hostnic when sessions are active using it)"),
 };
 
 }  // namespace
@@ -19,13 +17,19 @@ class NetworkPortalRemove : public CommandFrame<NetworkPortalRemove> {
   static constexpr Declaration kDeclaration{
       .description = "Remove a network portal for iSCSI adapter",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ChangeBinding(input, output, {&iScsiInterface::UnbindHostnic, {kFailure, kFailure}});
+    if (input->GetString("nic").empty()) return output->ReportError(InvalidNetworkPortalInputMessage);
+    WithAdapter(input, output, Reporting("Unable to unbind iscsi port."), [&](iScsiInterface& adapter) {
+      bool force = false;
+      if (input->HasParameter("force")) force = input->GetBool("force");
+      adapter.UnbindHostnic(input->GetString("nic"), force);
+      PostSuccess(output);
+    });
   }
 };
 

@@ -7,23 +7,21 @@ using NodeCtl::Storage::iScsiPnpProperties;
 
 struct Portal {
   const std::string& adapter;
-  const iScsiPnpProperties& portal;
+  const iScsiPnpProperties& properties;
 };
 
 constexpr Column<Portal> kColumns[] = {
     {"Adapter", [](const Portal& listed) { return listed.adapter; }},
-    {"Phynic", [](const Portal& listed) { return listed.portal.name; }},
-    {"MAC Address", [](const Portal& listed) { return listed.portal.mac.GetStringAddress(); }},
-    {"MAC Address Valid", [](const Portal& listed) { return listed.portal.mac.IsValid(); }},
-    {"Current Speed",
-     [](const Portal& listed) { return static_cast<long long>(listed.portal.currentSpeed); }},
-    {"Max Speed", [](const Portal& listed) { return static_cast<long long>(listed.portal.maxSpeed); }},
-    {"Max Frame Size",
-     [](const Portal& listed) { return static_cast<long long>(listed.portal.maxFrameSize); }},
+    {"Phynic", Property<&iScsiPnpProperties::name>},
+    {"MAC Address", [](const Portal& listed) { return listed.properties.mac.GetStringAddress(); }},
+    {"MAC Address Valid", [](const Portal& listed) { return listed.properties.mac.IsValid(); }},
+    {"Current Speed", Property<&iScsiPnpProperties::currentSpeed>},
+    {"Max Speed", Property<&iScsiPnpProperties::maxSpeed>},
+    {"Max Frame Size", Property<&iScsiPnpProperties::maxFrameSize>},
 };
-constexpr Structure kPortal = StructureOf<kColumns>("PhysicalNetworkPortal");
+constexpr auto kPortal = StructureOf<kColumns>("PhysicalNetworkPortal");
 
-constexpr Parameter kParameters[] = {AdapterFilter()};
+constexpr Option kOptions[] = {AdapterFilter()};
 
 }  // namespace
 
@@ -33,21 +31,21 @@ class PhysicalNetworkPortalList : public CommandFrame<PhysicalNetworkPortalList>
       .description = "List Physical Network Portal for iSCSI Adapter",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {FieldsFrom(0, "fields:PhysicalNetworkPortal")},
-      .parameters = kParameters,
-      .result = ListOf(kPortal),
+      .formatterSettings = {FieldsFrom(0, kPortal, "fields:PhysicalNetworkPortal")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetOutputStructure() const { return NewPrototype(kPortal); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    ListAdapters(input, output, {"Failed to list physical network portals."}, kPortal, EverythingPassedOver,
-                 [](const ListedAdapter& listed, Plinth::MetaObj::MetaList& list) {
+    ListAdapters(input, output, Reporting("Failed to list physical network portals."), GetOutputStructure(),
+                 EverythingPassedOver, [](const ListedAdapter& listed, Plinth::MetaObj::MetaList& list) {
                    std::vector<iScsiPnpProperties> portals;
                    listed.adapter.GetPhysicalNetworkPortals(portals);
                    for (const iScsiPnpProperties& portal : portals) {
-                     list.Append(NewRow(kPortal, kColumns, {listed.name, portal}));
+                     list.Append(NewRow(kPortal, {listed.name, portal}));
                    }
                  });
   }

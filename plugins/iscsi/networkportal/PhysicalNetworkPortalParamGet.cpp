@@ -1,14 +1,14 @@
 #include "CommandFrame.h"
-#include "IscsiUtil/Parameters.h"
+#include "IscsiUtil/ParmRows.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
 using IscsiUtil::kNetParm;
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("nic", 'n', "The physical network portal name: <phynic>"),
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("nic", 'n', "The physical network portal name: <phynic>"),
 };
 
 }  // namespace
@@ -19,35 +19,36 @@ class PhysicalNetworkPortalParamGet : public CommandFrame<PhysicalNetworkPortalP
       .description = "Get network parameters on a Physical Network Portal (phynic)",
       .type = kFetcher,
       .formatter = "table",
-      .formatterParameters = {FieldsFrom(0, "fields:iScsiNetParm"),
-                              Setting("header:iScsiNetParam", "%Phynic%")},
-      .parameters = kParameters,
-      .result = ListOf(kNetParm),
+      .formatterSettings = {FieldsFrom(0, kNetParm, "fields:iScsiNetParm"),
+                            Setting("header:iScsiNetParam", "%Phynic%")},
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetOutputStructure() const { return IscsiTools::NetParmStructure(); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithAdapter(input, output, {"Failed to get parameters on physical network portal."},
-                [&](iScsiInterface& adapter) {
-                  std::vector<NodeCtl::Storage::iScsiPnpProperties> portals;
-                  adapter.GetPhysicalNetworkPortals(portals);
-                  if (adapter.IsSoftwareOrDependent()) {
-                    return output->ReportError(
-                        "Physical Network Portal parameter get is not supported on software or dependent "
-                        "hardware iSCSI adapter.");
-                  }
-                  // The parameters are the adapter's: the name is a label and selects nothing.
-                  std::string nic = input->GetString("nic");
-                  if (!input->HasParameter("nic") && !portals.empty()) nic = portals.front().name;
-                  const auto capabilities = adapter.GetCapabilities();
-                  const int mtu = adapter.GetMtu();
-                  const bool arpRedirect = adapter.GetArpRedirect();
-                  const ListPtr list = NewList(kNetParm);
-                  IscsiTools::NetParmFill(nic, list, capabilities, mtu, arpRedirect);
-                  Post(output, list);
-                });
+    const auto adapter = FindAdapter(input, output);
+    if (!adapter) return;
+    std::string nic = input->GetString("nic");
+    Guarded(output, Reporting("Failed to get parameters on physical network portal."), [&] {
+      std::vector<NodeCtl::Storage::iScsiPnpProperties> portals;
+      adapter->GetPhysicalNetworkPortals(portals);
+      if (adapter->IsSoftwareOrDependent()) {
+        return output->ReportError(
+            "Physical Network Portal parameter get is not supported on software or dependent hardware iSCSI "
+            "adapter.");
+      }
+      // The parameters are the adapter's: the name is a label and selects nothing.
+      if (!input->HasParameter("nic") && !portals.empty()) nic = portals.front().name;
+      const auto capabilities = adapter->GetCapabilities();
+      const int mtu = adapter->GetMtu();
+      const bool arpRedirect = adapter->GetArpRedirect();
+      const ListPtr list = NewList(GetOutputStructure());
+      IscsiTools::NetParmFill(nic, list, capabilities, mtu, arpRedirect);
+      Post(output, list);
+    });
   }
 };
 

@@ -5,28 +5,28 @@ namespace {
 
 using NodeCtl::Storage::iScsiCapabilities;
 
-struct Option {
+struct NetworkParm {
   const char* name;
   bool iScsiCapabilities::*settable;
   iScsiInterface::iScsiStatus (*set)(iScsiInterface& adapter, int value);
 };
 
-constexpr Option kOptions[] = {
+constexpr NetworkParm kParms[] = {
     {"MTU", &iScsiCapabilities::mtuSettable,
      [](iScsiInterface& adapter, int value) { return adapter.SetMtu(value); }},
     {"ArpRedirect", &iScsiCapabilities::arpRedirectSettable,
      [](iScsiInterface& adapter, int value) { return adapter.SetArpRedirect(value != 0); }},
 };
-constexpr const char* kOptionNames[] = {kOptions[0].name, kOptions[1].name};
+constexpr const char* kParmNames[] = {kParms[0].name, kParms[1].name};
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("nic", 'n', "The physical network portal name: <phynic>"),
-    String("option", 'o', "The network parameter option. Supported options are %ENUM%.")
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("nic", 'n', "The physical network portal name: <phynic>"),
+    StringOption("option", 'o', "The network parameter option. Supported options are %ENUM%.")
         .Required()
-        .OneOf(kOptionNames),
-    Integer("value", 'v',
-            "Input value for a Physical Network Portal option (use 0/1 for bool, and number for int)")
+        .OneOf(kParmNames),
+    IntegerOption("value", 'v',
+                  "Input value for a Physical Network Portal option (use 0/1 for bool, and number for int)")
         .Required(),
 };
 
@@ -37,13 +37,13 @@ class PhysicalNetworkPortalParamSet : public CommandFrame<PhysicalNetworkPortalP
   static constexpr Declaration kDeclaration{
       .description = "Set network parameter on a Physical Network Portal",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    WithAdapter(input, output, {"Failed to set parameter for physical network portal."},
+    WithAdapter(input, output, Reporting("Failed to set parameter for physical network portal."),
                 [&](iScsiInterface& adapter) {
                   const std::string name = input->GetString("option");
                   const int value = input->GetInt("value");
@@ -53,12 +53,12 @@ class PhysicalNetworkPortalParamSet : public CommandFrame<PhysicalNetworkPortalP
                         "hardware iSCSI adapter.");
                   }
                   const iScsiCapabilities capabilities = adapter.GetCapabilities();
-                  for (const Option& option : kOptions) {
-                    if (name != option.name) continue;
-                    if (!(capabilities.*option.settable)) {
+                  for (const NetworkParm& parm : kParms) {
+                    if (name != parm.name) continue;
+                    if (!(capabilities.*parm.settable)) {
                       return output->ReportError("Option " + name + " is not settable");
                     }
-                    IscsiTools::ProcessStatus(&adapter, option.set(adapter, value), output);
+                    IscsiTools::ProcessStatus(&adapter, parm.set(adapter, value), output);
                   }
                   PostSuccess(output);
                 });

@@ -3,8 +3,8 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
+constexpr Option kOptions[] = {
+    AdapterOption(),
     TargetFilter(),
     SessionIsid(),
 };
@@ -16,8 +16,8 @@ class SessionAdd : public CommandFrame<SessionAdd> {
   static constexpr Declaration kDeclaration{
       .description = "Login sessions on current iSCSI configuration.",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:

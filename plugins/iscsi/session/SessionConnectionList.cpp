@@ -1,10 +1,9 @@
-#include <CoreCtl/Exception.h>
-
 #include <cstdlib>
 #include <ctime>
 #include <iterator>
 
 #include "ImaWalk.h"
+#include "IscsiUtil/Refusal.h"
 
 namespace TessaroCli::IscsiNamespace {
 namespace {
@@ -24,15 +23,8 @@ constexpr const char* kStates[] = {"free",      "xpt_wait",  "xpt_up",          
                                    "logged_in", "in_logout", "logout_requested", "cleanup_wait"};
 
 std::string TimeText(const IMA_DATETIME& time) {
-  std::tm shown{};
-  shown.tm_year = time.tm_year;
-  shown.tm_mon = time.tm_mon;
-  shown.tm_mday = time.tm_mday;
-  shown.tm_hour = time.tm_hour;
-  shown.tm_min = time.tm_min;
-  shown.tm_sec = time.tm_sec;
   char text[64];
-  return std::strftime(text, sizeof text, "%D %T", &shown) == 0 ? kNotAvailable : text;
+  return std::strftime(text, sizeof text, "%D %T", &time) == 0 ? kNotAvailable : text;
 }
 
 template <auto present, auto address>
@@ -51,9 +43,7 @@ class SessionConnectionList : public CommandFrame<SessionConnectionList> {
   static const char* GetStringFromImaDigest(IMA_DIGEST_TYPE digest) {
     if (digest == IMA_DIGEST_NONE) return "NONE";
     if (digest == IMA_DIGEST_CRC32C) return "CRC32C";
-    throw CoreCtl::Lib::CoreCtlException("Invalid digest value",
-                                         "plugins/iscsi/session/SessionConnectionList", __LINE__,
-                                         NodeCtl::Lib::NoticeMessage());
+    IscsiUtil::Refuse("Invalid digest value", "plugins/iscsi/session/SessionConnectionList");
   }
 
   static constexpr Column<Listed> kColumns[] = {
@@ -65,17 +55,17 @@ class SessionConnectionList : public CommandFrame<SessionConnectionList> {
       {"Adapter", [](const Listed& listed) { return listed.session.target.adapter.name; }},
       {"Target", [](const Listed& listed) { return listed.session.target.name; }},
       {"ISID", [](const Listed& listed) { return listed.session.isid; }},
-      {"CID", Number<&Properties::connectionId>},
+      {"CID", Property<&Properties::connectionId>},
       {"DataDigest",
        [](const Listed& listed) { return GetStringFromImaDigest(listed.properties.dataDigest); }},
       {"HeaderDigest",
        [](const Listed& listed) { return GetStringFromImaDigest(listed.properties.headerDigest); }},
-      {"IFMarker", Is<&Properties::ifMarker>},
-      {"IFMarkerInterval", Number<&Properties::ifMarkerInterval>},
-      {"MaxRecvDataSegmentLength", Number<&Properties::maxRecvDataSegmentLength>},
-      {"MaxTransmitDataSegmentLength", Number<&Properties::maxTransmitDataSegmentLength>},
-      {"OFMarker", Is<&Properties::ofMarker>},
-      {"OFMarkerInterval", Number<&Properties::ofMarkerInterval>},
+      {"IFMarker", IsSet<&Properties::ifMarker>},
+      {"IFMarkerInterval", Property<&Properties::ifMarkerInterval>},
+      {"MaxRecvDataSegmentLength", Property<&Properties::maxRecvDataSegmentLength>},
+      {"MaxTransmitDataSegmentLength", Property<&Properties::maxTransmitDataSegmentLength>},
+      {"OFMarker", IsSet<&Properties::ofMarker>},
+      {"OFMarkerInterval", Property<&Properties::ofMarkerInterval>},
       {"ConnectionAddress", Address<&Status::connectionAddressPresent, &Status::connectionAddress>},
       {"RemoteAddress", Address<&Status::remoteAddressPresent, &Status::remoteAddress>},
       {"LocalAddress", Address<&Status::localAddressPresent, &Status::localAddress>},
@@ -87,18 +77,18 @@ class SessionConnectionList : public CommandFrame<SessionConnectionList> {
          return listed.status.state < std::size(kStates) ? kStates[listed.status.state] : "unknown";
        }},
   };
-  static constexpr Structure kConnection = StructureOf<kColumns>("Connection");
+  static constexpr auto kConnection = StructureOf<kColumns>("Connection");
 
-  static constexpr Parameter kParameters[] = {
+  static constexpr Option kOptions[] = {
       AdapterFilter(),
       TargetFilter(),
-      String("isid", 's', "The iSCSI session identifier(ISID)."),
-      String("cid", 'c', "The iSCSI connection identifier(CID)."),
+      StringOption("isid", 's', "The iSCSI session identifier(ISID)."),
+      StringOption("cid", 'c', "The iSCSI connection identifier(CID)."),
   };
 
-  static constexpr WalkTexts kTexts{
-      .sessionList = "Unable to get session list.",
-      .sessionProperties = "Unable to get logical adapter properties.",
+  static constexpr SessionTexts kTexts{
+      .list = "Unable to get session list.",
+      .properties = "Unable to get logical adapter properties.",
   };
 
  public:
@@ -106,36 +96,38 @@ class SessionConnectionList : public CommandFrame<SessionConnectionList> {
       .description = "List iSCSI connections.",
       .type = kFetcher,
       .formatter = "simple",
-      .formatterParameters =
+      .formatterSettings =
           {Setting("header:Connection", "%ID%"),
            Setting("fields:Connection",
                    "Adapter,Target,ISID,CID,DataDigest,HeaderDigest,IFMarker,IFMarkerInterval,"
                    "MaxRecvDataSegmentLength,MaxTransmitDataSegmentLength,OFMarker,OFMarkerInterval,"
                    "ConnectionAddress,RemoteAddress,LocalAddress,SessionCreateTime,ConnectionCreateTime,"
                    "ConnectionStartTime,State")},
-      .parameters = kParameters,
-      .result = ListOf(kConnection),
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kConnection); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    const bool limited = input->HasParameter("cid");
-    // A text without a number in it stands for 0.
-    const long cid = limited ? std::strtol(input->GetString("cid").c_str(), nullptr, 10) : 0;
-    PostImaList(output, kConnection, [&](auto& list) {
-      ImaWalk(input, kTexts).Sessions([&](const ImaWalk::Session& session) {
+    PostImaList(output, GetListType(), [&](auto& list) {
+      ImaWalk(input).Sessions(kTexts, [&](const ImaWalk::Session& session) {
         for (const IMA_OID& oid :
              ImaList("Unable to get connection list.", IMA_GetConnectionOidList, session.oid)) {
           const auto properties =
               ReadIma(IMA_GetConnectionProperties, oid, "Unable to get connection properties.");
-          if (limited && properties.connectionId != cid) continue;
+          if (!IsWanted(*input, properties.connectionId)) continue;
           const auto status = ReadIma(IMA_TSR_GetConnectionStatus, oid, "Unable to get connection status.");
-          list.Append(NewRow(kConnection, kColumns, {session, properties, status}));
+          list.Append(NewRow(kConnection, {session, properties, status}));
         }
       });
     });
+  }
+
+  /// Whether the option `cid`, where it was given, names the connection. A text without a number in it is 0.
+  static bool IsWanted(const Plinth::CallSpec::Input& input, IMA_UINT16 cid) {
+    return !input.HasParameter("cid") || std::strtol(input.GetString("cid").c_str(), nullptr, 10) == cid;
   }
 };
 

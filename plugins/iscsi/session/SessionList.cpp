@@ -30,32 +30,32 @@ constexpr Column<Session> kColumns[] = {
     {"Target", [](const Session& session) { return session.target.name; }},
     {"AuthenticationMethod",
      [](const Session& session) { return AuthenticationText(session.properties.authMethod); }},
-    {"DataPduInOrder", Is<&Properties::dataPduInOrder>},
-    {"DataSequenceInOrder", Is<&Properties::dataSequenceInOrder>},
-    {"DefaultTime2Retain", Number<&Properties::defaultTime2Retain>},
-    {"DefaultTime2Wait", Number<&Properties::defaultTime2Wait>},
-    {"ErrorRecoveryLevel", Number<&Properties::errorRecoveryLevel>},
+    {"DataPduInOrder", IsSet<&Properties::dataPduInOrder>},
+    {"DataSequenceInOrder", IsSet<&Properties::dataSequenceInOrder>},
+    {"DefaultTime2Retain", Property<&Properties::defaultTime2Retain>},
+    {"DefaultTime2Wait", Property<&Properties::defaultTime2Wait>},
+    {"ErrorRecoveryLevel", Property<&Properties::errorRecoveryLevel>},
     {"FirstBurstLength", [](const Session& session) { return FirstBurstLengthText(session.properties); }},
-    {"ImmediateData", Is<&Properties::immediateData>},
-    {"InitialR2T", Is<&Properties::initialR2T>},
+    {"ImmediateData", IsSet<&Properties::immediateData>},
+    {"InitialR2T", IsSet<&Properties::initialR2T>},
     {"ISID", [](const Session& session) { return session.isid; }},
-    {"MaxBurstLength", Number<&Properties::maxBurstLength>},
-    {"MaxConnections", Number<&Properties::maxConnections>},
-    {"MaxOutstandingR2T", Number<&Properties::maxOutstandingR2T>},
-    {"TargetPortalGroupTag", Number<&Properties::targetPortalGroupTag>},
-    {"TSIH", Number<&Properties::tsih>},
+    {"MaxBurstLength", Property<&Properties::maxBurstLength>},
+    {"MaxConnections", Property<&Properties::maxConnections>},
+    {"MaxOutstandingR2T", Property<&Properties::maxOutstandingR2T>},
+    {"TargetPortalGroupTag", Property<&Properties::targetPortalGroupTag>},
+    {"TSIH", Property<&Properties::tsih>},
 };
-constexpr Structure kSession = StructureOf<kColumns>("Session");
+constexpr auto kSession = StructureOf<kColumns>("Session");
 
-constexpr Parameter kParameters[] = {
+constexpr Option kOptions[] = {
     AdapterFilter(),
     TargetFilter(),
-    String("isid", 's', "The iSCSI session identifier."),
+    StringOption("isid", 's', "The iSCSI session identifier."),
 };
 
-constexpr WalkTexts kTexts{
-    .sessionList = "Unable to get target list.",
-    .sessionProperties = "Feature not supported by this adapters.",
+constexpr SessionTexts kTexts{
+    .list = "Unable to get target list.",
+    .properties = "Feature not supported by this adapters.",
 };
 
 }  // namespace
@@ -66,25 +66,24 @@ class SessionList : public CommandFrame<SessionList> {
       .description = "List iSCSI Sessions.",
       .type = kFetcher,
       .formatter = "simple",
-      .formatterParameters =
+      .formatterSettings =
           {Setting("header:Session", "%ID%"),
            Setting(
                "fields:Session",
                "Adapter,Target,ISID,TargetPortalGroupTag,AuthenticationMethod,DataPduInOrder,"
                "DataSequenceInOrder,DefaultTime2Retain,DefaultTime2Wait,ErrorRecoveryLevel,FirstBurstLength,"
                "ImmediateData,InitialR2T,MaxBurstLength,MaxConnections,MaxOutstandingR2T,TSIH")},
-      .parameters = kParameters,
-      .result = ListOf(kSession),
+      .options = kOptions,
+      .result = ListResult(),
   };
 
   StructPtr GetListType() const { return NewPrototype(kSession); }
 
  private:
   void ExecuteInternal(InputPtr input, OutputPtr output) override {
-    PostImaList(output, kSession, [&](auto& list) {
-      ImaWalk(input, kTexts).Sessions([&](const Session& session) {
-        list.Append(NewRow(kSession, kColumns, session));
-      });
+    PostImaList(output, GetListType(), [&](auto& list) {
+      ImaWalk(input).Sessions(kTexts,
+                              [&](const Session& session) { list.Append(NewRow(kSession, session)); });
     });
   }
 };

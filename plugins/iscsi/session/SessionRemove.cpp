@@ -3,9 +3,9 @@
 namespace TessaroCli::IscsiNamespace {
 namespace {
 
-constexpr Parameter kParameters[] = {
-    Adapter(),
-    String("name", 'n', "The name of the target to login to."),
+constexpr Option kOptions[] = {
+    AdapterOption(),
+    StringOption("name", 'n', "The name of the target to login to."),
     SessionIsid(),
 };
 
@@ -16,8 +16,8 @@ class SessionRemove : public CommandFrame<SessionRemove> {
   static constexpr Declaration kDeclaration{
       .description = "Logout sessions on current iSCSI configuration.",
       .type = kOperation,
-      .parameters = kParameters,
-      .result = Success(),
+      .options = kOptions,
+      .result = SuccessResult(),
   };
 
  private:

@@ -5,19 +5,24 @@ import difflib
 import json
 import os
 import pty
+import select
 import shlex
 import shutil
 import sqlite3
 import subprocess
 import sys
 import tempfile
+import termios
+import threading
+import time
 
 HCLI = os.environ["HCLI_BIN"]
 SOURCE = os.environ["HCLI_SOURCE_DIR"]
 NAME_FILE = "etc/tessaro/coreiscsid/initiatorname.iscsi"
 SET_NAME = "iscsi software set --enabled true --name iqn.2026-11.org.example:host"
-# Commands have texts of their own for what fails below them; the trace has the reason.
-READ, WRITE = "--trace iscsi adapter list", "--trace iscsi adapter set -A hba2 -a other"
+END = b"\0end of output\0"  # what no program writes
+# Commands have texts of their own for what fails below them; the reason stands behind those.
+READ, WRITE = "iscsi adapter list", "iscsi adapter set -A hba2 -a other"
 
 
 def check(holds, *shown):
@@ -88,16 +93,49 @@ def finished(process, text=None):
     return subprocess.CompletedProcess(process.args, process.returncode, out, err)
 
 
+def until_asleep(process):
+    """Waits until the process can do no more than wait itself, for input or for somebody to read."""
+    asleep = 0
+    while asleep < 10:
+        time.sleep(0.005)
+        asleep = asleep + 1 if state_of(process.pid) == "S" else 0
+
+
+def state_of(pid):
+    """One letter, such as R, S, T (stopped), Z (ended)."""
+    with open(f"/proc/{pid}/stat", encoding="utf-8") as file:
+        return file.read().rpartition(")")[2].split()[0]
+
+
+def read_until(terminal, text):
+    """What the terminal shows, up to and with `text`."""
+    shown = b""
+    while not shown.endswith(text.encode()):
+        ready, _, _ = select.select([terminal], [], [], 30)
+        check(ready, f"no {text!r} in", shown)
+        shown += os.read(terminal, 1)
+    return shown.decode()
+
+
+def complaints(done):
+    """What is on standard error, but for notes: those stand behind what went well too."""
+    return [line for line in done.stderr.splitlines() if not line.startswith("hcli: note: ")]
+
+
 def succeeded(done):
-    """The standard output of a command that has to work without a word on standard error."""
-    check(done.returncode == 0 and not done.stderr, done)
+    """The standard output of a command that has to work without a complaint."""
+    check(done.returncode == 0 and not complaints(done), done)
     return done.stdout
 
 
-def refused(case, done, *texts):
+# Of the codes of reasons, with --exit-codes.
+NOT_SUPPORTED, BUSY, DENIED, DAMAGED, NO_SPACE = 16, 20, 21, 22, 23
+
+
+def refused(case, done, *texts, status=1):
     """A report with these texts, and no result."""
     missing = [text for text in texts if text not in done.stderr]
-    check(done.returncode == 1 and not done.stdout and not missing, f"{case}: expected {missing}", done)
+    check(done.returncode == status and not done.stdout and not missing, f"{case}: expected {missing}", done)
 
 
 class Host:
@@ -125,22 +163,29 @@ class Host:
     def run(self, line, text="", **options):
         return finished(self.start(line, stdin=subprocess.PIPE, **options), text)
 
-    def on_terminal(self, line, answer=""):
-        """What a terminal shows, and the status. `answer` is typed once there is a question."""
+    def on_terminal(self, line, *answers, rows=0, **environment):
+        """What a terminal shows, and the status. Each of the `answers` is typed once there is a question. The terminal
+        has `rows` of 80 columns; without, it does not tell its size."""
         leader, follower = pty.openpty()
-        process = self.start(line, stdin=follower, stdout=follower, stderr=follower)
-        os.close(follower)
+        termios.tcsetwinsize(follower, (rows, 80 if rows else 0))
+        process = self.start(line, stdin=follower, stdout=follower, stderr=follower,
+                             env=self.environment(NO_COLOR="1", **environment))
+        # Linux may drop what is written to a terminal right before its last user closes it: the end is told in words.
+        ended = threading.Thread(target=lambda: (process.wait(), os.write(follower, END)), daemon=True)
+        ended.start()
         shown = b""
-        while answer and b": " not in shown:  # what is typed before the question would be echoed
-            shown += os.read(leader, 4096)
-        os.write(leader, answer.encode())
-        try:
-            while part := os.read(leader, 65536):
-                shown += part
-        except OSError:  # how Linux says that the last program has closed the terminal
-            pass
+        for number, answer in enumerate(answers, 1):
+            while shown.count(b": ") < number:  # what is typed before the question would be echoed
+                shown += os.read(leader, 4096)
+            os.write(leader, answer.encode() + b"\n")
+        while not shown.endswith(END):
+            ready, _, _ = select.select([leader], [], [], 60)
+            check(ready, line, shown)
+            shown += os.read(leader, 65536)
+        ended.join()
+        os.close(follower)
         os.close(leader)
-        return shown.replace(b"\r\n", b"\n"), process.wait(timeout=60)
+        return shown.removesuffix(END).replace(b"\r\n", b"\n"), process.returncode
 
     def succeed(self, line, text="", **options):
         return succeeded(self.run(line, text, **options))

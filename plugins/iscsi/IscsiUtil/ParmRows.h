@@ -1,13 +1,13 @@
 /// The shapes of the rows that show parameters.
 #pragma once
 
-#include "Declaration.h"
+#include "Rows.h"
 
 namespace IscsiUtil {
 
 /// ID, Name, Current, Default, Min, Max, Settable, Inherit.
-extern const TessaroCli::IscsiNamespace::Structure kParm;
+extern const TessaroCli::Structure kParm;
 /// Phynic, Option, Value, Settable.
-extern const TessaroCli::IscsiNamespace::Structure kNetParm;
+extern const TessaroCli::Structure kNetParm;
 
 }  // namespace IscsiUtil

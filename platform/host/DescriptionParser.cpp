@@ -1,0 +1,154 @@
+#include <algorithm>
+#include <cstdint>
+#include <iterator>
+#include <nlohmann/json.hpp>
+
+#include "host/DescriptionChecks.h"
+#include "host/DescriptionReader.h"
+#include "host/Error.h"
+
+namespace host {
+
+namespace {
+
+/// Moves with the copies of it that the parser makes, so that it can be told where the parser is.
+struct Cursor {
+  using iterator_category = std::input_iterator_tag;
+  using value_type = char;
+  using difference_type = std::ptrdiff_t;
+  using pointer = const char*;
+  using reference = const char&;
+
+  const char** at;
+  char operator*() const { return **at; }
+  Cursor& operator++() { return ++*at, *this; }
+  bool operator==(const Cursor& other) const { return *at == *other.at; }
+};
+
+/// Numbers beyond 63 bits come unsigned.
+Scalar Whole(std::uint64_t number) {
+  if (number > INT64_MAX) return static_cast<double>(number);
+  return static_cast<std::int64_t>(number);
+}
+
+Scalar ScalarOf(const Json& json) {
+  if (json.is_boolean()) return json.get<bool>();
+  if (json.is_number_unsigned()) return Whole(json.get<std::uint64_t>());
+  if (json.is_number_integer()) return json.get<std::int64_t>();
+  if (json.is_number()) return json.get<double>();
+  if (json.is_string()) return std::string_view(json.get_ref<const std::string&>());
+  return {};
+}
+
+/// Hands on what the parser reads, and where it stands.
+class Parser {
+ public:
+  using Text = Json::string_t;
+
+  Parser(const std::string& text, DescriptionReader& reader)
+      : reader_(reader), text_(text), at_(text.data()), before_(at_) {}
+
+  void Parse() {
+    const char* end = text_.data() + text_.size();
+    Json::sax_parse(Cursor{&at_}, Cursor{&end}, this);
+  }
+
+  bool null() { return Value({}); }
+  bool boolean(bool value) { return Value(value); }
+  bool number_integer(Json::number_integer_t value) { return Value(value); }
+  bool number_unsigned(Json::number_unsigned_t value) { return Value(Whole(value)); }
+  bool number_float(Json::number_float_t value, const Text&) { return Value(value); }
+  bool string(const Text& value) { return Value(std::string_view(value)); }
+  bool binary(const Json::binary_t&) { return false; }
+  bool start_object(std::size_t) {
+    return Do([&] { reader_.BeginObject(); });
+  }
+  bool key(const Text& name) {
+    return Do([&] { reader_.Name(name); });
+  }
+  bool end_object() {
+    return Do([&] { reader_.EndObject(); });
+  }
+  bool start_array(std::size_t) {
+    return Do([&] { reader_.BeginList(); });
+  }
+  bool end_array() {
+    return Do([&] { reader_.EndList(); });
+  }
+  bool parse_error(std::size_t, const Text&, const Json::exception& error) {
+    if (dynamic_cast<const Json::out_of_range*>(&error) != nullptr) {
+      Do([&] { reader_.Refuse("the number is too large"); });
+    }
+    // "[json.exception...] parse error at line 1, column 2: REASON; last read: 'TEXT'", and the text may hold
+    // a secret.
+    const std::string what = error.what();
+    const std::size_t begin = std::min(what.find("parse error"), what.size());
+    throw Error(Error::Kind::Invalid,
+                "not a JSON document: " + what.substr(begin, what.find("; last read: ") - begin));
+  }
+
+ private:
+  template <class Event>
+  bool Do(Event event) {
+    while (before_ < at_ && (*before_ <= ' ' || *before_ == ',' || *before_ == ':')) ++before_;
+    reader_.MoveTo(static_cast<std::size_t>(before_ - text_.data()));
+    event();
+    before_ = at_;
+    return true;
+  }
+  bool Value(const Scalar& value) {
+    return Do([&] { reader_.Value(value); });
+  }
+
+  DescriptionReader& reader_;
+  const std::string& text_;
+  const char* at_;      // how far the parser has read
+  const char* before_;  // how far it had with the event before; behind a number, one character more
+};
+
+/// Has @p reader read what stands in @p json.
+void Replay(const Json& json, DescriptionReader& reader) {
+  switch (json.type()) {
+    case Json::value_t::object:
+      reader.BeginObject();
+      for (const auto& [key, value] : json.get_ref<const Json::object_t&>()) {
+        reader.Name(key);
+        Replay(value, reader);
+      }
+      reader.EndObject();
+      break;
+    case Json::value_t::array:
+      reader.BeginList();
+      for (const Json& element : json) Replay(element, reader);
+      reader.EndList();
+      break;
+    default:
+      reader.Value(ScalarOf(json));
+  }
+}
+
+}  // namespace
+
+Description ReadDescription(const std::string& text) try {
+  DescriptionReader reader(Kind::Host);
+  Parser(text, reader).Parse();
+  Description description = reader.Take();
+  RequireBoundNics(description);
+  return description;
+} catch (const Fault& fault) {
+  const std::string_view ahead(text.data(), fault.offset);
+  const auto line = std::count(ahead.begin(), ahead.end(), '\n') + 1;
+  const std::size_t column = fault.offset - (ahead.rfind('\n') + 1) + 1;
+  throw Error(Error::Kind::Invalid,
+              fault.what() + (" (line " + std::to_string(line)) + ", column " + std::to_string(column) + ")");
+}
+
+Record Complete(Kind kind, const Record& given) try {
+  DescriptionReader reader(kind);
+  Replay(given.GetJson(), reader);
+  return std::move(reader.Take().front().record);
+} catch (const Fault& fault) {
+  throw Error(Error::Kind::Invalid, fault.what());
+}
+
+}  // namespace host

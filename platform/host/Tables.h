@@ -1,0 +1,15 @@
+/// The tables of a host's database, and the forms that they had in earlier versions of this program.
+#pragma once
+
+namespace host {
+
+class Store;
+
+/// The tables of a new database.
+void CreateTables(Store& store);
+
+/// Brings the database up to date, whole or not at all. An Error where it is not a host's, of a newer
+/// version, or damaged.
+void UpdateTables(Store& store);
+
+}  // namespace host

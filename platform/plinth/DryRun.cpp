@@ -1,0 +1,84 @@
+#include <Plinth/Rehearsal.h>
+
+#include <optional>
+#include <utility>
+#include <vector>
+
+#include "plinth/Run.h"
+
+namespace Plinth {
+
+namespace {
+
+std::vector<Rehearsal*>& Rehearsals() {
+  static std::vector<Rehearsal*> rehearsals;
+  return rehearsals;
+}
+
+/// While one lives, nothing that commands do lasts.
+class Rehearsing {
+ public:
+  Rehearsing() {
+    begun_.reserve(Rehearsals().size());
+    try {
+      for (Rehearsal* rehearsal : Rehearsals()) {
+        rehearsal->Begin();
+        begun_.push_back(rehearsal);
+      }
+    } catch (...) {
+      End();
+      throw;
+    }
+    isOn = true;
+  }
+  Rehearsing(const Rehearsing&) = delete;
+  Rehearsing& operator=(const Rehearsing&) = delete;
+  ~Rehearsing() {
+    isOn = false;
+    End();
+  }
+
+  static bool IsOn() { return isOn; }
+
+ private:
+  void End() {
+    for (Rehearsal* rehearsal : begun_) rehearsal->End();
+  }
+
+  static inline bool isOn = false;
+  std::vector<Rehearsal*> begun_;
+};
+
+std::vector<std::string> TakeCalls() {
+  std::vector<std::string> calls;
+  for (Rehearsal* rehearsal : Rehearsals()) {
+    for (std::string& call : rehearsal->TakeCalls()) calls.push_back(std::move(call));
+  }
+  return calls;
+}
+
+}  // namespace
+
+void AddRehearsal(Rehearsal& rehearsal) { Rehearsals().push_back(&rehearsal); }
+
+void CheckDryRun(Run&, const Given& given) {
+  if (!given.truth && Rehearsing::IsOn()) {
+    throw UsageError("option --dry-run: the whole batch is a dry run, and a line of it cannot be for real");
+  }
+  if (given.truth && Rehearsals().empty()) {
+    throw UsageError(
+        "option --dry-run: no plug-in that is loaded can undo what commands do; nothing was run");
+  }
+}
+
+void DryRun(Run& run, const Given& given, const Rest& rest) {
+  if (!given.truth) return rest();
+  // The lines of a batch that is rehearsed as a whole find it begun.
+  std::optional<Rehearsing> rehearsing;
+  if (!Rehearsing::IsOn()) rehearsing.emplace();
+  rest();
+  if (run.record.executed) run.calls = TakeCalls();
+  run.record.notes.clear();  // what they tell of is undone
+}
+
+}  // namespace Plinth

@@ -1,0 +1,55 @@
+/// A file that is read line by line, as it comes.
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <optional>
+#include <string>
+
+namespace Plinth {
+
+/// While this object lives, who reads standard input finds it at its end.
+class NoInput {
+ public:
+  NoInput();
+  NoInput(const NoInput&) = delete;
+  NoInput& operator=(const NoInput&) = delete;
+  ~NoInput();
+
+  /// The descriptor under which it can be read all the same; -1 where it is closed.
+  int Kept() const { return kept_; }
+
+ private:
+  int kept_;
+};
+
+class LineFile {
+ public:
+  /// "-" is standard input, which nobody else can read while this object lives. Throws UsageError where the
+  /// file cannot be opened.
+  explicit LineFile(const std::string& path);
+  LineFile(const LineFile&) = delete;
+  LineFile& operator=(const LineFile&) = delete;
+  ~LineFile();
+
+  /// As messages call it.
+  const std::string& Name() const { return name_; }
+  /// Reads the next line, without its newline; waits for no more than that. False at the end. Throws
+  /// std::runtime_error where it cannot be read.
+  bool Next(std::string& line);
+  /// The number of the line that was read last, from 1 on.
+  std::size_t Number() const { return number_; }
+
+ private:
+  bool Fill();
+
+  std::string name_;
+  std::optional<NoInput> input_;
+  int file_ = -1;
+  std::size_t number_ = 0;
+  std::array<char, 16384> buffer_;
+  std::size_t begin_ = 0;
+  std::size_t end_ = 0;
+};
+
+}  // namespace Plinth
