@@ -20,6 +20,9 @@ function(hcli_library name kind)
     set_target_properties(${name} PROPERTIES
       PREFIX "" LIBRARY_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/${HCLI_PLUGIN_FOLDER}")
     install(TARGETS ${name} LIBRARY DESTINATION ${HCLI_PLUGIN_FOLDER})
+    if(EXISTS "${CMAKE_CURRENT_SOURCE_DIR}/guide.yaml")
+      hcli_guide(${name})
+    endif()
   elseif(kind STREQUAL "SHARED")
     install(TARGETS ${name} LIBRARY DESTINATION lib)
   endif()
@@ -68,6 +71,14 @@ function(hcli_precompile)
   target_precompile_headers(hcli-precompiled PRIVATE
     <boost/enable_shared_from_this.hpp> <boost/shared_ptr.hpp> <algorithm> <cstdint> <functional> <map> <memory>
     <optional> <set> <stdexcept> <string> <string_view> <utility> <vector>)
+endfunction()
+
+# hcli_guide(NAME): the folder's guide.yaml, which help and completion read, as share/hcli/guides/NAME.yaml of both trees.
+function(hcli_guide name)
+  set(guides "${PROJECT_BINARY_DIR}/share/hcli/guides")
+  install(FILES guide.yaml DESTINATION share/hcli/guides RENAME ${name}.yaml)
+  file(MAKE_DIRECTORY "${guides}")
+  file(CREATE_LINK "${CMAKE_CURRENT_SOURCE_DIR}/guide.yaml" "${guides}/${name}.yaml" SYMBOLIC)
 endfunction()
 
 # hcli_share(FOLDER): data, in share/hcli of both trees. The build tree has a link, so that an edit needs no build.

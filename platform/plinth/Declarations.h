@@ -74,6 +74,8 @@ struct Child {
 /// What the framework keeps of a node of the tree.
 struct NodeData {
   std::string description;
+  /// Right under the root: the name of the plug-in's file without its ending. Empty for what no file brought.
+  std::string plugin;
   std::vector<Child> children;
   bool isCommand = false;
   /// Empty where the command names no formatter.

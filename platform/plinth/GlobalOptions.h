@@ -37,7 +37,7 @@ struct GlobalOption {
 /// All of them, in the order that help shows. Stages are entered in this order.
 std::span<const GlobalOption> GlobalOptions();
 /// The same as parameters.
-std::vector<Parameter> GlobalParameters();
+[[gnu::visibility("default")]] std::vector<Parameter> GlobalParameters();
 
 /// --fields: holds the fields that the user named against those that the command declares.
 void ChooseFields(Run& run, const Given& given);

@@ -75,9 +75,7 @@ std::string LoadFile(const std::string& path, const boost::shared_ptr<Namespace>
 
 std::string FindClash(const Namespace& root, const Namespace& scratch) {
   for (const Child& child : NodeData::Of(scratch).children) {
-    const bool reserved = std::any_of(std::begin(kOwnCommands), std::end(kOwnCommands),
-                                      [&](const OwnCommand& own) { return child.name == own.name; });
-    if (reserved || NodeData::FindChild(root, child.name)) {
+    if (IsOwnCommand(child.name) || NodeData::FindChild(root, child.name)) {
       return "the name " + Quoted(child.name) + " is taken";
     }
   }
@@ -95,6 +93,7 @@ std::string TakeIn(Namespace& root, const std::string& folder, const std::string
   if (trouble.empty()) trouble = FindClash(root, *scratch);
   if (!trouble.empty()) return "plug-in " + Quoted(path) + " is left out: " + Visible(trouble);
   for (const Child& child : NodeData::Of(*scratch).children) {
+    NodeData::Of(*child.node).plugin = name.substr(0, name.size() - 3);
     root.RegisterNamespaceNode(child.node, child.name);
   }
   return "";

@@ -23,6 +23,9 @@ struct OwnCommand {
 /// In the order in which they hang under the root. No plug-in gets one of these names.
 inline constexpr OwnCommand kOwnCommands[] = {{"catalogue", NewCatalogue}, {"completion", NewCompletion}};
 
+/// True for the name of a row of the table.
+bool IsOwnCommand(const std::string& name);
+
 /// Calls @p visit(path, node) for each node under @p node in order of registration, a namespace ahead of
 /// its children. @p path leads to @p node.
 template <class Visitor>

@@ -8,6 +8,7 @@
 #include "plinth/CommandLine.h"
 #include "plinth/Failure.h"
 #include "plinth/GlobalOptions.h"
+#include "plinth/Guide.h"
 #include "plinth/Options.h"
 
 namespace Plinth {
@@ -73,6 +74,8 @@ int RunProgram(const std::vector<std::string>& arguments, const std::string& fol
   ProcessConsole console;
   try {
     const Beginning beginning = BeginningOf(arguments);
+    // Beside the program's own plug-ins, wherever others lie: who runs the program trusts what lies there.
+    if (!folder.empty()) SetGuideFolder(folder + "/../../../share/hcli/guides");
     const char* given = beginning.folder ? beginning.folder->c_str() : getenv("HCLI_PLUGINS");
     const bool named = beginning.folder || (given && *given);
     // Kept as the tree is: a result of thousands of rows takes a tenth of the run to take apart.

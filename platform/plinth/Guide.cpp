@@ -1,0 +1,220 @@
+#include "plinth/Guide.h"
+
+#include <yaml.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <memory>
+#include <new>
+#include <string_view>
+
+#include "plinth/Declarations.h"
+#include "plinth/OwnCommands.h"
+#include "plinth/Text.h"
+
+namespace Plinth {
+
+namespace {
+
+class GuideReader {
+ public:
+  explicit GuideReader(const std::string& file) : file_(file) {
+    const std::unique_ptr<std::FILE, int (*)(std::FILE*)> stream(std::fopen(file.c_str(), "re"), std::fclose);
+    if (!stream) throw GuideError(file + ": " + std::strerror(errno));
+    yaml_parser_t parser;
+    if (!yaml_parser_initialize(&parser)) throw std::bad_alloc();
+    yaml_parser_set_input_file(&parser, stream.get());
+    isLoaded_ = yaml_parser_load(&parser, &document_) == 1;
+    const std::string problem = isLoaded_ ? "" : parser.problem ? parser.problem : "it cannot be read";
+    const std::size_t line = parser.problem_mark.line;
+    yaml_parser_delete(&parser);
+    if (!isLoaded_) Fail(line, problem);
+  }
+  GuideReader(const GuideReader&) = delete;
+  GuideReader& operator=(const GuideReader&) = delete;
+  ~GuideReader() {
+    if (isLoaded_) yaml_document_delete(&document_);
+  }
+
+  Guide Read() {
+    Guide guide;
+    const yaml_node_t* const top = yaml_document_get_root_node(&document_);
+    if (!top) return guide;
+    ForEachPair(*top, [&](const std::string& key, const yaml_node_t& value) {
+      if (key == "values") {
+        ForEachItem(value, [&](const yaml_node_t& item) { guide.values.push_back(ReadSource(item)); });
+      } else if (key == "commands") {
+        ForEachPair(value, [&](const std::string& path, const yaml_node_t& command) {
+          guide.examples[path] = ReadExamples(command);
+        });
+      } else if (key == "fields") {
+        ForEachPair(value, [&](const std::string& structure, const yaml_node_t& fields) {
+          ForEachPair(fields, [&](const std::string& field, const yaml_node_t& meaning) {
+            guide.fields[structure][field] = Text(meaning);
+          });
+        });
+      } else {
+        FailKey(value, key, "values, commands and fields");
+      }
+    });
+    return guide;
+  }
+
+ private:
+  [[noreturn]] void Fail(std::size_t line, const std::string& text) const {
+    throw GuideError(file_ + ':' + std::to_string(line + 1) + ": " + text);
+  }
+  [[noreturn]] void Fail(const yaml_node_t& node, const std::string& text) const {
+    Fail(node.start_mark.line, text);
+  }
+  [[noreturn]] void FailKey(const yaml_node_t& node, const std::string& key, const char* right) const {
+    Fail(node, "there is no key " + Quoted(key) + " here; there are " + right);
+  }
+
+  std::string Text(const yaml_node_t& node) const {
+    if (node.type != YAML_SCALAR_NODE || node.data.scalar.length == 0) Fail(node, "a text has to stand here");
+    return {reinterpret_cast<const char*>(node.data.scalar.value), node.data.scalar.length};
+  }
+
+  template <class Visitor>
+  void ForEachItem(const yaml_node_t& node, Visitor visit) {
+    if (node.type != YAML_SEQUENCE_NODE) Fail(node, "a list has to stand here");
+    for (const auto* item = node.data.sequence.items.start; item != node.data.sequence.items.top; ++item) {
+      visit(*yaml_document_get_node(&document_, *item));
+    }
+  }
+
+  /// The library lets a key stand twice.
+  template <class Visitor>
+  void ForEachPair(const yaml_node_t& node, Visitor visit) {
+    if (node.type != YAML_MAPPING_NODE) Fail(node, "names with values have to stand here");
+    std::map<std::string, bool> seen;
+    for (const auto* pair = node.data.mapping.pairs.start; pair != node.data.mapping.pairs.top; ++pair) {
+      const yaml_node_t& keyNode = *yaml_document_get_node(&document_, pair->key);
+      const std::string key = Text(keyNode);
+      if (!seen.emplace(key, true).second) Fail(keyNode, Quoted(key) + " stands here twice");
+      visit(key, *yaml_document_get_node(&document_, pair->value));
+    }
+  }
+
+  ValueSource ReadSource(const yaml_node_t& node) {
+    ValueSource source;
+    ForEachPair(node, [&](const std::string& key, const yaml_node_t& value) {
+      if (key == "option") {
+        source.option = Text(value);
+      } else if (key == "of") {
+        source.of = Text(value);
+      } else if (key == "from") {
+        source.from = Text(value);
+      } else if (key == "field") {
+        source.field = Text(value);
+      } else if (key == "about") {
+        source.about = Text(value);
+      } else if (key == "with") {
+        ForEachItem(value, [&](const yaml_node_t& option) { source.with.push_back(Text(option)); });
+      } else if (key == "kind") {
+        source.kind = ReadKind(value);
+      } else {
+        FailKey(value, key, "option, of, from, field, about, with and kind");
+      }
+    });
+    const bool isShown = source.kind == ValueSource::Kind::Shown;
+    if (source.option.empty()) Fail(node, "the key option is missing");
+    if (isShown == source.from.empty() || isShown == source.field.empty()) {
+      Fail(node, "either from and field, or kind, has to stand here");
+    }
+    return source;
+  }
+
+  ValueSource::Kind ReadKind(const yaml_node_t& node) const {
+    const std::string kind = Text(node);
+    if (kind == "file") return ValueSource::Kind::File;
+    if (kind == "folder") return ValueSource::Kind::Folder;
+    Fail(node, "the kind " + Quoted(kind) + " is none; there are file and folder");
+  }
+
+  std::vector<Example> ReadExamples(const yaml_node_t& node) {
+    std::vector<Example> examples;
+    ForEachPair(node, [&](const std::string& key, const yaml_node_t& list) {
+      if (key != "examples") FailKey(list, key, "examples");
+      ForEachItem(list, [&](const yaml_node_t& item) {
+        Example& example = examples.emplace_back();
+        ForEachPair(item, [&](const std::string& name, const yaml_node_t& text) {
+          if (name != "about" && name != "line") FailKey(text, name, "about and line");
+          (name == "about" ? example.about : example.line) = Text(text);
+        });
+        if (example.about.empty() || example.line.empty()) Fail(item, "an example has about and line");
+      });
+    });
+    return examples;
+  }
+
+  std::string file_;
+  yaml_document_t document_{};
+  bool isLoaded_ = false;
+};
+
+std::string& GuideFolder() {
+  static std::string folder;
+  return folder;
+}
+
+/// True where @p path is @p place, or stands in it.
+bool IsWithin(const std::string& path, const std::string& place) {
+  return place.empty() || path == place || path.starts_with(place + ' ');
+}
+
+}  // namespace
+
+const ValueSource* Guide::FindValues(const std::string& path, const std::string& option) const {
+  const ValueSource* nearest = nullptr;
+  for (const ValueSource& source : values) {
+    if (source.option != option || !IsWithin(path, source.of)) continue;
+    if (!nearest || source.of.size() > nearest->of.size()) nearest = &source;
+  }
+  return nearest;
+}
+
+const std::vector<Example>& Guide::ExamplesOf(const std::string& path) const {
+  static const std::vector<Example> none;
+  const auto found = examples.find(path);
+  return found == examples.end() ? none : found->second;
+}
+
+const std::string& Guide::MeaningOf(const std::string& structure, const std::string& field) const {
+  static const std::string none;
+  const auto meanings = fields.find(structure);
+  if (meanings == fields.end()) return none;
+  const auto meaning = meanings->second.find(field);
+  return meaning == meanings->second.end() ? none : meaning->second;
+}
+
+Guide ReadGuide(const std::string& file) { return GuideReader(file).Read(); }
+
+void SetGuideFolder(const std::string& folder) { GuideFolder() = folder; }
+
+std::string GuideFile(const AutoCli::NamespaceNode& root, const std::string& path) {
+  const std::string word = path.substr(0, path.find(' '));
+  const AutoCli::NamespaceNode* const top = AutoCli::NodeData::FindChild(root, word);
+  const std::string name = IsOwnCommand(word) || path.empty() ? "hcli"
+                           : top                              ? AutoCli::NodeData::Of(*top).plugin
+                                                              : "";
+  return GuideFolder().empty() || name.empty() ? "" : GuideFolder() + '/' + name + ".yaml";
+}
+
+const Guide& GuideTo(const AutoCli::NamespaceNode& root, const std::string& path) {
+  static std::map<std::string, Guide> guides;
+  const std::string file = GuideFile(root, path);
+  const auto [known, isNew] = guides.try_emplace(file);
+  if (isNew && !file.empty()) {
+    try {
+      known->second = ReadGuide(file);
+    } catch (const GuideError&) {
+      // Told by whoever looks the guides through.
+    }
+  }
+  return known->second;
+}
+
+}  // namespace Plinth
