@@ -132,7 +132,7 @@ def without_proc(way):
     libraries = os.path.join(os.path.dirname(os.path.dirname(HCLI)), "lib")
     mounted = 'mount -t tmpfs none /proc && cd / && exec env LD_LIBRARY_PATH="$1" "$0" iscsi adapter list'
     done = run(*way.split(), "sh", "-c", mounted, HCLI, libraries, HCLI_ROOT=host.root)
-    check("hba0" in succeeded(done), done)
+    check("hba0" in done.stdout, done)  # without /proc, the leak checker of a build that has it ends with status 1
 
 
 damaged()
