@@ -7,7 +7,7 @@ import sqlite3
 import subprocess
 
 from support.program import (DAMAGED, DENIED, HCLI, NO_SPACE, NOT_SUPPORTED, READ, SET_NAME, WRITE, Host, check,
-                             contents, refused, run, succeeded, write)
+                             contents, refused, run, write)
 
 BIG = '{"adapters": [{"name": "x", "alias": "' + "x" * 200000 + '"}]}'
 
