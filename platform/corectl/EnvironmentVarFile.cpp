@@ -47,6 +47,7 @@ void EnvironmentVarFile::Save() {
     if (host::Rehearsal* rehearsal = host::Rehearsal::Current()) {
       return rehearsal->WriteFile(path, state_->text.Text());
     }
+    host::Host::Current().Settle();
     host::MakeFoldersFor(path);
     host::NewFile file(path);
     file.Write(state_->text.Text());

@@ -92,17 +92,50 @@ std::vector<std::string> Host::TakeRehearsedCalls() { return std::exchange(Rehea
 void Host::EndRehearsal() noexcept {
   const std::vector<std::string> trace = std::move(Rehearsal::Current()->trace);
   Rehearsal::End();
-  Host& host = *CurrentHost();
-  host.calls_.swap(host.callsBefore_);
-  // Closing a file undoes what is not committed, too.
-  const bool isUndone = host.store_ == nullptr || host.store_->EndRehearsal() || host.path_.empty();
-  if (!isUndone || host.isStoreRehearsed_) {
-    host.tree_.reset();
-    host.store_.reset();
-    host.answersState_ = 0;
-  }
-  host.isStoreRehearsed_ = false;
+  CurrentHost()->UndoAll();
   for (const std::string& line : trace) std::fprintf(stderr, "%s\n", line.c_str());
+}
+
+void Host::UndoAll() noexcept {
+  calls_.swap(callsBefore_);
+  // Closing a file undoes what is not committed, too.
+  const bool isUndone = store_ == nullptr || store_->UndoAll() || path_.empty();
+  if (!isUndone || isStoreRehearsed_) {
+    tree_.reset();
+    store_.reset();
+    answersState_ = 0;
+  }
+  isStoreRehearsed_ = false;
+}
+
+void Host::BeginGroup() {
+  Host& host = Current();
+  host.callsBefore_ = host.calls_;
+  host.isGrouping_ = !IsTraceWanted();  // who reads the trace may keep it waiting
+  if (host.isGrouping_ && host.store_ != nullptr) host.store_->BeginGroup();
+}
+
+bool Host::IsGroupOpen() noexcept {
+  const Host& host = *CurrentHost();
+  return host.isGrouping_ && (host.store_ == nullptr || !host.store_->IsGroupLost());
+}
+
+void Host::Settle() {
+  if (!isGrouping_) return;
+  if (store_ != nullptr) store_->CommitGroup();
+  isGrouping_ = false;
+}
+
+bool Host::CommitGroup() noexcept {
+  Host& host = *CurrentHost();
+  try {
+    host.Settle();
+    return true;
+  } catch (const std::exception&) {
+    host.isGrouping_ = false;
+    host.UndoAll();
+    return false;
+  }
 }
 
 std::unique_ptr<Host> Host::InMemory(const std::string& description) {
@@ -140,6 +173,7 @@ Store& Host::GetStore() {
   }
   store_ = std::make_unique<Store>(path_);
   if (Rehearsal::Current() != nullptr) store_->BeginRehearsal();
+  if (isGrouping_) store_->BeginGroup();
   tree_.emplace(*store_);
   return *store_;
 }

@@ -37,6 +37,16 @@ class Host {
   static std::vector<std::string> TakeRehearsedCalls();
   static void EndRehearsal() noexcept;
 
+  /// A group: what calls change from now on is kept back, to be made durable at once. See Store::BeginGroup.
+  static void BeginGroup();
+  /// False once Settle has ended the group, and where what was changed is lost.
+  static bool IsGroupOpen() noexcept;
+  /// Ends the group. False where nothing of it could be kept.
+  static bool CommitGroup() noexcept;
+  /// Makes durable what a group keeps back, and ends it; an Error where that fails. Asked for ahead of all
+  /// that would not be undone with the group, and of all that others should not have to wait for.
+  void Settle();
+
   static std::unique_ptr<Host> InMemory(const std::string& description);
 
   /// Runs @p body with a Tree& as the work of @p call: in one transaction, whole or not at all, durable when
@@ -169,6 +179,8 @@ class Host {
   const std::vector<Object>& Answers(Tree& tree);
   /// How many changes this rehearsal has seen; 0 where there is none.
   std::int64_t RehearsedChanges();
+  /// Undoes what the store keeps back, and closes it where that takes it. Calls are counted as before.
+  void UndoAll() noexcept;
   /// Takes note of a call behind which there are more than @p before.
   void NoteRehearsed(const Call& call, std::int64_t before);
   void TraceSuccess(const Call& call, const std::string& outcome);
@@ -186,8 +198,9 @@ class Host {
   std::uint64_t answersState_ = 0;  // of the store, when they were read
   std::map<std::string, int, std::less<>>
       calls_;  // how often each operation, and each on an adapter, was called
-  std::map<std::string, int, std::less<>> callsBefore_;  // the same when the rehearsal began
-  bool isStoreRehearsed_ = false;                        // the store is this rehearsal's alone
+  std::map<std::string, int, std::less<>> callsBefore_;  // the same when the rehearsal or the group began
+  bool isGrouping_ = false;
+  bool isStoreRehearsed_ = false;  // the store is this rehearsal's alone
 };
 
 /// Takes the lines of the trace, besides HCLI_TRACE=1 in the environment, which writes them to standard

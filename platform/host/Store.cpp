@@ -315,21 +315,28 @@ void Store::EndReading() {
   }
 }
 
-bool Store::IsInRehearsal() const {
-  return isRehearsing_ && kept != this && sqlite3_get_autocommit(database_) == 0;
+bool Store::IsWithin() const {
+  return around_ != Around::Nothing && kept != this && sqlite3_get_autocommit(database_) == 0;
 }
 
 void Store::BeginChange() {
-  if (!isRehearsing_) {
+  if (around_ == Around::Nothing) {
     Statement(*this, "BEGIN IMMEDIATE").Step();
     return;
   }
-  if (!IsInRehearsal()) {
+  if (!IsWithin()) {
+    RefuseLost();
     // The file stays as it is: no page is written ahead of a commit, and there will be none.
-    Execute("PRAGMA cache_spill=off; PRAGMA journal_mode=memory");
+    if (around_ == Around::Rehearsal) Execute("PRAGMA cache_spill=off; PRAGMA journal_mode=memory");
     Statement(*this, "BEGIN IMMEDIATE").Step();
+    isGroupBegun_ = around_ == Around::Group;
   }
   Statement(*this, "SAVEPOINT part").Step();
+}
+
+void Store::RefuseLost() const {
+  if (!IsGroupLost()) return;
+  throw Error(Error::Kind::Failed, "The host database " + path_ + " has lost changes that this builds on.");
 }
 
 void Store::UndoPart() {
@@ -342,12 +349,28 @@ void Store::UndoPart() {
   }
 }
 
-bool Store::EndRehearsal() noexcept {
-  isRehearsing_ = false;
+void Store::CommitGroup() {
+  EndReading();
+  RefuseLost();
+  if (isGroupBegun_) {
+    try {
+      Statement(*this, "COMMIT").Step();
+    } catch (...) {
+      RollBack(*this);
+      throw;
+    }
+  }
+  isGroupBegun_ = false;
+  around_ = Around::Nothing;
+}
+
+bool Store::UndoAll() noexcept {
+  isGroupBegun_ = false;
+  const Around around = std::exchange(around_, Around::Nothing);
   try {
     EndReading();
     if (sqlite3_get_autocommit(database_) == 0) RollBack(*this);
-    Execute("PRAGMA journal_mode=delete; PRAGMA cache_spill=on");
+    if (around == Around::Rehearsal) Execute("PRAGMA journal_mode=delete; PRAGMA cache_spill=on");
   } catch (const std::exception&) {
     return false;
   }
@@ -373,7 +396,7 @@ Transaction::Transaction(Store& store, Access access) : store_(store), access_(a
     if (kept == &store) {
       open_ = false;
     } else {
-      if (store.IsInRehearsal()) {
+      if (store.IsWithin()) {
         open_ = false;
       } else {
         Statement(store, "BEGIN").Step();
@@ -385,7 +408,7 @@ Transaction::Transaction(Store& store, Access access) : store_(store), access_(a
     // Some damage shows as rows that are not there; what is written on top of it would be lost as well. In a
     // large file the look would take many times what a change does.
     if (store.IsSmall()) store.CheckStructure();
-    isPart_ = store.isRehearsing_;
+    isPart_ = store.around_ != Store::Around::Nothing;
     store.BeginChange();
     ++store.state_;
   }

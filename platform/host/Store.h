@@ -52,12 +52,17 @@ class Store {
   /// How long a lock of another process is waited for; as host::Patience has it from the start.
   void SetPatience(int milliseconds);
 
-  /// A dry run: what transactions change lasts until EndRehearsal undoes it, and is seen by this object
-  /// alone. Nothing of it gets into a file. Others are kept from writing, not from reading, from the first
-  /// change on.
-  void BeginRehearsal() { isRehearsing_ = true; }
-  /// False where the database has to be closed for that.
-  bool EndRehearsal() noexcept;
+  /// A dry run: what transactions change lasts until UndoAll, and is seen by this object alone. Nothing of it
+  /// gets into a file. Others are kept from writing, not from reading, from the first change on.
+  void BeginRehearsal() { around_ = Around::Rehearsal; }
+  /// A group: the same, until CommitGroup makes all of it durable at once or UndoAll undoes it.
+  void BeginGroup() { around_ = Around::Group; }
+  /// Ends the group. Where this throws, nothing of it lasts: it is lost, and UndoAll is to end it.
+  void CommitGroup();
+  /// True where a failure has undone what was changed in the group. Further changes are refused then.
+  bool IsGroupLost() const { return isGroupBegun_ && !IsWithin(); }
+  /// Ends the rehearsal or the group, and undoes it. False where the database has to be closed for that.
+  bool UndoAll() noexcept;
   /// How many rows have been written since the database was opened.
   std::int64_t CountChanges() const;
 
@@ -74,12 +79,14 @@ class Store {
   int Step(sqlite3_stmt* statement);
   [[noreturn]] void Fail(int code);
   void Close();
-  /// True where the rehearsal's own transaction is open, around those of the calls. One failure or another
-  /// may have ended it.
-  bool IsInRehearsal() const;
+  /// True where the one transaction of a rehearsal or a group is open, around those of the calls. One failure
+  /// or another may have ended it.
+  bool IsWithin() const;
   void BeginChange();
+  void RefuseLost() const;
   void UndoPart();
 
+  enum class Around { Nothing, Rehearsal, Group };
   struct Fault {
     int countdown = 0;
     int code = 0;
@@ -88,7 +95,8 @@ class Store {
   std::string path_;
   bool checked_ = false;
   bool inTransaction_ = false;
-  bool isRehearsing_ = false;
+  Around around_ = Around::Nothing;
+  bool isGroupBegun_ = false;  // something was to be changed in it
   std::uint64_t state_ = 0;
   sqlite3* database_ = nullptr;
   /// By the address of the text: each statement has one place in the code.
@@ -152,7 +160,7 @@ class Transaction {
   Store& store_;
   Access access_;
   bool open_ = true;
-  /// A part of the rehearsal's, and undone or kept within it.
+  /// A part of the rehearsal's or the group's, and undone or kept within it.
   bool isPart_ = false;
 };
 

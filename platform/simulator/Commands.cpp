@@ -84,6 +84,7 @@ class SimulatorLoad final : public SimulatorCommand {
   boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input& input) override {
     const std::string file = input.GetString(kFile);
     std::string description;
+    host::Host::Current().Settle();  // reading may have to wait
     if (file == "-") {
       host::ReadStandardInput(kMostBytes, description);
     } else if (!host::ReadFile(file, kMostBytes, description)) {
