@@ -7,7 +7,9 @@
 #include <sys/stat.h>
 
 #include <filesystem>
+#include <fstream>
 #include <functional>
+#include <sstream>
 
 #include "host/Description.h"
 #include "host/Error.h"
@@ -106,6 +108,34 @@ TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
       }
       EXPECT_GT(number, 4) << name;
     }
+  }
+}
+
+TEST_F(HostStore, WhicheverStatementOfABatchFailsItsAnswersAreTrue) {
+  const std::string path = root_.Path() + "/lines";
+  std::ofstream(path) << "iscsi adapter set -A hba0 -a new0\niscsi adapter set -A hba1 -a new1\n"
+                         "iscsi adapter set -A hba2 -a new2\n";
+  for (const int code : {SQLITE_IOERR, SQLITE_FULL, SQLITE_BUSY, SQLITE_NOMEM}) {
+    int refused = 0;
+    for (int number = 1;; ++number) {
+      Host::Use(Host::InMemory(std::string(host::DemoDescription())));
+      host::Store& store = Host::Current().GetStore();
+      store.FailStatement(number, code);
+      Plinth::TextConsole console;
+      Plinth::RunCommandLine(CommandTree(), {"--batch", path, "--keep-going", "--output", "json"}, console);
+      if (!store.HasFailed()) break;
+      const auto adapters = nlohmann::json::parse(Host::Current().Show(true)).at("adapters");
+      std::istringstream answers(console.out.text);
+      for (std::size_t line = 0; line < 3; ++line) {
+        std::string text;
+        ASSERT_TRUE(std::getline(answers, text)) << console.error.text;
+        const bool isDone = nlohmann::json::parse(text).at("status") == 0;
+        EXPECT_EQ(adapters.at(line).at("alias") == "new" + std::to_string(line), isDone)
+            << "statement " << number << ", code " << code << ": " << text;
+        refused += !isDone;
+      }
+    }
+    EXPECT_GT(refused, 6) << code;
   }
 }
 

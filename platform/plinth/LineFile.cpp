@@ -56,6 +56,11 @@ bool LineFile::Fill() {
   return count > 0;
 }
 
+bool LineFile::HasLine() const {
+  const char* const last = buffer_.data() + end_;
+  return std::find(buffer_.data() + begin_, last, '\n') != last;
+}
+
 bool LineFile::Next(std::string& line) {
   line.clear();
   bool begun = false;

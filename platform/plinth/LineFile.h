@@ -37,6 +37,8 @@ class LineFile {
   /// Reads the next line, without its newline; waits for no more than that. False at the end. Throws
   /// std::runtime_error where it cannot be read.
   bool Next(std::string& line);
+  /// True where the next line has been read already, with its newline.
+  bool HasLine() const;
   /// The number of the line that was read last, from 1 on.
   std::size_t Number() const { return number_; }
 

@@ -1,10 +1,15 @@
-"""Command lines of a file, in one process: what each answers, which of them fail, when the answer comes."""
+"""Command lines of a file, in one process: what each answers, which of them fail, when the answer comes, and that what
+is answered is so, also where lines are made durable together."""
 
 import json
 import os
+import random
+import signal
+import sqlite3
 import subprocess
+import time
 
-from support.program import Host, check, finished, write
+from support.program import BUSY, Host, check, finished, is_sound, write
 
 LINES = r"""# two changes, and what is wrong with others
 iscsi adapter set -A hba2 --alias 'one  "two"'   # not a part of it
@@ -45,6 +50,7 @@ def answered():
     check(done.stdout == "line 2: iscsi adapter set\ntrue\nline 4: iscsi adapter set\ntrue\n", done)
     reason = 'hcli: reason: The host has no adapter "hba9".'
     check(done.stderr == f"{ANSWERS[5][1]}\n{reason}\nhcli: {path}:5: exit status 1\n" and done.returncode == 1, done)
+    check(aliases(host)[2] == """it's "$x" \\a""", "what was done ahead of the failing line is lost")
 
 
 def refused():
@@ -64,18 +70,88 @@ def refused():
     check(done.returncode == 1 and "hba0" in host.succeed("iscsi adapter list"), "a command has read lines", done)
 
 
+def aliases(host):
+    return [adapter["alias"] for adapter in host.show()["adapters"][:3]]
+
+
 def while_it_is_written():
     """The answer to a line is there before the next line is, and what it tells of outlives the process."""
     host = Host()
     process = host.start("--batch - -q --output json", stdin=subprocess.PIPE)
-    for name in "first", "second":
-        os.write(process.stdin.fileno(), f"iscsi adapter set -A hba2 -a {name}\n".encode())
-        check(json.loads(process.stdout.readline())["result"] is True, "no answer")
+    change = "iscsi adapter set -A hba2 -a"
+    for text, answers in [(f"{change} first\n", 1), (f"{change} second\n# a note\n\niscsi adap", 1),
+                          (f"ter set -A hba1 -a x\n{change} y\n{change} z", 2)]:
+        os.write(process.stdin.fileno(), text.encode())
+        for _ in range(answers):
+            check(json.loads(process.stdout.readline())["result"] is True, "no answer")
     process.kill()
     finished(process)
-    check(host.show()["adapters"][2]["alias"] == "second", "what was answered is lost")
+    check(aliases(host)[1:] == ["x", "y"], "what was answered is lost", aliases(host))
+
+
+def unread():
+    """Where nobody reads on, the program ends as others do, and what has come with the line answered last stands."""
+    host = Host()
+    before = aliases(host)
+    reader, writer = os.pipe()
+    os.close(reader)
+    done = host.run("--batch -", "iscsi adapter set -A hba1 -a x\niscsi adapter set -A hba2 -a y\n", stdout=writer)
+    os.close(writer)
+    check(done.returncode == -signal.SIGPIPE and not done.stderr, done)
+    check(aliases(host) == [before[0], "x", "y"], aliases(host))
+
+
+def locked():
+    """What cannot be made durable together is told of each line by itself, and lines that are not hurt by it go on."""
+    host = Host()
+    before = aliases(host)
+    lines = [f"iscsi adapter {line}" for line in ("set -A hba1 -a x", "get -A hba2", "set -A hba2 -a y")]
+    reader = sqlite3.connect(host.database, isolation_level=None)
+    reader.execute("BEGIN")
+    reader.execute("SELECT * FROM object").fetchone()
+    for options, statuses in ("--keep-going", [BUSY, 0, BUSY]), ("", [BUSY]):
+        done = host.run(f"--batch - --output json --exit-codes --timeout 0 {options}", "\n".join(lines))
+        answers = [json.loads(line) for line in done.stdout.splitlines()]
+        check([answer["status"] for answer in answers] == statuses and done.returncode == BUSY, done)
+        check(len(answers) == 1 or answers[1]["result"][0]["Alias"] == before[2], "a change is seen that is not there", done)
+        check(aliases(host) == before, aliases(host))
+    begin = time.monotonic()
+    host.run("--timeout 1 --batch -", "\n".join(lines))
+    check(1 < time.monotonic() - begin < 10, "--timeout does not hold for what is made durable together")
+    reader.execute("COMMIT")
+    host.succeed("--batch -", "\n".join(lines))
+    check(aliases(host) == [before[0], "x", "y"], aliases(host))
+
+
+def killed(kills):
+    """Wherever it is killed, the first lines are done, as many as were answered at least, and no others."""
+    random.seed(20261123)
+    longest, ended = 0.2, 0
+    addresses = [f"10.0.{number // 250}.{number % 250 + 1}:3260" for number in range(600)]
+    for _ in range(kills):
+        host = Host({"adapters": [{"name": "hba0", "capabilities": {"Sendtarget Discovery Settable": True}}]})
+        write(os.path.join(host.root, "lines"), "".join(f"iscsi adapter discovery sendtarget add -A hba0 -a {address}\n"
+                                                        for address in addresses))
+        with open(os.path.join(host.root, "answers"), "w+", encoding="utf-8") as answers:
+            process = host.start(f"--batch {host.root}/lines", stdout=answers,
+                                 env=host.environment(ASAN_OPTIONS="detect_leaks=0"))
+            time.sleep(random.uniform(0, longest))
+            process.kill()
+            done = finished(process)
+            answers.seek(0)
+            count = answers.read().count("true")
+        check(done.returncode in (0, -9) and not done.stderr, done)
+        there = [entry["host"] + ":3260" for entry in host.show()["adapters"][0]["sendTargets"]]
+        check(there == addresses[:len(there)] and len(there) >= count, f"answered: {count}, there:", there)
+        check(is_sound(host.database), "the database is damaged")
+        ended += done.returncode == 0
+        longest *= 0.8 if done.returncode == 0 else 1.1
+    check(0 < ended < kills, f"{ended} of {kills} were not killed in time")
 
 
 answered()
 refused()
 while_it_is_written()
+unread()
+locked()
+killed(20)

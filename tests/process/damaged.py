@@ -7,7 +7,7 @@ import sqlite3
 import subprocess
 
 from support.program import (DAMAGED, DENIED, HCLI, NO_SPACE, NOT_SUPPORTED, READ, SET_NAME, WRITE, Host, check,
-                             contents, refused, run, write)
+                             contents, refused, run, succeeded, write)
 
 BIG = '{"adapters": [{"name": "x", "alias": "' + "x" * 200000 + '"}]}'
 
@@ -126,6 +126,21 @@ def full_output():
         check(done.returncode == status and not done.stderr, done)
 
 
+def room_for_few(way):
+    """Where there is room for each change, and not for all of them together, each is made."""
+    host = Host({"adapters": [{"name": f"hba{number}", "alias": "x" * 1800, "capabilities": {"Name And Alias Settable": True}}
+                              for number in range(40)]})
+    lines = "".join(f"iscsi adapter set -A hba{number} -a new\n" for number in range(40))
+    mounted = ('mount -t tmpfs -o size=$2k none "$(dirname "$1")" && cat "$3" > "$1" && chmod 600 "$1" && '
+               '"$0" --batch - --keep-going --output json && "$0" simulator show')
+    kept = os.path.join(host.root, "kept")
+    os.link(host.database, kept)
+    size = str(os.path.getsize(kept) // 1024 + 40)
+    done = subprocess.run([*way.split(), "sh", "-c", mounted, HCLI, host.database, size, kept], input=lines,
+                          capture_output=True, text=True, env=host.environment(), timeout=60)
+    check(done.stdout.count('"result": true') == done.stdout.count('"alias": "new"') == 40, done)
+
+
 def without_proc(way):
     """The program finds its plug-ins, wherever it is called, where nothing but the kernel's word tells its place."""
     host = Host()
@@ -141,6 +156,7 @@ full_output()
 way = next(filter(can_mount, ["unshare --mount", "unshare --map-root-user --mount"]), None)
 if way:
     unwritable(way)
+    room_for_few(way)
     without_proc(way)
 else:
     print("left out, for no file system can be mounted here: read-only and full ones")

@@ -4,7 +4,9 @@ together.py [SECONDS] lets eight writers and eight readers work for so long."""
 import fcntl
 import itertools
 import os
+import subprocess
 import sys
+import threading
 import time
 from concurrent.futures import ThreadPoolExecutor
 
@@ -79,6 +81,24 @@ def keys_at_once(pairs):
             check(found.items() >= wanted.items(), f"of {wanted} at {command} one is lost:", found)
 
 
+def batch_among_others():
+    """Lines that are made durable together keep others waiting for a moment, and take nothing of theirs."""
+    host = with_adapters(ADAPTERS)
+    lines = [writing(9, 3 * count + 1) for count in range(2500)]
+    batch = host.start("--batch -", stdin=subprocess.PIPE)
+    writer = threading.Thread(target=batch.communicate, args=["\n".join(lines)])
+    writer.start()
+    count = 0
+    while writer.is_alive() or count < 2:
+        count += 1
+        host.succeed("--timeout 10 " + writing(count % 2, 3 * count + 1))
+    writer.join()
+    expected = {(f"hba{9 % ADAPTERS}", address(9, 3 * number + 1)) for number in range(len(lines))}
+    expected |= {(f"hba{number % 2}", address(number % 2, 3 * number + 1)) for number in range(1, count + 1)}
+    check(batch.returncode == 0 and sendtargets(host) == expected, "a batch and others: lost or too many", batch.returncode)
+    print(f"a batch made {len(lines)} changes, others {count} meanwhile")
+
+
 def unread_trace():
     """Whoever does not read on keeps one command waiting, and no other."""
     host = with_adapters(1000)
@@ -128,6 +148,7 @@ else:
         first_runs(8)
         names_at_once(8)
     keys_at_once(20)
+    batch_among_others()
     unread_trace()
     unread_report()
     work(1, 1)
