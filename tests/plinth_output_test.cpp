@@ -1,9 +1,12 @@
 #include <gtest/gtest.h>
 #include <locale.h>
+#include <unistd.h>
 
 #include <nlohmann/json.hpp>
 #include <stdexcept>
 
+#include "plinth/Candidates.h"
+#include "plinth/Guide.h"
 #include "support/ProbeCommand.h"
 
 namespace Plinth::Test {
@@ -276,21 +279,42 @@ TEST(PlinthRun, GivesOneDocumentHoweverItEnds) {
   }
 }
 
-TEST(PlinthCompletion, TellsFishWhatStandsWhere) {
-  TextConsole console;
-  RunCommandLine(*NewTree(), {"completion", "fish"}, console);
-  const auto part = [&](const std::string& from, const std::string& to) {
-    const std::size_t begin = console.out.text.find(from);
-    return console.out.text.substr(begin, console.out.text.find(to) - begin);
+TEST(PlinthCompletion, TakesValuesOfAHostThatAnswersInTime) {
+  const auto good = Ports({Port("p0", 9000, true), Port("p0", 1500, true), Port("a\nb", 1, true), PortShape(),
+                           Port("p 1", 1500, true)});
+  const struct {
+    const char* type;
+    ProbeCommand::Body body;
+    std::vector<std::string> values;
+  } cases[] = {
+      {"fetcher",
+       [&](const Input&, Output& output) {
+         fputs("noise", stderr);
+         output.ReportError("some are missing");
+         Post(output, good);
+       },
+       {"p0 9000", "p 1 1500"}},
+      {"operation", [&](const Input&, Output& output) { Post(output, good); }, {}},
+      {"fetcher", [](const Input&, Output&) { pause(); }, {}},
+      {"fetcher", [](const Input&, Output&) { abort(); }, {}},
+      {"fetcher", [](const Input&, Output&) { throw 42; }, {}},
   };
-  EXPECT_EQ(part("complete -c hcli -n '__hcli_at \"net\"'",
-                 "complete -c hcli -n '__hcli_in \"net port list\"' -l output"),
-            "complete -c hcli -n '__hcli_at \"net\"' -a 'port' -d ''\n"
-            "complete -c hcli -n '__hcli_at \"net port\"' -a 'list' -d 'List ports.'\n"
-            "complete -c hcli -n '__hcli_in \"net port list\"' -s w -l way -x -a 'in out'\n"
-            "complete -c hcli -n '__hcli_in \"net port list\"' -l mode\n");
-  EXPECT_EQ(part("complete -c hcli -l fields", "complete -c hcli -l no-header"),
-            "complete -c hcli -l fields -r\n");
+  for (const auto& one : cases) {
+    const auto probe = NewProbe(good);
+    probe->body = one.body;
+    probe->SetMetaDataField("type", one.type);
+    const auto root = AutoCli::Namespace::New();
+    root->RegisterNamespaceNode(probe, "ports");
+    testing::internal::CaptureStderr();
+    std::vector<std::string> values;
+    for (const Candidate& value : ShownValues(
+             *root, Arguments{},
+             {.option = "", .of = "", .from = "ports", .field = "Name", .about = "MTU", .with = {}})) {
+      values.push_back(value.word + ' ' + value.description);
+    }
+    EXPECT_EQ(values, one.values);
+    EXPECT_EQ(testing::internal::GetCapturedStderr(), "");
+  }
 }
 
 TEST(PlinthCheck, TellsWhereAResultDiffers) {

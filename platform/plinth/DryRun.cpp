@@ -61,11 +61,13 @@ std::vector<std::string> TakeCalls() {
 
 void AddRehearsal(Rehearsal& rehearsal) { Rehearsals().push_back(&rehearsal); }
 
+bool CanRehearse() { return !Rehearsals().empty(); }
+
 void CheckDryRun(Run&, const Given& given) {
   if (!given.truth && Rehearsing::IsOn()) {
     throw UsageError("option --dry-run: the whole batch is a dry run, and a line of it cannot be for real");
   }
-  if (given.truth && Rehearsals().empty()) {
+  if (given.truth && !CanRehearse()) {
     throw UsageError(
         "option --dry-run: no plug-in that is loaded can undo what commands do; nothing was run");
   }

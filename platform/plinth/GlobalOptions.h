@@ -45,7 +45,9 @@ void ChooseFields(Run& run, const Given& given);
 void CheckTyped(Run& run, const Given& given);
 /// --trace: shows the calls of the host's libraries for as long as the command runs.
 void Trace(Run& run, const Given& given, const Rest& rest);
-/// --dry-run: undoes what the command has done, and keeps what that was.
+/// --dry-run: undoes what the command has done, and keeps what that was. Where no platform can undo, it is
+/// refused.
+bool CanRehearse();
 void CheckDryRun(Run& run, const Given& given);
 void DryRun(Run& run, const Given& given, const Rest& rest);
 /// --timeout: how long library calls wait for other processes.

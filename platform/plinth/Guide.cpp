@@ -197,9 +197,9 @@ void SetGuideFolder(const std::string& folder) { GuideFolder() = folder; }
 std::string GuideFile(const AutoCli::NamespaceNode& root, const std::string& path) {
   const std::string word = path.substr(0, path.find(' '));
   const AutoCli::NamespaceNode* const top = AutoCli::NodeData::FindChild(root, word);
-  const std::string name = IsOwnCommand(word) || path.empty() ? "hcli"
-                           : top                              ? AutoCli::NodeData::Of(*top).plugin
-                                                              : "";
+  const std::string name = FindOwnCommand(word) || path.empty() ? "hcli"
+                           : top                                ? AutoCli::NodeData::Of(*top).plugin
+                                                                : "";
   return GuideFolder().empty() || name.empty() ? "" : GuideFolder() + '/' + name + ".yaml";
 }
 

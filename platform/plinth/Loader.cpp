@@ -75,7 +75,7 @@ std::string LoadFile(const std::string& path, const boost::shared_ptr<Namespace>
 
 std::string FindClash(const Namespace& root, const Namespace& scratch) {
   for (const Child& child : NodeData::Of(scratch).children) {
-    if (IsOwnCommand(child.name) || NodeData::FindChild(root, child.name)) {
+    if (FindOwnCommand(child.name) || NodeData::FindChild(root, child.name)) {
       return "the name " + Quoted(child.name) + " is taken";
     }
   }

@@ -70,6 +70,9 @@ std::string OptionName(const Parameter& parameter) {
   return "--" + parameter.name + (parameter.shortName.empty() ? "" : " (-" + parameter.shortName + ")");
 }
 
+MissingValue::MissingValue(const Parameter& parameter)
+    : UsageError("option " + OptionName(parameter) + " needs a value"), option(parameter.name) {}
+
 OptionTable::OptionTable(std::vector<Parameter> declared)
     : parameters_(std::move(declared)), given_(parameters_.size()) {}
 
@@ -183,7 +186,7 @@ Match FindIn(const std::vector<OptionTable*>& tables, Finder find) {
 
 /// Takes the word at @p at, which may look like an option, as the value.
 void TakeWord(const Match& match, const std::vector<std::string>& arguments, std::size_t& at) {
-  if (at == arguments.size()) throw UsageError("option " + OptionName(*match.parameter) + " needs a value");
+  if (at == arguments.size()) throw MissingValue(*match.parameter);
   match.table->Take(*match.parameter, &arguments[at++]);
 }
 

@@ -17,6 +17,13 @@ struct UsageError : std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
+/// The line ends behind an option that needs a value.
+struct MissingValue : UsageError {
+  explicit MissingValue(const Parameter& parameter);
+  /// The long name.
+  std::string option;
+};
+
 /// What was given for one parameter.
 struct Given {
   bool given = false;

@@ -7,9 +7,10 @@
 
 namespace Plinth {
 
-bool IsOwnCommand(const std::string& name) {
-  return std::any_of(std::begin(kOwnCommands), std::end(kOwnCommands),
-                     [&](const OwnCommand& own) { return name == own.name; });
+const OwnCommand* FindOwnCommand(const std::string& name) {
+  const auto* const found = std::find_if(std::begin(kOwnCommands), std::end(kOwnCommands),
+                                         [&](const OwnCommand& own) { return name == own.name; });
+  return found == std::end(kOwnCommands) ? nullptr : found;
 }
 
 void RegisterOwnCommands(AutoCli::Namespace& root) {

@@ -12,19 +12,28 @@ namespace Plinth {
 
 /// Shows every node under @p root, which holds the command and so outlives it.
 boost::shared_ptr<AutoCli::Command> NewCatalogue(AutoCli::Namespace& root);
-/// Writes completion scripts for the tree under @p root, which outlives the command.
+/// Writes the scripts by which shells complete command lines.
 boost::shared_ptr<AutoCli::Command> NewCompletion(AutoCli::Namespace& root);
+/// Answers those scripts, for the tree under @p root, which outlives the command.
+boost::shared_ptr<AutoCli::Command> NewProposal(AutoCli::Namespace& root);
+
+/// Which plug-ins have to be loaded for one of them: all, none, or what the line needs that a
+/// shell is asking about.
+enum class Needs { AllPlugins, PluginsOfLineAtCursor, NoPlugins };
 
 struct OwnCommand {
   const char* name;
   boost::shared_ptr<AutoCli::Command> (*make)(AutoCli::Namespace& root);
+  Needs needs = Needs::AllPlugins;
 };
 
 /// In the order in which they hang under the root. No plug-in gets one of these names.
-inline constexpr OwnCommand kOwnCommands[] = {{"catalogue", NewCatalogue}, {"completion", NewCompletion}};
+inline constexpr OwnCommand kOwnCommands[] = {{"catalogue", NewCatalogue},
+                                              {"completion", NewCompletion, Needs::NoPlugins},
+                                              {"propose", NewProposal, Needs::PluginsOfLineAtCursor}};
 
-/// True for the name of a row of the table.
-bool IsOwnCommand(const std::string& name);
+/// The row of that name, or null.
+const OwnCommand* FindOwnCommand(const std::string& name);
 
 /// Calls @p visit(path, node) for each node under @p node in order of registration, a namespace ahead of
 /// its children. @p path leads to @p node.

@@ -10,6 +10,8 @@
 #include "plinth/GlobalOptions.h"
 #include "plinth/Guide.h"
 #include "plinth/Options.h"
+#include "plinth/OwnCommands.h"
+#include "plinth/Shells.h"
 
 namespace Plinth {
 
@@ -19,6 +21,7 @@ namespace {
 struct Beginning {
   std::optional<std::string> folder;  // of --plugins
   std::string word;                   // empty where there is none
+  bool isAlone = false;               // the command there needs no plug-ins
 };
 
 /// The folder is needed before there is a tree to resolve the words in, and without them an option cannot be
@@ -42,6 +45,18 @@ Beginning BeginningOf(const std::vector<std::string>& arguments) {
   return beginning;
 }
 
+/// What plug-ins to load, and where from.
+Beginning PluginsFor(const std::vector<std::string>& arguments) {
+  Beginning beginning = BeginningOf(arguments);
+  const OwnCommand* const own = FindOwnCommand(beginning.word);
+  if (!own || own->needs == Needs::AllPlugins) return beginning;
+  beginning.isAlone = own->needs == Needs::NoPlugins;
+  if (beginning.isAlone) return beginning;
+  Beginning asked = BeginningOf(LineAtCursor().words);
+  if (!asked.folder) asked.folder = std::move(beginning.folder);
+  return asked;
+}
+
 /// A file opened later must not take the number of a standard file that is closed: results would be written
 /// into it.
 void HoldStandardFiles() {
@@ -51,14 +66,25 @@ void HoldStandardFiles() {
   }
 }
 
-RunRecord RunWithPlugins(const std::vector<std::string>& arguments, const std::string& word,
-                         const std::string& folder, PluginFolder whose, Console& console) {
-  // Kept to the end of the process, where nobody waits for the tree to be taken apart.
-  static const auto& root = *new auto(AutoCli::Namespace::New());
-  for (const std::string& trouble : LoadPlugins(*root, folder, whose, word)) {
+/// Loads what @p beginning asks for. @p folder is where plug-ins lie when nothing names another.
+void LoadPluginsFor(const Beginning& beginning, const std::string& folder, AutoCli::Namespace& root,
+                    Console& console) {
+  if (beginning.isAlone) return;
+  const char* given = beginning.folder ? beginning.folder->c_str() : getenv("HCLI_PLUGINS");
+  const bool named = beginning.folder || (given && *given);
+  for (const std::string& trouble :
+       LoadPlugins(root, named ? given : folder, named ? PluginFolder::Named : PluginFolder::BuiltIn,
+                   beginning.word)) {
     console.Error().Write("hcli: " + trouble + '\n');
   }
   console.Error().Flush();
+}
+
+RunRecord RunWithPlugins(const std::vector<std::string>& arguments, const std::string& folder,
+                         Console& console) {
+  // Kept to the end of the process, where nobody waits for the tree to be taken apart.
+  static const auto& root = *new auto(AutoCli::Namespace::New());
+  LoadPluginsFor(PluginsFor(arguments), folder, *root, console);
   RegisterOwnCommands(*root);
   return RunCommandLine(*root, arguments, console);
 }
@@ -73,15 +99,10 @@ int RunProgram(const std::vector<std::string>& arguments, const std::string& fol
 
   ProcessConsole console;
   try {
-    const Beginning beginning = BeginningOf(arguments);
     // Beside the program's own plug-ins, wherever others lie: who runs the program trusts what lies there.
     if (!folder.empty()) SetGuideFolder(folder + "/../../../share/hcli/guides");
-    const char* given = beginning.folder ? beginning.folder->c_str() : getenv("HCLI_PLUGINS");
-    const bool named = beginning.folder || (given && *given);
     // Kept as the tree is: a result of thousands of rows takes a tenth of the run to take apart.
-    static const RunRecord& record =
-        *new RunRecord(RunWithPlugins(arguments, beginning.word, named ? given : folder,
-                                      named ? PluginFolder::Named : PluginFolder::BuiltIn, console));
+    static const RunRecord& record = *new RunRecord(RunWithPlugins(arguments, folder, console));
     if (record.isUnread) {
       // The end that the signal brings to other programs, now that the work is done.
       signal(SIGPIPE, whenUnread);

@@ -32,12 +32,11 @@ class RequestReader {
 
   Request Read() {
     Attempt([&] { Enter(); });
-    bool onlyWords = false;
     while (at_ < arguments_.size()) {
-      if (!onlyWords && arguments_[at_] == "--") {
-        onlyWords = true;
+      if (!request_.isOptionsEnd && arguments_[at_] == "--") {
+        request_.isOptionsEnd = true;
         ++at_;
-      } else if (!onlyWords && IsOption(arguments_[at_])) {
+      } else if (!request_.isOptionsEnd && IsOption(arguments_[at_])) {
         Attempt([&] { TakeOption(); });
       } else {
         Attempt([&] { TakeWord(arguments_[at_++]); });
@@ -52,6 +51,9 @@ class RequestReader {
   void Attempt(Step step) {
     try {
       step();
+    } catch (const MissingValue& missing) {
+      request_.awaited = missing.option;
+      Note(kUsage, missing.what());
     } catch (const UsageError& error) {
       Note(kUsage, error.what());
     } catch (...) {
@@ -84,11 +86,11 @@ class RequestReader {
 
   /// A step further in the tree, or an operand.
   void TakeWord(const std::string& word) {
-    if (isLost_) return;
+    if (request_.isLost) return;
     if (IsAtCommand()) return request_.operands.push_back(word);
     NamespaceNode* child = NodeData::FindChild(*request_.node, word);
     if (!child) {
-      isLost_ = true;
+      request_.isLost = true;
       throw UsageError(UnknownWord(*request_.node, request_.path, word));
     }
     request_.path += (request_.path.empty() ? "" : " ") + word;
@@ -99,8 +101,6 @@ class RequestReader {
   const std::vector<std::string>& arguments_;
   std::size_t at_ = 0;
   Request request_;
-  /// A word led nowhere, so nobody knows what those behind it mean.
-  bool isLost_ = false;
 };
 
 }  // namespace

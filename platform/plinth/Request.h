@@ -26,6 +26,12 @@ struct Request {
   /// The first fault of the line: kUsage, or kFailure where a command cannot say what it takes.
   int status = 0;
   std::string fault;
+  /// A word leads nowhere, so nobody knows what those behind it mean.
+  bool isLost = false;
+  /// A "--" stands in the line: no options behind it.
+  bool isOptionsEnd = false;
+  /// The long name of the option whose value would have to come next, or empty.
+  std::string awaited;
 };
 
 /// Reads @p arguments to their end, behind a fault too: in which form to answer may stand there.

@@ -4,7 +4,7 @@ import json
 import os
 import tempfile
 
-from support.program import Host, check, run
+from support.program import Host, check, read, run
 
 with tempfile.TemporaryDirectory(prefix="hcli installed ") as folder:
     installed, moved = os.path.join(folder, "installed"), os.path.join(folder, "moved away")
@@ -18,6 +18,11 @@ with tempfile.TemporaryDirectory(prefix="hcli installed ") as folder:
     check(not missing, f"not in the catalogue: {missing}")
     check("hba0" in host.succeed("iscsi adapter list", executable=hcli), "no demo host")
     check(os.path.exists(host.database), "the host was not kept below HCLI_ROOT")
+    for shell, script in (("bash", "bash-completion/completions/hcli"), ("zsh", "zsh/site-functions/_hcli"),
+                          ("fish", "fish/vendor_completions.d/hcli.fish")):
+        check(read(os.path.join(moved, "share", script)) == host.succeed(f"completion {shell}"), script)
+    proposed = host.succeed("propose fish", executable=hcli, env=host.environment(COMP_LINE="hcli iscsi adapter get -A "))
+    check("hba0" in proposed, proposed)
     # Nothing in the tree may lead back to where it was built.
     for path, _, names in os.walk(moved):
         for file in (os.path.join(path, name) for name in names):
