@@ -5,6 +5,7 @@
 #include <fstream>
 #include <set>
 
+#include "linux/Commands.h"
 #include "plinth/Declarations.h"
 #include "plinth/GlobalOptions.h"
 #include "plinth/OwnCommands.h"
@@ -84,6 +85,9 @@ TEST(Guide, NamesWhatIsThere) {
   ExpectKnown(ReadGuide(ProjectFile("plugins/iscsi/guide.yaml")), all);
   ExpectKnown(ReadGuide(ProjectFile("platform/plinth/guide.yaml")), all);
   ExpectKnown(ReadGuide(ProjectFile("platform/simulator/guide.yaml")), Declared(*simulated));
+  const auto machine = AutoCli::Namespace::New();
+  machine->RegisterNamespaceNode(linux::NewNamespace(), "linux");
+  ExpectKnown(ReadGuide(ProjectFile("platform/linux/guide.yaml")), Declared(*machine));
 }
 
 TEST(Guide, IsAboutTheNearestPlace) {

@@ -9,6 +9,14 @@ from support.program import check
 NAMES = {3260: "iqn.2026-11.org.example:tgt", targets.KERNEL_PORT: "iqn.2026-11.org.example:kernel"}
 
 
+def missing(machine):
+    """What `hcli linux check` misses; its status says so too."""
+    done = machine.run("hcli linux check --output json")
+    parts = [row["Part"] for row in json.loads(done.stdout)["result"] if row["State"] != "ok"]
+    check(done.returncode == (3 if parts else 0), done)
+    return parts
+
+
 def logged_in(machine, port):
     """A disk that appears keeps what is written to it; it goes with its session."""
     name, portal = NAMES[port], f"127.0.0.1:{port}"
@@ -32,8 +40,10 @@ dd if=/dev/sda bs=8 count=1 | grep written""".replace("dd ", "dd status=none "))
 with Machine() as machine:
     adapters = json.loads(machine.succeed("hcli iscsi adapter list --output json"))["result"]
     check([adapter["Adapter"] for adapter in adapters][0] == "hba0", adapters)
-    machine.succeed("modprobe -a iscsi_tcp sd_mod")
-    machine.succeed("iscsid -f >/tmp/iscsid.log 2>&1 &")
+    for repair, parts in (("true", ["module", "socket", "daemon"]),
+                          ("modprobe -a iscsi_tcp sd_mod", ["socket", "daemon"]), ("iscsid", [])):
+        machine.succeed(repair)
+        check(missing(machine) == parts, repair, missing(machine))
     targets.start_tgt(machine)
     targets.add_tgt(machine, 1, NAMES[3260])
     targets.start_kernel(machine)

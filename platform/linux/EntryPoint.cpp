@@ -1,0 +1,6 @@
+#include "linux/Commands.h"
+
+extern "C" __attribute__((visibility("default"))) void AutoCli_RegisterNamespaces(
+    boost::shared_ptr<Plinth::AutoCli::Namespace> parent) {
+  parent->RegisterNamespaceNode(linux::NewNamespace(), "linux");
+}
