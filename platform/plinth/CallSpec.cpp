@@ -146,13 +146,6 @@ std::vector<std::string> FieldNames(const MetaObj::MetaStruct& structure) {
   return names;
 }
 
-const MetaObj::MetaObject* FindField(const MetaObj::MetaStruct& structure, const std::string& name) {
-  for (std::size_t index = 0; index < structure.GetFieldCount(); ++index) {
-    if (structure.GetFieldName(index) == name) return structure.GetField(index).get();
-  }
-  return nullptr;
-}
-
 const char* TypeName(CallSpec::ParameterType type) {
   switch (type) {
     case CallSpec::ParameterType::String:

@@ -17,24 +17,33 @@ void AppendText(std::string_view text, std::string& record) {
   record += '"';
 }
 
-void AppendValue(const MetaObj::MetaObject* value, std::string& space, std::string& record) {
-  const bool isText = value && value->GetType() == MetaObj::MetaType::String;
-  AppendText(isText ? static_cast<const MetaObj::MetaString&>(*value).GetValue() : ValueText(value, space),
-             record);
+void AppendValue(const Value& value, std::string& space, std::string& record) {
+  AppendText(value.type == MetaObj::MetaType::String ? value.text : ValueText(value, space), record);
 }
 
-/// Writes a record of @p fields, each appended by @p append.
-template <class Append>
-void WriteRecord(const std::vector<std::string>& fields, std::string& record, Sink& sink, Append append) {
-  record.clear();
-  for (const std::string& field : fields) {
-    if (&field != fields.data()) record += ',';
-    append(field);
+/// Writes records, each in the room of the one before it.
+class RecordWriter {
+ public:
+  explicit RecordWriter(Sink& sink) : sink_(sink) {}
+
+  void Append(const Value& value) {
+    if (!std::exchange(isFirst_, false)) record_ += ',';
+    AppendValue(value, space_, record_);
   }
-  // Readers take an empty line for no record at all.
-  if (record.empty()) record = "\"\"";
-  sink.Write(record += "\r\n");
-}
+  void End() {
+    // Readers take an empty line for no record at all.
+    if (record_.empty()) record_ = "\"\"";
+    sink_.Write(record_ += "\r\n");
+    record_.clear();
+    isFirst_ = true;
+  }
+
+ private:
+  Sink& sink_;
+  std::string record_;
+  std::string space_;
+  bool isFirst_ = true;
+};
 
 }  // namespace
 
@@ -44,19 +53,22 @@ void WriteCsv(const Report& report, Sink& sink) {
   if (!declared && report.result->GetType() != MetaObj::MetaType::List) {
     return WritePlain(*report.result, sink);
   }
-  std::vector<std::string> fields{""};
+  std::vector<std::string> fields;
   if (declared) fields = report.fields.empty() ? FieldNames(*declared) : report.fields;
-  std::string space;
-  std::string record;
+  RecordWriter records(sink);
   if (declared && report.hasHeader) {
-    WriteRecord(fields, record, sink, [&](const std::string& name) { AppendText(name, record); });
+    for (const std::string& name : fields) records.Append({.hasValue = true, .text = name});
+    records.End();
   }
+  Selection selection(std::move(fields));
   ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
-    const bool isStructure = element.GetType() == MetaObj::MetaType::Struct;
-    WriteRecord(fields, record, sink, [&](const std::string& name) {
-      AppendValue(isStructure ? FindField(static_cast<const MetaObj::MetaStruct&>(element), name) : &element,
-                  space, record);
-    });
+    if (element.GetType() == MetaObj::MetaType::Struct) {
+      selection.ForEachField(static_cast<const MetaObj::MetaStruct&>(element),
+                             [&](const std::string&, const Value& value) { records.Append(value); });
+    } else {
+      records.Append(ValueOf(element));
+    }
+    records.End();
   });
 }
 

@@ -54,8 +54,6 @@ boost::shared_ptr<MetaObj::MetaObject> PrototypeOf(const CallSpec::OutputSpec& s
 const MetaObj::MetaStruct* StructureOf(const MetaObj::MetaObject& object);
 /// The names of the structure's fields in order.
 std::vector<std::string> FieldNames(const MetaObj::MetaStruct& structure);
-/// The field of that name, or null.
-const MetaObj::MetaObject* FindField(const MetaObj::MetaStruct& structure, const std::string& name);
 
 /// "string", "int", "bool", "flag" or "list".
 const char* TypeName(CallSpec::ParameterType type);

@@ -34,44 +34,37 @@ namespace {
 std::string JoinedText(const MetaObj::MetaObject& value) {
   std::string joined;
   std::string space;
-  const auto append = [&](std::string_view separator, const MetaObj::MetaObject* part) {
+  const auto append = [&](std::string_view separator, const Value& part) {
     joined.append(separator).append(ValueText(part, space));
   };
   if (value.GetType() == MetaType::List) {
     std::string_view separator;
-    ForEachElement(
-        value, [&](const MetaObj::MetaObject& element) { append(std::exchange(separator, ", "), &element); });
+    ForEachElement(value, [&](const MetaObj::MetaObject& element) {
+      append(std::exchange(separator, ", "), ValueOf(element));
+    });
   } else {
-    ForEachField(static_cast<const MetaObj::MetaStruct&>(value), {},
-                 [&](const std::string& name, const MetaObj::MetaObject* field) {
-                   append((joined.empty() ? "" : " ") + Visible(name) + '=', field);
-                 });
+    ForEachField(static_cast<const MetaObj::MetaStruct&>(value), [&](const auto& name, const Value& field) {
+      append((joined.empty() ? "" : " ") + Visible(name) + '=', field);
+    });
   }
   return joined;
 }
 
 }  // namespace
 
-std::string_view ValueText(const MetaObj::MetaObject* value, std::string& space) {
-  if (!value) return "";
-  switch (value->GetType()) {
-    case MetaType::Bool: {
-      const auto& truth = static_cast<const MetaObj::MetaBool&>(*value);
-      return !truth.HasValue() ? "" : truth.GetValue() ? "true" : "false";
-    }
-    case MetaType::Int: {
-      const auto& number = static_cast<const MetaObj::MetaInt&>(*value);
-      if (!number.HasValue()) return "";
-      return space = std::to_string(number.GetValue());
-    }
-    case MetaType::String: {
-      const std::string& text = static_cast<const MetaObj::MetaString&>(*value).GetValue();
-      if (PlainLength(text) == text.size()) return text;
-      return space = Visible(text);
-    }
+std::string_view ValueText(const Value& value, std::string& space) {
+  if (!value.hasValue) return "";
+  switch (value.type) {
+    case MetaType::Bool:
+      return value.truth ? "true" : "false";
+    case MetaType::Int:
+      return space = std::to_string(value.number);
+    case MetaType::String:
+      if (PlainLength(value.text) == value.text.size()) return value.text;
+      return space = Visible(value.text);
     case MetaType::Struct:
     case MetaType::List:
-      return space = JoinedText(*value);
+      return space = JoinedText(*value.object);
   }
   return "";
 }
@@ -85,7 +78,7 @@ void WritePlain(const MetaObj::MetaObject& result, Sink& sink) {
   }
   std::string space;
   ForEachElement(result, [&](const MetaObj::MetaObject& element) {
-    sink.Write(ValueText(&element, space));
+    sink.Write(ValueText(ValueOf(element), space));
     sink.Write("\n");
   });
 }

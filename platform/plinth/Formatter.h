@@ -6,10 +6,12 @@
 
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "plinth/Console.h"
 #include "plinth/Declarations.h"
+#include "plinth/Structure.h"
 
 namespace Plinth {
 
@@ -68,19 +70,48 @@ const Formatter* FindFormatter(const std::string& name);
 /// The fields that a text format shows of a structure: those the user named, else the command's default;
 /// empty for all.
 std::vector<std::string> ShownFields(const Report& report, const std::string& typeName);
-/// One line for any value; empty for null and one without a value. Escaped, so fit for a terminal. Of @p
-/// value itself where that needs no change, and otherwise of @p space.
-std::string_view ValueText(const MetaObj::MetaObject* value, std::string& space);
-/// Calls @p visit with the name of each of @p fields, or of all where that is empty, and with the field, or
-/// null where the structure has none of that name.
+/// One line for any value; empty for one that is not there. Escaped, so fit for a terminal. Of @p value
+/// itself where that needs no change, and otherwise of @p space.
+std::string_view ValueText(const Value& value, std::string& space);
+
+/// Calls @p visit with the name and the value of each field.
 template <class Visitor>
-void ForEachField(const MetaObj::MetaStruct& structure, const std::vector<std::string>& fields,
-                  Visitor visit) {
-  for (const std::string& name : fields) visit(name, FindField(structure, name));
-  for (std::size_t index = 0; fields.empty() && index < structure.GetFieldCount(); ++index) {
-    visit(structure.GetFieldName(index), structure.GetField(index).get());
+void ForEachField(const MetaObj::MetaStruct& given, Visitor visit) {
+  const Structure& structure = Structure::Of(given);
+  for (std::size_t index = 0; index < structure.GetFieldCount(); ++index) {
+    visit(structure.GetFieldName(index), structure.GetValue(index));
   }
 }
+
+/// The fields that are shown of structures, by their names.
+class Selection {
+ public:
+  explicit Selection(std::vector<std::string> names) : names_(std::move(names)) {}
+
+  /// The same with each of them; a value that is not there where @p given has no such field.
+  template <class Visitor>
+  void ForEachField(const MetaObj::MetaStruct& given, Visitor visit) {
+    const Structure& structure = Structure::Of(given);
+    FindIn(structure.GetShape());
+    for (std::size_t index = 0; index < names_.size(); ++index) {
+      visit(names_[index], structure.GetValue(places_[index]));
+    }
+  }
+
+ private:
+  /// Most structures have the shape of those before them.
+  void FindIn(const Shape& shape) {
+    if (shape_ == &shape) return;
+    places_.clear();
+    for (const std::string& name : names_) places_.push_back(shape.Find(name));
+    shape_ = &shape;
+  }
+
+  std::vector<std::string> names_;
+  std::vector<std::size_t> places_;
+  const Shape* shape_ = nullptr;
+};
+
 /// Calls @p visit for the object, or for each element of a list.
 template <class Visitor>
 void ForEachElement(const MetaObj::MetaObject& object, Visitor visit) {

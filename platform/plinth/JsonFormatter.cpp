@@ -80,50 +80,39 @@ void WriteReason(const Reason& reason, Sink& sink) {
   sink.Write("}");
 }
 
-/// @p fields limits structures, unless it is empty; a field that the structure lacks is null.
-void WriteValue(const MetaObj::MetaObject* value, const std::vector<std::string>& fields, Sink& sink);
+/// @p selection is of structures; null for all that they have.
+void WriteValue(const Value& value, Selection* selection, Sink& sink);
 
-void WriteStructure(const MetaObj::MetaStruct& structure, const std::vector<std::string>& fields,
-                    Sink& sink) {
+void WriteStructure(const MetaObj::MetaStruct& structure, Selection* selection, Sink& sink) {
   sink.Write("{");
   Separator separator(sink);
-  ForEachField(structure, fields, [&](const std::string& name, const MetaObj::MetaObject* field) {
+  const auto write = [&](const std::string& name, const Value& field) {
     separator.Next();
     WriteString(name, sink);
     sink.Write(": ");
-    WriteValue(field, {}, sink);
-  });
+    WriteValue(field, nullptr, sink);
+  };
+  selection ? selection->ForEachField(structure, write) : ForEachField(structure, write);
   sink.Write("}");
 }
 
-/// Writes a scalar as @p write does, or null where it has no value.
-template <class Scalar, class Writer>
-void WriteScalar(const MetaObj::MetaObject& value, Sink& sink, Writer write) {
-  const auto& scalar = static_cast<const Scalar&>(value);
-  if (!scalar.HasValue()) return sink.Write("null");
-  write(scalar.GetValue());
-}
-
-void WriteValue(const MetaObj::MetaObject* value, const std::vector<std::string>& fields, Sink& sink) {
-  if (!value) return sink.Write("null");
-  switch (value->GetType()) {
+void WriteValue(const Value& value, Selection* selection, Sink& sink) {
+  if (!value.hasValue) return sink.Write("null");
+  switch (value.type) {
     case MetaType::Bool:
-      return WriteScalar<MetaObj::MetaBool>(*value, sink,
-                                            [&](bool truth) { sink.Write(truth ? "true" : "false"); });
+      return sink.Write(value.truth ? "true" : "false");
     case MetaType::Int:
-      return WriteScalar<MetaObj::MetaInt>(*value, sink,
-                                           [&](long long number) { sink.Write(std::to_string(number)); });
+      return sink.Write(std::to_string(value.number));
     case MetaType::String:
-      return WriteScalar<MetaObj::MetaString>(*value, sink,
-                                              [&](const std::string& text) { WriteString(text, sink); });
+      return WriteString(value.text, sink);
     case MetaType::Struct:
-      return WriteStructure(static_cast<const MetaObj::MetaStruct&>(*value), fields, sink);
+      return WriteStructure(static_cast<const MetaObj::MetaStruct&>(*value.object), selection, sink);
     case MetaType::List: {
       sink.Write("[");
       Separator separator(sink);
-      ForEachElement(*value, [&](const MetaObj::MetaObject& element) {
+      ForEachElement(*value.object, [&](const MetaObj::MetaObject& element) {
         separator.Next();
-        WriteValue(&element, fields, sink);
+        WriteValue(ValueOf(element), selection, sink);
       });
       return sink.Write("]");
     }
@@ -140,7 +129,9 @@ void WriteJson(const Report& report, Sink& sink) {
   if (!report.notes.empty()) WriteList("notes", report.notes, sink, WriteString);
   if (report.calls) WriteList("calls", *report.calls, sink, WriteString);
   sink.Write(", \"result\": ");
-  WriteValue(report.result, report.fields, sink);
+  Selection selection(report.fields);
+  WriteValue(report.result ? ValueOf(*report.result) : Value{}, report.fields.empty() ? nullptr : &selection,
+             sink);
   sink.Write("}\n");
 }
 

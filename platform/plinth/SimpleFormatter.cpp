@@ -1,3 +1,5 @@
+#include <optional>
+
 #include "plinth/Formatter.h"
 #include "plinth/Text.h"
 #include "plinth/Tty.h"
@@ -10,35 +12,39 @@ namespace {
 struct Style {
   Style(const Report& report, const std::string& typeName)
       : type(typeName),
-        fields(ShownFields(report, typeName)),
         header(FindValue(report.settings, "header:" + typeName)),
-        isColored(report.isColored) {}
+        isColored(report.isColored) {
+    std::vector<std::string> names = ShownFields(report, typeName);
+    if (!names.empty()) fields.emplace(std::move(names));
+  }
 
   std::string type;
-  std::vector<std::string> fields;
+  /// All where there is none.
+  std::optional<Selection> fields;
   /// Null where they have none.
   const std::string* header;
   bool isColored;
 };
 
-void WriteStructure(const Style& style, const MetaObj::MetaStruct& structure, Sink& sink) {
+void WriteStructure(Style& style, const MetaObj::MetaStruct& structure, Sink& sink) {
   std::string space;
+  std::string text;
   if (style.header) {
     const auto lookup = [&](std::string_view name, std::string& value) {
-      const MetaObj::MetaObject* field = FindField(structure, std::string(name));
-      if (field) value = ValueText(field, space);
-      return field != nullptr;
+      const std::size_t place = Structure::Of(structure).GetShape().Find(name);
+      value = ValueText(Structure::Of(structure).GetValue(place), space);
+      return place != Shape::kNone;
     };
     const std::string header = Expand(*style.header, lookup);
-    sink.Write(style.isColored ? kHeading + header + kPlain + '\n' : header + '\n');
+    text += style.isColored ? kHeading + header + kPlain + '\n' : header + '\n';
   }
-  ForEachField(structure, style.fields, [&](const std::string& name, const MetaObj::MetaObject* field) {
-    sink.Write("   ");
-    sink.Write(Visible(name));
-    sink.Write(": ");
-    sink.Write(ValueText(field, space));
-    sink.Write("\n");
-  });
+  const auto append = [&](const std::string& name, const Value& field) {
+    text += "   ";
+    PlainLength(name) == name.size() ? text += name : text += Visible(name);
+    text.append(": ").append(ValueText(field, space)) += '\n';
+  };
+  style.fields ? style.fields->ForEachField(structure, append) : ForEachField(structure, append);
+  sink.Write(text);
 }
 
 }  // namespace

@@ -9,7 +9,6 @@ namespace Plinth {
 namespace {
 
 struct Column {
-  std::string field;
   /// The field's name as shown.
   std::string title;
   bool right = false;
@@ -36,12 +35,14 @@ void Fit(std::vector<Column>& columns, std::size_t width) {
   for (; whole > width; --whole) --std::max_element(columns.begin(), columns.end(), narrower)->width;
 }
 
-/// Writes one row; @p cell gives the text of a column. @p line is made anew, in the room that it has.
-template <class Cell>
-void WriteRow(const std::vector<Column>& columns, std::string& line, Sink& sink, Cell cell) {
-  line.clear();
-  for (const Column& column : columns) {
-    std::string_view text = cell(column);
+/// Puts rows together, each in the room of the one before it.
+class RowWriter {
+ public:
+  RowWriter(const std::vector<Column>& columns, Sink& sink) : columns_(columns), sink_(sink) {}
+
+  /// The text of the next column.
+  void Append(std::string_view text) {
+    const Column& column = columns_[next_];
     std::size_t width = DisplayWidth(text);
     std::string shortened;
     if (width > column.width) {
@@ -49,30 +50,30 @@ void WriteRow(const std::vector<Column>& columns, std::string& line, Sink& sink,
       width = DisplayWidth(text);
     }
     const std::size_t padding = column.width > width ? column.width - width : 0;
-    if (&column != columns.data()) line += "  ";
-    if (column.right) line.append(padding, ' ');
-    line += text;
-    if (!column.right) line.append(padding, ' ');
+    if (next_ != 0) line_ += "  ";
+    if (column.right) line_.append(padding, ' ');
+    line_ += text;
+    if (!column.right) line_.append(padding, ' ');
+    ++next_;
   }
-  line.erase(line.find_last_not_of(' ') + 1);
-  sink.Write(line += '\n');
-}
+  void End() {
+    line_.erase(line_.find_last_not_of(' ') + 1);
+    sink_.Write(line_ += '\n');
+    line_.clear();
+    next_ = 0;
+  }
 
-std::vector<Column> Columns(const Report& report, const MetaObj::MetaStruct& structure) {
-  std::vector<Column> columns;
-  ForEachField(structure, ShownFields(report, structure.GetTypeName()),
-               [&](const std::string& name, const MetaObj::MetaObject* field) {
-                 const std::string title = Visible(name);
-                 const bool right = field && field->GetType() == MetaObj::MetaType::Int;
-                 columns.push_back({name, title, right, report.hasHeader ? DisplayWidth(title) : 0});
-               });
-  return columns;
-}
+ private:
+  const std::vector<Column>& columns_;
+  Sink& sink_;
+  std::string line_;
+  std::size_t next_ = 0;
+};
 
-/// As ValueText.
-std::string_view Cell(const MetaObj::MetaObject& element, const Column& column, std::string& space) {
-  if (element.GetType() != MetaObj::MetaType::Struct) return "";
-  return ValueText(FindField(static_cast<const MetaObj::MetaStruct&>(element), column.field), space);
+/// The names of the columns, as @p structure declares them where none are chosen.
+std::vector<std::string> FieldsOf(const Report& report, const MetaObj::MetaStruct& structure) {
+  std::vector<std::string> fields = ShownFields(report, structure.GetTypeName());
+  return fields.empty() ? FieldNames(structure) : fields;
 }
 
 }  // namespace
@@ -80,26 +81,41 @@ std::string_view Cell(const MetaObj::MetaObject& element, const Column& column, 
 void WriteTable(const Report& report, Sink& sink) {
   const MetaObj::MetaStruct* structure = StructureOf(*report.result);
   if (!structure) return WritePlain(*report.result, sink);
-  std::vector<Column> columns = Columns(report, *structure);
+  Selection selection(FieldsOf(report, *structure));
+  std::vector<Column> columns;
+  selection.ForEachField(*structure, [&](const std::string& name, const Value& declared) {
+    const std::string title = Visible(name);
+    const bool right = declared.type == MetaObj::MetaType::Int;
+    columns.push_back({title, right, report.hasHeader ? DisplayWidth(title) : 0});
+  });
   std::string space;
+  const auto forEachCell = [&](const MetaObj::MetaObject& element, const auto& visit) {
+    std::size_t column = 0;
+    if (element.GetType() != MetaObj::MetaType::Struct) return;
+    selection.ForEachField(
+        static_cast<const MetaObj::MetaStruct&>(element),
+        [&](const std::string&, const Value& value) { visit(columns[column++], ValueText(value, space)); });
+  };
   // The widths are known only when every cell was seen. Most texts are shown as they are, so that making the
   // others twice costs less than keeping all.
   ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
-    for (Column& column : columns) {
-      column.width = std::max(column.width, DisplayWidth(Cell(element, column, space)));
-    }
+    forEachCell(element, [](Column& column, std::string_view text) {
+      column.width = std::max(column.width, DisplayWidth(text));
+    });
   });
   Fit(columns, report.width);
-  std::string line;
+  RowWriter rows(columns, sink);
   if (report.hasHeader) {
     if (report.isColored) sink.Write(kHeading);
-    WriteRow(columns, line, sink, [](const Column& column) { return std::string_view(column.title); });
+    for (const Column& column : columns) rows.Append(column.title);
+    rows.End();
     if (report.isColored) sink.Write(kPlain);
-    WriteRow(columns, line, sink,
-             [&](const Column& column) { return std::string_view(space.assign(column.width, '-')); });
+    for (const Column& column : columns) rows.Append(space.assign(column.width, '-'));
+    rows.End();
   }
   ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
-    WriteRow(columns, line, sink, [&](const Column& column) { return Cell(element, column, space); });
+    forEachCell(element, [&](const Column&, std::string_view text) { rows.Append(text); });
+    rows.End();
   });
 }
 

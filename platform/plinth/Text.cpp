@@ -5,6 +5,7 @@
 #include <wchar.h>
 
 #include <algorithm>
+#include <cstdint>
 #include <cstdio>
 #include <cstring>
 
@@ -27,8 +28,17 @@ Character DecodeUtf8(std::string_view text, std::size_t at) {
 }
 
 std::size_t PlainLength(std::string_view text) {
-  const auto isPlain = [](char byte) { return byte >= ' ' && byte <= '~'; };
-  return static_cast<std::size_t>(std::find_if_not(text.begin(), text.end(), isPlain) - text.begin());
+  // Eight bytes at a time, of which each is looked at by its highest bit.
+  constexpr std::uint64_t kEach = 0x0101010101010101;
+  std::size_t length = 0;
+  for (std::uint64_t bytes; text.size() - length >= sizeof bytes; length += sizeof bytes) {
+    std::memcpy(&bytes, text.data() + length, sizeof bytes);
+    const std::uint64_t isBelowBlank = bytes - ' ' * kEach;
+    const std::uint64_t isAboveTilde = bytes + (0x7f - '~') * kEach;
+    if (((isBelowBlank | isAboveTilde | bytes) & 0x80 * kEach) != 0) break;
+  }
+  while (length < text.size() && text[length] >= ' ' && text[length] <= '~') ++length;
+  return length;
 }
 
 std::string Visible(std::string_view text, Lines lines) {
