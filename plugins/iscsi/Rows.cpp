@@ -8,6 +8,10 @@ using Plinth::MetaObj::MetaList;
 using Plinth::MetaObj::MetaString;
 using Plinth::MetaObj::MetaStruct;
 
+Names::Names(const Structure& structure) : type(structure.name) {
+  for (const Field& field : structure.fields) fields.emplace_back(field.name);
+}
+
 StructPtr NewPrototype(const Structure& structure) {
   StructPtr prototype = MetaStruct::New(structure.name);
   for (const Field& field : structure.fields) {

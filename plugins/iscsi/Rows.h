@@ -15,7 +15,9 @@
 #include <cstddef>
 #include <functional>
 #include <span>
+#include <string>
 #include <type_traits>
+#include <vector>
 
 namespace TessaroCli {
 
@@ -39,13 +41,13 @@ struct Column {
   using RowSource = Source;
 
   Field field;
-  void (*set)(Plinth::MetaObj::MetaStruct& row, const char* name, const Source& source);
+  void (*set)(Plinth::MetaObj::MetaStruct& row, const std::string& name, const Source& source);
 
   /// @p Get is a lambda without captures that takes the source and yields a bool, a number or a text.
   template <class Get>
   constexpr Column(const char* name, Get)
       : field{name, TypeOf<std::invoke_result_t<Get, const Source&>>()},
-        set([](Plinth::MetaObj::MetaStruct& row, const char* fieldName, const Source& source) {
+        set([](Plinth::MetaObj::MetaStruct& row, const std::string& fieldName, const Source& source) {
           using Value = std::invoke_result_t<Get, const Source&>;
           if constexpr (TypeOf<Value>() == MetaType::Int) {
             row.SetField(fieldName, static_cast<long long>(Get{}(source)));
@@ -78,17 +80,30 @@ inline constexpr auto kFieldsOf = [] {
   return fields;
 }();
 
+/// The names of a structure and its fields, as rows take them: made once for all of them.
+struct Names {
+  explicit Names(const Structure& structure);
+
+  std::string type;
+  std::vector<std::string> fields;
+};
+
 /// A structure, and the columns that make rows of it from a Source.
 template <class Source>
 struct RowStructure : Structure {
   std::span<const Column<Source>> columns;
+  const Names& (*names)(const Structure& structure);
 };
 
 /// The structure @p name with a field for each of the @p columns.
 template <const auto& columns>
 constexpr auto StructureOf(const char* name) {
   using Source = typename std::remove_cvref_t<decltype(columns[0])>::RowSource;
-  return RowStructure<Source>{{name, kFieldsOf<columns>}, columns};
+  return RowStructure<Source>{
+      {name, kFieldsOf<columns>}, columns, [](const Structure& structure) -> const Names& {
+        static const Names names(structure);
+        return names;
+      }};
 }
 
 /// A fresh structure with a field of each type and no values.
@@ -99,8 +114,11 @@ ListPtr NewList(const StructPtr& element);
 /// A row with all its fields set from @p source, in the order of the columns.
 template <class Source>
 StructPtr NewRow(const RowStructure<Source>& structure, const std::type_identity_t<Source>& source) {
-  StructPtr row = Plinth::MetaObj::MetaStruct::New(structure.name);
-  for (const Column<Source>& column : structure.columns) column.set(*row, column.field.name, source);
+  const Names& names = structure.names(structure);
+  StructPtr row = Plinth::MetaObj::MetaStruct::New(names.type);
+  for (std::size_t i = 0; i < names.fields.size(); ++i) {
+    structure.columns[i].set(*row, names.fields[i], source);
+  }
   return row;
 }
 

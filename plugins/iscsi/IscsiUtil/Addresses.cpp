@@ -1,6 +1,7 @@
 #include <arpa/inet.h>
 
 #include <cstdlib>
+#include <new>
 #include <optional>
 #include <sstream>
 
@@ -63,10 +64,16 @@ TargetAddress IscsiTools::GetTargetAddressFromString(const std::string& text) {
 }
 
 std::string IscsiTools::GetStringFromTargetAddress(const TargetAddress& address) {
-  std::ostringstream text;  // how a host is written is the library's, by its stream operator
+  // How a host is written is the library's, by its stream operator. Making a stream costs far more than what
+  // is written to it.
+  static std::ostringstream stream;
+  stream.clear();
+  stream.str({});
+  if (!(stream << address.host)) throw std::bad_alloc();  // there is no other reason
   const bool bracketed = address.host.GetFamily() == AddressFamily::Ipv6;
-  text << (bracketed ? "[" : "") << address.host << (bracketed ? "]:" : ":") << address.port;
-  return text.str();
+  std::string text(bracketed ? "[" : "");
+  text.append(stream.view()).append(bracketed ? "]:" : ":").append(std::to_string(address.port));
+  return text;
 }
 
 IpConfig IscsiTools::GetIpConfigFromString(const std::string& address, const std::string& netmask) {

@@ -8,7 +8,7 @@ namespace {
 struct Listed {
   const ImaWalk::Adapter& adapter;
   IMA_OID oid;
-  IMA_STATIC_DISCOVERY_TARGET_PROPERTIES properties;
+  const IMA_STATIC_DISCOVERY_TARGET_PROPERTIES& properties;
 };
 
 std::string AddressOf(const Listed& listed) {

@@ -13,8 +13,8 @@ using Status = IMA_TSR_CONNECTION_STATUS;
 
 struct Listed {
   const ImaWalk::Session& session;
-  Properties properties;
-  Status status;
+  const Properties& properties;
+  const Status& status;
 };
 
 constexpr char kNotAvailable[] = "Not Available";
