@@ -36,6 +36,10 @@ class Cursor {
   Cursor(std::string_view bytes, std::size_t document);
   /// Goes on to the next element; false behind the last one.
   bool Next(Element& element);
+  /// The place of the element that comes next.
+  std::size_t Place() const { return next_; }
+  /// Goes to @p place, where an element of the document begins.
+  void GoTo(std::size_t place) { next_ = place; }
   /// The place behind the last element.
   std::size_t End() const { return end_; }
 

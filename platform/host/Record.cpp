@@ -28,14 +28,34 @@ constexpr int kMostDepth = 16;  // twice that of any kind of object
 
 bool HoldsElements(Type type) { return type == Type::Document || type == Type::Array; }
 
-/// The element of @p key in the document at @p document.
-std::optional<Element> Member(std::string_view bytes, std::size_t document, std::string_view key) {
-  Cursor cursor(bytes, document);
-  for (Element element; cursor.Next(element);) {
+/// Sets @p element to that of @p key, where it is one of those from the cursor's up to @p end.
+bool FindKey(Cursor& cursor, std::size_t end, std::string_view key, Element& element) {
+  while (cursor.Place() != end && cursor.Next(element)) {
     // Without a call for those of another length, which most are.
-    if (element.key.size() == key.size() && element.key == key) return element;
+    if (element.key.size() == key.size() && element.key == key) return true;
   }
-  return {};
+  return false;
+}
+
+/// The same in the document at @p document.
+bool FindMember(std::string_view bytes, std::size_t document, std::string_view key, Element& element) {
+  Cursor cursor(bytes, document);
+  return FindKey(cursor, cursor.End(), key, element);
+}
+
+/// The same of a whole record, from @p place on, which becomes that of the element: most keys are asked for
+/// in the order in which they are stored.
+bool FindMemberFrom(std::size_t& place, std::string_view bytes, std::string_view key, Element& element) {
+  Cursor cursor(bytes, 0);
+  const std::size_t begin = cursor.Place();
+  const std::size_t middle = std::max(begin, place);
+  cursor.GoTo(middle);
+  if (!FindKey(cursor, cursor.End(), key, element)) {
+    cursor.GoTo(begin);
+    if (!FindKey(cursor, middle, key, element)) return false;
+  }
+  place = element.begin;
+  return true;
 }
 
 /// Takes the first part off @p path.
@@ -64,7 +84,8 @@ Way WayTo(std::string_view bytes, std::string_view path) {
   Way way;
   for (;;) {
     way.key = FirstOf(path);
-    way.element = Member(bytes, way.documents[way.depth - 1], way.key);
+    way.element.emplace();
+    if (!FindMember(bytes, way.documents[way.depth - 1], way.key, *way.element)) way.element.reset();
     way.rest = path;
     if (path.empty() || !way.element || !HoldsElements(way.element->type)) return way;
     if (way.depth == kMostDepth) TooDeep();
@@ -82,12 +103,6 @@ void Splice(std::string& bytes, const Way& way, std::size_t begin, std::size_t e
     const std::size_t size = static_cast<std::size_t>(bson::Int32At(bytes, place)) + bytes.size() - before;
     bytes.replace(place, sizeof(std::int32_t), bson::Number32(static_cast<std::int32_t>(size)));
   }
-}
-
-Element At(std::string_view bytes, std::string_view path) {
-  const Way way = WayTo(bytes, path);
-  if (!way.IsFound()) Damaged(path, "has nothing");
-  return *way.element;
 }
 
 std::size_t CountOf(std::string_view bytes, std::size_t document) {
@@ -160,14 +175,34 @@ Record Record::Stored(std::string_view bytes) {
 void Record::Restore(std::string_view bytes) {
   if (Cursor(bytes, 0).End() + 1 != bytes.size()) bson::Damaged();
   bytes_ = bytes;
+  lastFound_ = 0;
 }
 
 Json Record::GetJson() const { return JsonOf(bytes_, 0, false, 1); }
 
-bool Record::Has(std::string_view path) const { return WayTo(bytes_, path).IsFound(); }
+bool Record::Find(std::string_view path, Element& element) const {
+  if (!FindMemberFrom(lastFound_, bytes_, FirstOf(path), element)) return false;
+  for (std::size_t depth = 1; !path.empty(); ++depth) {
+    if (!HoldsElements(element.type)) return false;
+    if (depth == kMostDepth) TooDeep();
+    if (!FindMember(bytes_, element.value, FirstOf(path), element)) return false;
+  }
+  return true;
+}
+
+Element Record::At(std::string_view path) const {
+  Element element;
+  if (!Find(path, element)) Damaged(path, "has nothing");
+  return element;
+}
+
+bool Record::Has(std::string_view path) const {
+  Element element;
+  return Find(path, element);
+}
 
 std::string Record::GetString(std::string_view path) const {
-  const Element element = At(bytes_, path);
+  const Element element = At(path);
   if (element.type != Type::Text) Damaged(path, "has no text");
   const std::string_view text = bson::TextOf(bytes_, element);
   if (!IsUtf8(text)) Damaged(path, "has no text");
@@ -175,7 +210,7 @@ std::string Record::GetString(std::string_view path) const {
 }
 
 std::int64_t Record::GetInt64(std::string_view path) const {
-  const Element element = At(bytes_, path);
+  const Element element = At(path);
   if (element.type == Type::Int32) return bson::Int32At(bytes_, element.value);
   if (element.type != Type::Int64) Damaged(path, "has no whole number");
   return bson::Int64At(bytes_, element.value);
@@ -189,7 +224,7 @@ int Record::GetInt(std::string_view path) const {
 }
 
 bool Record::GetBool(std::string_view path) const {
-  const Element element = At(bytes_, path);
+  const Element element = At(path);
   if (element.type != Type::Boolean) Damaged(path, "has neither true nor false");
   return BooleanAt(bytes_, element);
 }
@@ -201,18 +236,19 @@ int Record::GetWord(std::string_view path, std::span<const std::string_view> wor
 }
 
 std::size_t Record::GetSize(std::string_view path) const {
-  const Element list = At(bytes_, path);
+  const Element list = At(path);
   if (list.type != Type::Array) Damaged(path, "has no list");
   return CountOf(bytes_, list.value);
 }
 
 Record Record::GetRecord(std::string_view path) const {
-  const Element element = At(bytes_, path);
+  const Element element = At(path);
   if (element.type != Type::Document) Damaged(path, "has no record");
   return Record(bytes_.substr(element.value, element.end - element.value));
 }
 
 void Record::Put(std::string_view path, Type type, std::string_view value) {
+  lastFound_ = 0;
   const Way way = WayTo(bytes_, path);
   const std::size_t document = way.documents[way.depth - 1];
   if (!way.element && way.inArray && way.key != std::to_string(CountOf(bytes_, document))) {
@@ -262,6 +298,7 @@ std::string Record::NextOf(std::string_view path) const {
 void Record::Erase(std::string_view path) {
   const Way way = WayTo(bytes_, path);
   if (!way.IsFound()) return;
+  lastFound_ = 0;
   std::size_t end = way.element->end;
   std::string moved;
   if (way.inArray) {

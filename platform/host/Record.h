@@ -22,8 +22,9 @@ namespace host {
 using Json = nlohmann::ordered_json;
 
 namespace bson {
+struct Element;
 enum class Type : unsigned char;
-}
+}  // namespace bson
 
 class Record {
  public:
@@ -36,7 +37,7 @@ class Record {
   /// Becomes that one, in the memory that it has.
   void Restore(std::string_view bytes);
   const std::string& Bytes() const { return bytes_; }
-  bool operator==(const Record&) const = default;
+  bool operator==(const Record& other) const { return bytes_ == other.bytes_; }
 
   bool Has(std::string_view path) const;
   std::string GetString(std::string_view path) const;
@@ -69,11 +70,16 @@ class Record {
 
  private:
   explicit Record(std::string bytes) : bytes_(std::move(bytes)) {}
+  /// Sets @p element to what is at @p path; false where that is nothing.
+  bool Find(std::string_view path, bson::Element& element) const;
+  bson::Element At(std::string_view path) const;
   void Put(std::string_view path, bson::Type type, std::string_view value);
   /// The path of the element that the list at @p path does not have yet.
   std::string NextOf(std::string_view path) const;
 
   std::string bytes_;
+  /// The place of the member that was found last, or 0.
+  mutable std::size_t lastFound_ = 0;
 };
 
 }  // namespace host

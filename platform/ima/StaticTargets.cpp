@@ -9,8 +9,8 @@ using host::Tree;
 
 namespace {
 
-IMA_HOST_ID HostId(const std::string& host) {
-  IMA_HOST_ID id{};
+/// @p id is all zeros.
+void SetHost(IMA_HOST_ID& id, const std::string& host) {
   const IMA_IP_ADDRESS address = ima::Address(host);
   if (address.ipv4Address || host::ParseIpv6(host)) {
     id.id.ipAddress = address;
@@ -18,7 +18,6 @@ IMA_HOST_ID HostId(const std::string& host) {
     id.hostnameInUse = IMA_TRUE;
     ima::SetWide(id.id.hostname, host);
   }
-  return id;
 }
 
 }  // namespace
@@ -44,7 +43,7 @@ extern "C" IMA_STATUS IMA_GetStaticDiscoveryTargetProperties(
                              IMA_OBJECT_TYPE_STATIC_DISC_TARGET, properties,
                              [](Tree&, const Object& target, IMA_STATIC_DISCOVERY_TARGET_PROPERTIES& filled) {
                                ima::SetWide(filled.targetName, target.record.GetString("name"));
-                               filled.targetAddress = HostId(target.record.GetString("host"));
+                               SetHost(filled.targetAddress, target.record.GetString("host"));
                                filled.port = ima::Unsigned16(target.record, "port");
                                if (!target.record.Has("portalGroup")) return;
                                filled.tpgtPresent = 1;
