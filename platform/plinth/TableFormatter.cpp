@@ -35,24 +35,36 @@ void Fit(std::vector<Column>& columns, std::size_t width) {
   for (; whole > width; --whole) --std::max_element(columns.begin(), columns.end(), narrower)->width;
 }
 
+/// A text, and the columns that it takes.
+struct Cell {
+  Cell(std::string_view visible) : text(visible), width(DisplayWidth(visible)) {}
+  /// As ValueText.
+  Cell(const Value& value, std::string& space)
+      : text(ValueText(value, space)),
+        // Where nothing had to be escaped, that has been looked at.
+        width(text.data() == value.text.data() ? text.size() : DisplayWidth(text)) {}
+
+  std::string_view text;
+  std::size_t width;
+};
+
 /// Puts rows together, each in the room of the one before it.
 class RowWriter {
  public:
   RowWriter(const std::vector<Column>& columns, Sink& sink) : columns_(columns), sink_(sink) {}
 
   /// The text of the next column.
-  void Append(std::string_view text) {
+  void Append(Cell cell) {
     const Column& column = columns_[next_];
-    std::size_t width = DisplayWidth(text);
     std::string shortened;
-    if (width > column.width) {
-      text = shortened = Shortened(text, column.width);
-      width = DisplayWidth(text);
+    if (cell.width > column.width) {
+      shortened = Shortened(cell.text, column.width);
+      cell = Cell(shortened);
     }
-    const std::size_t padding = column.width > width ? column.width - width : 0;
+    const std::size_t padding = column.width > cell.width ? column.width - cell.width : 0;
     if (next_ != 0) line_ += "  ";
     if (column.right) line_.append(padding, ' ');
-    line_ += text;
+    line_ += cell.text;
     if (!column.right) line_.append(padding, ' ');
     ++next_;
   }
@@ -94,27 +106,26 @@ void WriteTable(const Report& report, Sink& sink) {
     if (element.GetType() != MetaObj::MetaType::Struct) return;
     selection.ForEachField(
         static_cast<const MetaObj::MetaStruct&>(element),
-        [&](const std::string&, const Value& value) { visit(columns[column++], ValueText(value, space)); });
+        [&](const std::string&, const Value& value) { visit(columns[column++], Cell(value, space)); });
   };
   // The widths are known only when every cell was seen. Most texts are shown as they are, so that making the
   // others twice costs less than keeping all.
   ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
-    forEachCell(element, [](Column& column, std::string_view text) {
-      column.width = std::max(column.width, DisplayWidth(text));
-    });
+    forEachCell(element,
+                [](Column& column, const Cell& cell) { column.width = std::max(column.width, cell.width); });
   });
   Fit(columns, report.width);
   RowWriter rows(columns, sink);
   if (report.hasHeader) {
     if (report.isColored) sink.Write(kHeading);
-    for (const Column& column : columns) rows.Append(column.title);
+    for (const Column& column : columns) rows.Append(std::string_view(column.title));
     rows.End();
     if (report.isColored) sink.Write(kPlain);
-    for (const Column& column : columns) rows.Append(space.assign(column.width, '-'));
+    for (const Column& column : columns) rows.Append(std::string_view(space.assign(column.width, '-')));
     rows.End();
   }
   ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
-    forEachCell(element, [&](const Column&, std::string_view text) { rows.Append(text); });
+    forEachCell(element, [&](const Column&, const Cell& cell) { rows.Append(cell); });
     rows.End();
   });
 }
