@@ -1,7 +1,8 @@
 #include "host/Targets.h"
 
 #include <algorithm>
-#include <set>
+#include <map>
+#include <unordered_set>
 
 #include "host/Description.h"
 #include "host/Error.h"
@@ -13,15 +14,19 @@ namespace {
 
 /// The portals of the adapter that lead to the target @p name: their names begin with it.
 std::vector<Record> PortalsTo(Tree& tree, std::int64_t adapter, const std::string& name) {
-  Statement statement(tree.GetStore(),
-                      "SELECT record FROM object WHERE parent = ? AND kind = ? AND name > ? AND name < ?"
-                      " ORDER BY id");
+  Statement statement(
+      tree.GetStore(),
+      "SELECT id, record FROM object WHERE parent = ? AND kind = ? AND name > ? AND name < ?");
   const std::string least = name + ' ';
   const std::string most = name + '!';  // what follows a blank
   statement.Bind(adapter).Bind(static_cast<std::int64_t>(Kind::StaticTarget)).Bind(least).Bind(most);
+  std::map<std::int64_t, Record> inOrder;
+  while (statement.Step()) {
+    Record portal = Record::Stored(statement.GetBytes(1));
+    if (portal.GetString("name") == name) inOrder.emplace(statement.GetInt(0), std::move(portal));
+  }
   std::vector<Record> portals;
-  while (statement.Step()) portals.push_back(Record::Stored(statement.GetBytes(0)));
-  std::erase_if(portals, [&](const Record& portal) { return portal.GetString("name") != name; });
+  for (auto& [id, portal] : inOrder) portals.push_back(std::move(portal));
   return portals;
 }
 
@@ -37,32 +42,41 @@ bool IsSamePlace(const Record& a, const Record& b) {
 
 }  // namespace
 
-KnownTarget GetTarget(Tree& tree, std::int64_t id) {
-  std::optional<Object> named = tree.Lookup(id);
-  if (!named || named->kind != Kind::StaticTarget) named = tree.Get(id, Kind::Target);
-  const std::string name = named->record.GetString("name");
-  KnownTarget target{.adapter = named->parent, .object = {}, .portals = PortalsTo(tree, named->parent, name)};
-  if (named->kind == Kind::StaticTarget) named = tree.Find(target.adapter, Kind::Target, name);
-  if (named) {
-    target.object = *std::move(named);
+KnownTarget GetTargetAlone(Tree& tree, std::int64_t id) {
+  const Object* const seen = tree.Look(id);
+  if (seen == nullptr || seen->kind != Kind::StaticTarget) {
+    const Object& own = tree.See(id, Kind::Target);
+    return {.adapter = own.parent, .object = own, .portals = {}};
+  }
+  KnownTarget target{.adapter = seen->parent, .object = {}, .portals = {}};
+  const std::string name = seen->record.GetString("name");
+  if (std::optional<Object> own = tree.Find(target.adapter, Kind::Target, name)) {
+    target.object = *std::move(own);
   } else {
     target.object.record = NewTarget(name);
   }
   return target;
 }
 
-std::int64_t OwnIdOf(Tree& tree, std::int64_t id) {
-  const std::optional<Object> named = tree.Lookup(id);
-  return named && named->kind == Kind::Target ? id : GetTarget(tree, id).object.id;
+KnownTarget GetTarget(Tree& tree, std::int64_t id) {
+  KnownTarget target = GetTargetAlone(tree, id);
+  target.portals = PortalsTo(tree, target.adapter, target.object.record.GetString("name"));
+  return target;
 }
 
+std::int64_t OwnIdOf(Tree& tree, std::int64_t id) { return GetTargetAlone(tree, id).object.id; }
+
 std::vector<std::int64_t> TargetIds(Tree& tree, std::int64_t adapter) {
-  std::vector<std::int64_t> ids = tree.ChildIds(adapter, Kind::Target);
-  std::set<std::string> seen;
-  for (const Object& portal : tree.Children(adapter, Kind::StaticTarget)) {
-    const std::string& name = portal.record.GetString("name");
-    if (seen.insert(name).second && !tree.Find(adapter, Kind::Target, name)) ids.push_back(portal.id);
+  std::vector<std::int64_t> ids;
+  std::unordered_set<std::string> seen;
+  {
+    Statement own(tree.GetStore(), "SELECT id, name FROM object WHERE parent = ? AND kind = ? ORDER BY id");
+    own.Bind(adapter).Bind(static_cast<std::int64_t>(Kind::Target));
+    for (; own.Step(); seen.emplace(own.GetText(1))) ids.push_back(own.GetInt(0));
   }
+  tree.ForEachChild(adapter, Kind::StaticTarget, [&](std::int64_t id, const Record& portal) {
+    if (seen.insert(portal.GetString("name")).second) ids.push_back(id);
+  });
   return ids;
 }
 

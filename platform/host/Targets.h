@@ -18,6 +18,8 @@ struct KnownTarget {
 
 /// The target that @p id names; an Error (NotFound, WrongObject) where there is none.
 KnownTarget GetTarget(Tree& tree, std::int64_t id);
+/// The same without its portals.
+KnownTarget GetTargetAlone(Tree& tree, std::int64_t id);
 /// The id of the object of its own that this target has; 0 where it has none. Errors as of GetTarget.
 std::int64_t OwnIdOf(Tree& tree, std::int64_t id);
 /// Those of the adapter @p adapter: first those with an object of their own.

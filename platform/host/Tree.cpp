@@ -102,12 +102,14 @@ Object Tree::Get(std::int64_t id, Kind kind) {
   return *std::move(object);
 }
 
+const Object* Tree::Look(std::int64_t id) {
+  if (const Object* seen = Seen(id)) return seen;
+  ReadAhead(id);
+  return Seen(id);
+}
+
 const Object& Tree::See(std::int64_t id, Kind kind) {
-  const Object* seen = Seen(id);
-  if (seen == nullptr) {
-    ReadAhead(id);
-    seen = Seen(id);
-  }
+  const Object* const seen = Look(id);
   Require(seen, kind);
   return *seen;
 }

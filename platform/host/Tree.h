@@ -39,6 +39,8 @@ class Tree {
   /// The same as Get without a copy, for walks: it stays until the next See, or a change. Who goes from one
   /// object to the next in their order has them read ahead.
   const Object& See(std::int64_t id, Kind kind);
+  /// The same of any kind; null where there is none.
+  const Object* Look(std::int64_t id);
   /// The child of that name (see NameOf), if there is one.
   std::optional<Object> Find(std::int64_t parent, Kind kind, std::string_view name);
   /// In order of place.

@@ -7,7 +7,8 @@
 namespace ima {
 
 IMA_UINT32 ReadLoginStatus(host::Tree& tree, const IMA_OID& targetOid) {
-  return Unsigned(GetTarget(tree, targetOid).object.record, "loginStatus");
+  const auto target = host::GetTargetAlone(tree, IdOfType(targetOid, IMA_OBJECT_TYPE_TARGET));
+  return Unsigned(target.object.record, "loginStatus");
 }
 
 namespace {
