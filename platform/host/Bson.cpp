@@ -61,9 +61,8 @@ bool Cursor::Next(Element& element) {
   element.begin = next_;
   element.type = static_cast<Type>(bytes_[next_]);
   const std::size_t key = next_ + 1;
-  std::size_t value = key;
-  while (bytes_[value++] != '\0') {  // there is a zero behind the last element, too
-  }
+  const std::size_t value =
+      key + std::strlen(bytes_.data() + key) + 1;  // there is a zero behind the last one, too
   if (value > end_) Damaged();
   element.key = bytes_.substr(key, value - 1 - key);
   std::size_t size = 0;

@@ -33,8 +33,16 @@ std::function<void(const std::string&)>& TraceSink() {
 }
 
 bool IsTraceWanted() {
-  const char* variable = std::getenv("HCLI_TRACE");
-  return variable != nullptr && std::strcmp(variable, "1") == 0;
+  // A walk makes thousands of calls, and in the middle of one nothing sets a variable.
+  static std::uint64_t asked = 0;
+  static bool isWanted = false;
+  const std::uint64_t reading = Reading::Current();
+  if (reading == 0 || reading != asked) {
+    const char* variable = std::getenv("HCLI_TRACE");
+    isWanted = variable != nullptr && std::strcmp(variable, "1") == 0;
+    asked = reading;
+  }
+  return isWanted;
 }
 
 void Trace(const Call& call, const std::string& outcome) {

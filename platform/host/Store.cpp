@@ -66,6 +66,7 @@ void RollBack(Store& store) {
 }
 
 int readings = 0;
+std::uint64_t lastReading = 0;  // the number of the one that was there first
 Store* kept = nullptr;  // the store with a transaction that is open for the sake of them
 time_t keptSince = 0;
 
@@ -379,7 +380,11 @@ bool Store::UndoAll() noexcept {
 
 std::int64_t Store::CountChanges() const { return sqlite3_total_changes64(database_); }
 
-Reading::Reading() { ++readings; }
+Reading::Reading() {
+  if (readings++ == 0) ++lastReading;
+}
+
+std::uint64_t Reading::Current() { return readings == 0 ? 0 : lastReading; }
 
 Reading::~Reading() {
   if (--readings > 0 || kept == nullptr) return;

@@ -144,6 +144,9 @@ class Reading {
   Reading(const Reading&) = delete;
   Reading& operator=(const Reading&) = delete;
   ~Reading();
+
+  /// A number of its own for all the time from the first of these to the last; 0 while there is none.
+  static std::uint64_t Current();
 };
 
 /// What runs in between happens whole, or not at all when Commit is not reached.

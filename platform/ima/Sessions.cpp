@@ -3,7 +3,7 @@
 
 #include <ima/ima_tsr.h>
 
-#include <cstdio>
+#include <charconv>
 
 #include "ima/Objects.h"
 
@@ -15,8 +15,12 @@ using host::Tree;
 namespace {
 
 void SetIsid(IMA_INITIATOR_SESSION_ID& isid, const std::string& text) {
+  if (text.size() != 2 * sizeof isid) {
+    throw host::Error(host::Error::Kind::Damaged, "the ISID of a session is not twelve digits");
+  }
   for (std::size_t i = 0; i < sizeof isid; ++i) {
-    isid[i] = static_cast<IMA_BYTE>(std::stoul(text.substr(2 * i, 2), nullptr, 16));
+    const char* const digits = text.data() + 2 * i;
+    std::from_chars(digits, digits + 2, isid[i], 16);
   }
 }
 
@@ -63,7 +67,11 @@ extern "C" IMA_STATUS IMA_GetSessionProperties(IMA_OID sessionOid, IMA_SESSION_P
   return ima::ReadProperties("IMA_GetSessionProperties", sessionOid, IMA_OBJECT_TYPE_SESSION, properties,
                              [](Tree&, const Object& session, IMA_SESSION_PROPERTIES& filled) {
                                const Record& record = session.record;
+                               // In the order in which they are stored, which is the fastest.
                                filled.associatedTargetOid = ima::Oid(IMA_OBJECT_TYPE_TARGET, session.parent);
+                               SetIsid(filled.isid, record.GetString("isid"));
+                               filled.tsih = ima::Unsigned16(record, "tsih");
+                               filled.targetPortalGroupTag = ima::Unsigned16(record, "targetPortalGroupTag");
                                filled.authMethod = ima::Unsigned(record, "authMethod");
                                filled.dataPduInOrder = ima::Bool(record, "dataPduInOrder");
                                filled.dataSequenceInOrder = ima::Bool(record, "dataSequenceInOrder");
@@ -73,12 +81,9 @@ extern "C" IMA_STATUS IMA_GetSessionProperties(IMA_OID sessionOid, IMA_SESSION_P
                                filled.firstBurstLength = ima::Unsigned(record, "firstBurstLength");
                                filled.immediateData = ima::Bool(record, "immediateData");
                                filled.initialR2T = ima::Bool(record, "initialR2T");
-                               SetIsid(filled.isid, record.GetString("isid"));
                                filled.maxBurstLength = ima::Unsigned(record, "maxBurstLength");
                                filled.maxConnections = ima::Unsigned(record, "maxConnections");
                                filled.maxOutstandingR2T = ima::Unsigned(record, "maxOutstandingR2T");
-                               filled.targetPortalGroupTag = ima::Unsigned16(record, "targetPortalGroupTag");
-                               filled.tsih = ima::Unsigned16(record, "tsih");
                              });
 }
 

@@ -3,7 +3,6 @@
 #include <text/text.h>
 
 #include <algorithm>
-#include <cstdio>
 #include <cstdlib>
 #include <memory>
 #include <new>
@@ -53,9 +52,9 @@ std::string AddressText(const IMA_IP_ADDRESS& address) {
 }
 
 std::string IsidText(const IMA_INITIATOR_SESSION_ID& isid) {
-  char text[32];
-  std::snprintf(text, sizeof text, "%02x%02x%02x%02x%02x%02x", isid[0], isid[1], isid[2], isid[3], isid[4],
-                isid[5]);
+  constexpr char kDigits[] = "0123456789abcdef";
+  std::string text;
+  for (const IMA_BYTE byte : isid) (text += kDigits[byte >> 4]) += kDigits[byte & 0xf];
   return text;
 }
 
