@@ -67,7 +67,7 @@ void RollBack(Store& store) {
 
 int readings = 0;
 std::uint64_t lastReading = 0;  // the number of the one that was there first
-Store* kept = nullptr;  // the store with a transaction that is open for the sake of them
+Store* kept = nullptr;          // the store with a transaction that is open for the sake of them
 time_t keptSince = 0;
 
 /// In seconds; asked for at each call, and so the clock that is read without counting.
