@@ -49,18 +49,28 @@ WriteReport WriteCsv;
 WriteReport WriteJson;
 WriteReport WriteYaml;
 
+enum class Form {
+  Text,
+  /// Records for a program, and nothing beside them.
+  Records,
+  /// One document with status and messages: it is written for failures too, and the command's default fields
+  /// do not limit it.
+  Document,
+};
+
 struct Formatter {
   const char* name;
   WriteReport* write;
-  /// One document with status and messages: it is written for failures too, and the command's default fields
-  /// do not limit it.
-  bool isDocument = false;
+  Form form = Form::Text;
 };
 
 /// Every formatter there is, in the order that help shows. The first is for whoever names none.
 inline constexpr Formatter kFormatters[] = {
-    {"simple", WriteSimple},   {"table", WriteTable},     {"csv", WriteCsv},
-    {"json", WriteJson, true}, {"yaml", WriteYaml, true},
+    {"simple", WriteSimple},
+    {"table", WriteTable},
+    {"csv", WriteCsv, Form::Records},
+    {"json", WriteJson, Form::Document},
+    {"yaml", WriteYaml, Form::Document},
 };
 
 std::vector<std::string> FormatterNames();

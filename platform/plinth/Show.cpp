@@ -11,9 +11,23 @@ namespace Plinth {
 
 namespace {
 
+/// A result that says no more than that all went well.
 bool IsPlainSuccess(const MetaObj::MetaObject& result) {
   const auto* const truth = dynamic_cast<const MetaObj::MetaBool*>(&result);
-  return truth && truth->HasValue() && truth->GetValue();
+  const auto* const text = dynamic_cast<const MetaObj::MetaString*>(&result);
+  return (truth && truth->HasValue() && truth->GetValue()) ||
+         (text && text->HasValue() && text->GetValue().empty());
+}
+
+/// What stands above a result in text forms, or in place of one.
+void WriteAbove(const Run& run, bool hasResult, Sink& sink) {
+  if (run.line != 0 && !IsQuiet(run) && (hasResult || run.calls)) {
+    sink.Write("line " + std::to_string(run.line) + (run.record.path.empty() ? "" : ": " + run.record.path) +
+               '\n');
+  }
+  if (!run.calls) return;
+  for (const std::string& call : *run.calls) sink.Write("dry run: " + Visible(call) + '\n');
+  if (run.calls->empty()) sink.Write("dry run: nothing would change\n");
 }
 
 void WriteMessages(const Run& run, Sink& error) {
@@ -31,18 +45,8 @@ void WriteMessages(const Run& run, Sink& error) {
     error.Write("hcli: " + Visible(run.place) + ": exit status " + std::to_string(record.status) + '\n');
   }
   if (isColored) error.Write(kPlain);
+  if (ChosenFormatter(run).form == Form::Records) WriteAbove(run, false, error);
   error.Flush();
-}
-
-/// What stands above a result in text forms, or in place of one.
-void WriteAbove(const Run& run, bool hasResult, Sink& out) {
-  if (run.line != 0 && !IsQuiet(run) && (hasResult || run.calls)) {
-    out.Write("line " + std::to_string(run.line) + (run.record.path.empty() ? "" : ": " + run.record.path) +
-              '\n');
-  }
-  if (!run.calls) return;
-  for (const std::string& call : *run.calls) out.Write("dry run: " + Visible(call) + '\n');
-  if (run.calls->empty()) out.Write("dry run: nothing would change\n");
 }
 
 void WriteResult(const Run& run, Sink& out) {
@@ -58,19 +62,19 @@ void WriteResult(const Run& run, Sink& out) {
   report.reasons = run.record.reasons;
   report.notes = run.record.notes;
   const Formatter& formatter = ChosenFormatter(run);
-  if (formatter.isDocument) {
+  if (formatter.form == Form::Document) {
     report.line = run.line;
     report.calls = run.calls ? &*run.calls : nullptr;
   } else {
     if (IsQuiet(run) && report.result && IsPlainSuccess(*report.result)) report.result = nullptr;
-    WriteAbove(run, report.result != nullptr, out);
+    if (formatter.form == Form::Text) WriteAbove(run, report.result != nullptr, out);
     if (!report.result) return;
   }
   report.fields = run.fields;
   report.hasHeader = !run.request.global.For("no-header").truth;
   report.width = run.console.OutScreen().columns;
   report.isColored = IsColored(run, report.width != 0);
-  if (run.text && report.isColored && !formatter.isDocument) {
+  if (run.text && report.isColored && formatter.form != Form::Document) {
     return out.Write(WithHeadings(Visible(run.text->GetValue(), Lines::Kept)));
   }
   report.settings = AutoCli::NodeData::Of(*run.request.node).formatterParameters;

@@ -73,10 +73,10 @@ Object Typed(const Object& value) {
 }  // namespace
 
 void CheckTyped(Run& run, const Given& given) {
-  if (!given.truth || ChosenFormatter(run).isDocument) return;
+  if (!given.truth || ChosenFormatter(run).form == Form::Document) return;
   std::vector<std::string> names;
   for (const Formatter& formatter : kFormatters) {
-    if (formatter.isDocument) names.push_back(std::string("--output ") + formatter.name);
+    if (formatter.form == Form::Document) names.push_back(std::string("--output ") + formatter.name);
   }
   throw UsageError("option --typed: it goes with " + Join(names, " or ") + "; other forms have texts alone");
 }

@@ -42,6 +42,10 @@ def batch():
     done = host.run("--dry-run --batch -", f"{SET}\n--dry-run=no {SET}\n{SET}\n")
     check(done.returncode == 2 and "cannot be for real" in done.stderr and done.stdout.count("line ") == 1, done)
     check(host.show() == before, "something stays")
+    # Records of several lines are one table for whoever reads them, and nothing stands between them.
+    get = "--fields ID,Alias iscsi adapter get -A"
+    done = host.run("--dry-run --output csv --no-header -q --batch -", f"{get} hba1\n{SET}\n{get} hba2\n")
+    check(done.stdout == "hba1,\nhba2,other\n" and "dry run: SetInitiatorAlias(hba2" in done.stderr, done)
 
 
 def nobody_waits():
