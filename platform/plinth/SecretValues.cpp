@@ -101,9 +101,10 @@ std::string Ask(Run& run, const Parameter& parameter) {
     if (run.console.ReadSecret(question, line)) return line;
     throw UsageError("option " + OptionName(parameter) + ": standard input ended before the value");
   };
-  std::string value = read(parameter.name);
+  const std::string name = parameter.name + (run.line == 0 ? "" : " of line " + std::to_string(run.line));
+  std::string value = read(name);
   // Nobody has seen what was typed.
-  if (run.console.IsAsking() && !IsFetcher(run) && read(parameter.name + " again") != value) {
+  if (run.console.IsAsking() && !IsFetcher(run) && read(name + " again") != value) {
     throw UsageError("option " + OptionName(parameter) + ": the two values differ, and neither is set");
   }
   return value;

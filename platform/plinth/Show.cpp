@@ -19,12 +19,18 @@ bool IsPlainSuccess(const MetaObj::MetaObject& result) {
          (text && text->HasValue() && text->GetValue().empty());
 }
 
-/// What stands above a result in text forms, or in place of one.
-void WriteAbove(const Run& run, bool hasResult, Sink& sink) {
-  if (run.line != 0 && !IsQuiet(run) && (hasResult || run.calls)) {
-    sink.Write("line " + std::to_string(run.line) + (run.record.path.empty() ? "" : ": " + run.record.path) +
-               '\n');
-  }
+/// What stands above all that a line of a batch shows, on a terminal above its reports too.
+void WriteHeading(const Run& run) {
+  const RunRecord& record = run.record;
+  const Form form = ChosenFormatter(run).form;
+  const bool hasResult = form == Form::Text && record.failure.empty() && (run.text || record.result);
+  if (run.line == 0 || IsQuiet(run) || form == Form::Document || (!hasResult && !run.calls)) return;
+  Sink& sink = form == Form::Records ? run.console.Error() : run.console.Out();
+  sink.Write("line " + std::to_string(run.line) + (record.path.empty() ? "" : ": " + record.path) + '\n');
+  if (record.status != kSuccess || !record.notes.empty()) sink.Flush();
+}
+
+void WriteCalls(const Run& run, Sink& sink) {
   if (!run.calls) return;
   for (const std::string& call : *run.calls) sink.Write("dry run: " + Visible(call) + '\n');
   if (run.calls->empty()) sink.Write("dry run: nothing would change\n");
@@ -45,7 +51,7 @@ void WriteMessages(const Run& run, Sink& error) {
     error.Write("hcli: " + Visible(run.place) + ": exit status " + std::to_string(record.status) + '\n');
   }
   if (isColored) error.Write(kPlain);
-  if (ChosenFormatter(run).form == Form::Records) WriteAbove(run, false, error);
+  if (ChosenFormatter(run).form == Form::Records) WriteCalls(run, error);
   error.Flush();
 }
 
@@ -67,7 +73,7 @@ void WriteResult(const Run& run, Sink& out) {
     report.calls = run.calls ? &*run.calls : nullptr;
   } else {
     if (IsQuiet(run) && report.result && IsPlainSuccess(*report.result)) report.result = nullptr;
-    if (formatter.form == Form::Text) WriteAbove(run, report.result != nullptr, out);
+    if (formatter.form == Form::Text) WriteCalls(run, out);
     if (!report.result) return;
   }
   report.fields = run.fields;
@@ -102,6 +108,7 @@ bool Show(Run& run) {
     return false;
   }
   if (run.isBatch && run.record.failure.empty()) return true;
+  WriteHeading(run);
   WriteMessages(run, run.console.Error());
   if (MayPage(run)) {
     TextSink text;
