@@ -5,11 +5,13 @@
 #include <fstream>
 #include <set>
 
+#include "doctor/Doctor.h"
 #include "linux/Commands.h"
 #include "plinth/Declarations.h"
 #include "plinth/GlobalOptions.h"
 #include "plinth/OwnCommands.h"
 #include "simulator/Commands.h"
+#include "status/Status.h"
 #include "support/Harness.h"
 #include "support/ProjectFile.h"
 
@@ -79,15 +81,17 @@ void ExpectKnown(const Guide& guide, const Declared& declared) {
 }
 
 TEST(Guide, NamesWhatIsThere) {
-  const auto simulated = AutoCli::Namespace::New();
-  simulated->RegisterNamespaceNode(simulator::NewNamespace(), "simulator");
+  const auto others = AutoCli::Namespace::New();
+  others->RegisterNamespaceNode(simulator::NewNamespace(), "simulator");
+  others->RegisterNamespaceNode(linux::NewNamespace(), "linux");
+  others->RegisterNamespaceNode(TessaroCli::Status::NewStatus(), "status");
+  others->RegisterNamespaceNode(TessaroCli::Doctor::NewDoctor(), "doctor");
   const Declared all(CommandTree());
   ExpectKnown(ReadGuide(ProjectFile("plugins/iscsi/guide.yaml")), all);
   ExpectKnown(ReadGuide(ProjectFile("platform/plinth/guide.yaml")), all);
-  ExpectKnown(ReadGuide(ProjectFile("platform/simulator/guide.yaml")), Declared(*simulated));
-  const auto machine = AutoCli::Namespace::New();
-  machine->RegisterNamespaceNode(linux::NewNamespace(), "linux");
-  ExpectKnown(ReadGuide(ProjectFile("platform/linux/guide.yaml")), Declared(*machine));
+  for (const char* name : {"platform/linux", "platform/simulator", "plugins/status", "plugins/doctor"}) {
+    ExpectKnown(ReadGuide(ProjectFile(std::string(name) + "/guide.yaml")), Declared(*others));
+  }
 }
 
 TEST(Guide, IsAboutTheNearestPlace) {

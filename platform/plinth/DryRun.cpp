@@ -29,33 +29,34 @@ class Rehearsing {
       End();
       throw;
     }
-    isOn = true;
+    current = this;
   }
   Rehearsing(const Rehearsing&) = delete;
   Rehearsing& operator=(const Rehearsing&) = delete;
   ~Rehearsing() {
-    isOn = false;
+    current = nullptr;
     End();
   }
 
-  static bool IsOn() { return isOn; }
+  static bool IsOn() { return current != nullptr; }
+
+  /// Of the rehearsals that were begun: a command may have loaded one since.
+  static std::vector<std::string> TakeCalls() {
+    std::vector<std::string> calls;
+    for (Rehearsal* rehearsal : current->begun_) {
+      for (std::string& call : rehearsal->TakeCalls()) calls.push_back(std::move(call));
+    }
+    return calls;
+  }
 
  private:
   void End() {
     for (Rehearsal* rehearsal : begun_) rehearsal->End();
   }
 
-  static inline bool isOn = false;
+  static inline const Rehearsing* current = nullptr;
   std::vector<Rehearsal*> begun_;
 };
-
-std::vector<std::string> TakeCalls() {
-  std::vector<std::string> calls;
-  for (Rehearsal* rehearsal : Rehearsals()) {
-    for (std::string& call : rehearsal->TakeCalls()) calls.push_back(std::move(call));
-  }
-  return calls;
-}
 
 }  // namespace
 
@@ -79,7 +80,7 @@ void DryRun(Run& run, const Given& given, const Rest& rest) {
   std::optional<Rehearsing> rehearsing;
   if (!Rehearsing::IsOn()) rehearsing.emplace();
   rest();
-  if (run.record.executed) run.calls = TakeCalls();
+  if (run.record.executed) run.calls = Rehearsing::TakeCalls();
   run.record.notes.clear();  // what they tell of is undone
 }
 

@@ -1,5 +1,6 @@
 #include "plinth/Guide.h"
 
+#include <glob.h>
 #include <yaml.h>
 
 #include <cerrno>
@@ -193,6 +194,16 @@ const std::string& Guide::MeaningOf(const std::string& structure, const std::str
 Guide ReadGuide(const std::string& file) { return GuideReader(file).Read(); }
 
 void SetGuideFolder(const std::string& folder) { GuideFolder() = folder; }
+
+std::vector<std::string> GuideFiles() {
+  std::vector<std::string> files;
+  glob_t found{};
+  if (!GuideFolder().empty() && glob((GuideFolder() + "/*.yaml").c_str(), 0, nullptr, &found) == 0) {
+    files.assign(found.gl_pathv, found.gl_pathv + found.gl_pathc);
+  }
+  globfree(&found);
+  return files;
+}
 
 std::string GuideFile(const AutoCli::NamespaceNode& root, const std::string& path) {
   const std::string word = path.substr(0, path.find(' '));

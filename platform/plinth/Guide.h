@@ -65,6 +65,8 @@ Guide ReadGuide(const std::string& file);
 
 /// The folder that guides are in, from now on; empty, as at first, where there are none.
 void SetGuideFolder(const std::string& folder);
+/// All guides that are there, whether or not their plug-ins are, by name.
+std::vector<std::string> GuideFiles();
 
 /// The file of the guide to what stands at @p path under @p root; it need not exist. Empty where no file that
 /// was loaded brings it.

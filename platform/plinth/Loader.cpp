@@ -1,3 +1,5 @@
+#include "plinth/Loader.h"
+
 #include <dirent.h>
 #include <dlfcn.h>
 #include <sys/stat.h>
@@ -8,9 +10,9 @@
 #include <cstdio>
 #include <cstring>
 #include <memory>
+#include <optional>
 #include <string_view>
 
-#include "plinth/CommandLine.h"
 #include "plinth/Declarations.h"
 #include "plinth/Failure.h"
 #include "plinth/LibraryFile.h"
@@ -82,12 +84,42 @@ std::string FindClash(const Namespace& root, const Namespace& scratch) {
   return "";
 }
 
-/// Takes in what the file @p name registers, whole or not at all. Returns the trouble, or "".
-std::string TakeIn(Namespace& root, const std::string& folder, const std::string& name, PluginFolder whose) {
-  const std::string path = folder + '/' + name;
+std::optional<PluginPlace>& PlaceInUse() {
+  static std::optional<PluginPlace> place;
+  return place;
+}
+
+/// Why nothing is loaded from the folder, or "".
+std::string FolderFault(const PluginPlace& place) {
+  if (place.folder.empty() && place.whose == PluginFolder::BuiltIn) {
+    return "no plug-ins are loaded: where the program lies cannot be told without /proc; give their folder "
+           "with "
+           "--plugins";
+  }
+  const std::string fault = StrangerFault(place.folder, place.whose);
+  return fault.empty() ? "" : "the plug-in folder " + Quoted(place.folder) + " is left out: " + fault;
+}
+
+/// As FindPlugins, of a folder without a fault.
+std::string ListFolder(const std::string& folder, std::vector<std::string>& names) {
+  if (ListPlugins(folder, names)) return "";
+  return "cannot read the plug-in folder " + Quoted(folder) + ": " + std::strerror(errno);
+}
+
+}  // namespace
+
+const PluginPlace* PluginPlaceInUse() { return PlaceInUse() ? &*PlaceInUse() : nullptr; }
+
+std::string FindPlugins(const PluginPlace& place, std::vector<std::string>& names) {
+  const std::string fault = FolderFault(place);
+  return fault.empty() ? ListFolder(place.folder, names) : fault;
+}
+
+std::string TakeInPlugin(Namespace& root, const PluginPlace& place, const std::string& name) {
+  const std::string path = place.folder + '/' + name;
   // What a plug-in registers before it fails goes with this namespace.
   const auto scratch = Namespace::New();
-  std::string trouble = StrangerFault(path, whose);
+  std::string trouble = StrangerFault(path, place.whose);
   if (trouble.empty()) trouble = LibraryFault(path);
   if (trouble.empty()) trouble = LoadFile(path, scratch);
   if (trouble.empty()) trouble = FindClash(root, *scratch);
@@ -99,34 +131,24 @@ std::string TakeIn(Namespace& root, const std::string& folder, const std::string
   return "";
 }
 
-}  // namespace
-
 std::vector<std::string> LoadPlugins(Namespace& root, const std::string& folder, PluginFolder whose,
                                      const std::string& first) {
-  if (folder.empty() && whose == PluginFolder::BuiltIn) {
-    return {
-        "no plug-ins are loaded: where the program lies cannot be told without /proc; give their folder with "
-        "--plugins"};
-  }
-  if (const std::string fault = StrangerFault(folder, whose); !fault.empty()) {
-    return {"the plug-in folder " + Quoted(folder) + " is left out: " + fault};
-  }
+  const PluginPlace place{folder, whose};
+  PlaceInUse() = place;
+  if (const std::string fault = FolderFault(place); !fault.empty()) return {fault};
   std::vector<std::string> troubles;
-  const auto load = [&](const std::string& name) {
-    const std::string trouble = TakeIn(root, folder, name, whose);
+  const auto note = [&](const std::string& trouble) {
     if (!trouble.empty()) troubles.push_back(trouble);
   };
   // Each costs a tenth of a short command, so none is loaded for the sake of another one's words.
   const std::string own = first.find('/') == first.npos ? first + ".so" : "";
   const bool hasOwn = own.size() > 3 && access((folder + '/' + own).c_str(), F_OK) == 0;
-  if (hasOwn) load(own);
+  if (hasOwn) note(TakeInPlugin(root, place, own));
   if (hasOwn && NodeData::FindChild(root, first)) return troubles;
   std::vector<std::string> names;
-  if (!ListPlugins(folder, names)) {
-    troubles.push_back("cannot read the plug-in folder " + Quoted(folder) + ": " + std::strerror(errno));
-  }
+  note(ListFolder(folder, names));
   for (const std::string& name : names) {
-    if (!hasOwn || name != own) load(name);
+    if (!hasOwn || name != own) note(TakeInPlugin(root, place, name));
   }
   return troubles;
 }

@@ -13,9 +13,14 @@ struct Style {
   Style(const Report& report, const std::string& typeName)
       : type(typeName),
         header(FindValue(report.settings, "header:" + typeName)),
+        isDense(FindValue(report.settings, "dense:" + typeName) != nullptr),
         isColored(report.isColored) {
     std::vector<std::string> names = ShownFields(report, typeName);
     if (!names.empty()) fields.emplace(std::move(names));
+  }
+
+  bool IsInHeader(const std::string& name) const {
+    return header && header->find('%' + name + '%') != header->npos;
   }
 
   std::string type;
@@ -23,6 +28,7 @@ struct Style {
   std::optional<Selection> fields;
   /// Null where they have none.
   const std::string* header;
+  bool isDense;
   bool isColored;
 };
 
@@ -39,9 +45,11 @@ void WriteStructure(Style& style, const MetaObj::MetaStruct& structure, Sink& si
     text += style.isColored ? kHeading + header + kPlain + '\n' : header + '\n';
   }
   const auto append = [&](const std::string& name, const Value& field) {
+    const std::string_view value = ValueText(field, space);
+    if (style.isDense && (value.empty() || style.IsInHeader(name))) return;
     text += "   ";
     PlainLength(name) == name.size() ? text += name : text += Visible(name);
-    text.append(": ").append(ValueText(field, space)) += '\n';
+    text.append(": ").append(value) += '\n';
   };
   style.fields ? style.fields->ForEachField(structure, append) : ForEachField(structure, append);
   sink.Write(text);
@@ -55,7 +63,7 @@ void WriteSimple(const Report& report, Sink& sink) {
   Style style(report, shape->GetTypeName());
   bool first = true;
   ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
-    if (!first) sink.Write("\n");
+    if (!first && !style.isDense) sink.Write("\n");
     first = false;
     if (element.GetType() != MetaObj::MetaType::Struct) return WritePlain(element, sink);
     const auto& structure = static_cast<const MetaObj::MetaStruct&>(element);

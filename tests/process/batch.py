@@ -21,7 +21,7 @@ iscsi adapter set -A hba2 -a x\
 --batch other
 --plugins=/ iscsi software get
 --output simple iscsi adapter get -A hba2 --fields Alias
-software get"""
+iscsi softwar get"""
 # line: status, message
 ANSWERS = {
     2: (0, ""), 4: (0, ""), 5: (1, "Invalid adapter specified or unable to get adapter."),
@@ -29,7 +29,7 @@ ANSWERS = {
     7: (2, "the line ends with a backslash; a command stands on one line"),
     8: (2, "option --batch: a line of a batch cannot be one"),
     9: (2, "option --plugins: give it beside --batch; plug-ins are loaded ahead of the first line"),
-    11: (2, 'unknown command "software"; there are: iscsi, linux, simulator, catalogue, completion, propose'),
+    11: (2, 'unknown command "softwar" in "iscsi"; did you mean "software"?'),
 }
 
 
