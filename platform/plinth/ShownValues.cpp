@@ -36,17 +36,17 @@ void WriteValues(AutoCli::Namespace& root, const std::vector<std::string>& line,
   if (!run.record.result) return;
   std::set<std::string> known;
   ForEachElement(*run.record.result, [&](const MetaObj::MetaObject& element) {
-    const auto* const row = dynamic_cast<const MetaObj::MetaStruct*>(&element);
-    if (!row) return;
+    if (element.GetType() != MetaObj::MetaType::Struct) return;
+    const Structure& row = Structure::Of(static_cast<const MetaObj::MetaStruct&>(element));
+    const auto read = [&](const std::string& name) { return row.GetValue(row.GetShape().Find(name)); };
     std::string space;
-    const MetaObj::MetaObject* const field = FindField(*row, source.field);
+    const Value field = read(source.field);
     const std::string value(ValueText(field, space));
-    const auto* const text = dynamic_cast<const MetaObj::MetaString*>(field);
     // What has to be shown in another form than it has cannot be written in a line.
-    if (text && text->GetValue() != value) return;
+    if (field.type == MetaObj::MetaType::String && field.text != value) return;
     if (value.empty() || !known.insert(value).second) return;
     sink.Write(value + '\0');
-    if (!source.about.empty()) sink.Write(ValueText(FindField(*row, source.about), space));
+    if (!source.about.empty()) sink.Write(ValueText(read(source.about), space));
     sink.Write(std::string_view("", 1));
   });
 }
