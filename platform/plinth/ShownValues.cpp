@@ -82,7 +82,7 @@ std::string FromChild(Work work) {
     _exit(0);
   }
   close(ends[1]);
-  const std::string text = child == -1 ? "" : ReadAll(ends[0]);
+  std::string text = child == -1 ? "" : ReadAll(ends[0]);
   close(ends[0]);
   if (child == -1) return "";
   kill(child, SIGKILL);
