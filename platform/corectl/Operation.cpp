@@ -1,11 +1,11 @@
 #include "corectl/Operation.h"
 
+#include "host/Failure.h"
+
 namespace corectl {
 
 void Throw(const host::Error& error, host::Call::Style style) {
-  using Thrown = host::Error::Thrown;
-  const bool lookup = style == host::Call::Style::Lookup && error.GetThrown() == Thrown::Usual;
-  if (lookup || error.GetThrown() == Thrown::CoreCtlException) {
+  if (host::ThrownFor(error, style) == host::AnsweredError::Thrown::CoreCtlException) {
     throw CoreCtl::Lib::CoreCtlException(error.what(), "corectl/Operation.cpp", __LINE__, {});
   }
   throw NodeCtl::Lib::NodeCtlException(error.what(), {});

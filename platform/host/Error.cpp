@@ -1,9 +1,8 @@
 #include "host/Error.h"
 
-#include <ima/ima.h>
-
 #include <cerrno>
-#include <cstdio>
+#include <cstddef>
+#include <iterator>
 
 namespace host {
 
@@ -15,27 +14,26 @@ using Kind = Error::Kind;
 constexpr struct {
   Kind kind;
   std::string_view code;
-  std::uint32_t imaStatus;
 } kKinds[] = {
-    {Kind::Failed, "failed", IMA_ERROR_UNEXPECTED_OS_ERROR},
-    {Kind::NotFound, "not-found", IMA_ERROR_OBJECT_NOT_FOUND},
-    {Kind::Exists, "exists", IMA_ERROR_INVALID_PARAMETER},
-    {Kind::Invalid, "invalid", IMA_ERROR_INVALID_PARAMETER},
-    {Kind::OutOfRange, "out-of-range", IMA_ERROR_INVALID_PARAMETER},
-    {Kind::NotSettable, "not-settable", IMA_ERROR_INVALID_PARAMETER},
-    {Kind::NotSupported, "not-supported", IMA_ERROR_NOT_SUPPORTED},
-    {Kind::WrongObject, "invalid", IMA_ERROR_INCORRECT_OBJECT_TYPE},
-    {Kind::WrongState, "wrong-state", IMA_ERROR_INVALID_PARAMETER},
-    {Kind::InUse, "in-use", IMA_ERROR_INVALID_PARAMETER},
-    {Kind::TooMany, "too-many", IMA_ERROR_INVALID_PARAMETER},
-    {Kind::Busy, "busy", IMA_ERROR_UNEXPECTED_OS_ERROR},
-    {Kind::Denied, "denied", IMA_ERROR_UNEXPECTED_OS_ERROR},
-    {Kind::Damaged, "damaged", IMA_ERROR_UNEXPECTED_OS_ERROR},
-    {Kind::DamagedFile, "damaged", IMA_ERROR_UNEXPECTED_OS_ERROR},
-    {Kind::NoSpace, "no-space", IMA_ERROR_UNEXPECTED_OS_ERROR},
-    {Kind::NoMemory, "no-memory", IMA_ERROR_INSUFFICIENT_MEMORY},
-    {Kind::LoginRefused, "login-refused", IMA_ERROR_UNKNOWN_ERROR},
-    {Kind::NoAnswer, "no-answer", IMA_ERROR_UNKNOWN_ERROR},
+    {Kind::Failed, "failed"},
+    {Kind::NotFound, "not-found"},
+    {Kind::Exists, "exists"},
+    {Kind::Invalid, "invalid"},
+    {Kind::OutOfRange, "out-of-range"},
+    {Kind::NotSettable, "not-settable"},
+    {Kind::NotSupported, "not-supported"},
+    {Kind::WrongObject, "invalid"},
+    {Kind::WrongState, "wrong-state"},
+    {Kind::InUse, "in-use"},
+    {Kind::TooMany, "too-many"},
+    {Kind::Busy, "busy"},
+    {Kind::Denied, "denied"},
+    {Kind::Damaged, "damaged"},
+    {Kind::DamagedFile, "damaged"},
+    {Kind::NoSpace, "no-space"},
+    {Kind::NoMemory, "no-memory"},
+    {Kind::LoginRefused, "login-refused"},
+    {Kind::NoAnswer, "no-answer"},
 };
 constexpr bool AreInOrder() {
   for (std::size_t i = 0; i < std::size(kKinds); ++i) {
@@ -45,37 +43,7 @@ constexpr bool AreInOrder() {
 }
 static_assert(AreInOrder());
 
-Kind KindOfAnswer(std::uint32_t imaStatus) {
-  switch (imaStatus) {
-    case IMA_ERROR_NOT_SUPPORTED:
-      return Kind::NotSupported;
-    case IMA_ERROR_INSUFFICIENT_MEMORY:
-      return Kind::NoMemory;
-    case IMA_ERROR_INVALID_PARAMETER:
-    case IMA_ERROR_INVALID_OBJECT_TYPE:
-    case IMA_ERROR_INCORRECT_OBJECT_TYPE:
-      return Kind::Invalid;
-    case IMA_ERROR_OBJECT_NOT_FOUND:
-      return Kind::NotFound;
-    case IMA_ERROR_SYNC_TIMEOUT:
-      return Kind::NoAnswer;
-    default:
-      return Kind::Failed;
-  }
-}
-
 }  // namespace
-
-std::string ImaStatusText(std::uint32_t status) {
-  char text[16];
-  std::snprintf(text, sizeof text, "0x%08x", static_cast<unsigned>(status));
-  return text;
-}
-
-Error::Error(std::uint32_t imaStatus)
-    : std::runtime_error("The host description has it answered with " + ImaStatusText(imaStatus) + "."),
-      kind_(KindOfAnswer(imaStatus)),
-      answer_(imaStatus) {}
 
 Kind Error::KindOfSystem(int error) {
   switch (error) {
@@ -100,9 +68,5 @@ Kind Error::KindOfSystem(int error) {
 }
 
 std::string_view Error::Code() const { return kKinds[static_cast<std::size_t>(kind_)].code; }
-
-std::uint32_t Error::ImaStatus() const {
-  return answer_ != 0 ? answer_ : kKinds[static_cast<std::size_t>(kind_)].imaStatus;
-}
 
 }  // namespace host

@@ -1,7 +1,6 @@
 /// What went wrong on the host.
 #pragma once
 
-#include <cstdint>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -10,11 +9,8 @@
 
 namespace host {
 
-/// A status of the management API as the trace shows it.
-std::string ImaStatusText(std::uint32_t status);
-
-/// The one failure type of this library; std::bad_alloc is the only other thing that its operations throw.
-/// what() is a whole sentence for an administrator.
+/// The one failure type; std::bad_alloc is the only other thing that is thrown. what() is a whole sentence
+/// for an administrator.
 class Error : public std::runtime_error {
  public:
   /// Why. Each has a code, by which scripts tell them apart: those are stable, and so is which refusal has
@@ -40,13 +36,8 @@ class Error : public std::runtime_error {
     LoginRefused,  ///< a target, or the adapter, ended a login
     NoAnswer,      ///< nobody answered, or no way leads there
   };
-  /// Which exception of the control library shows the failure. A lookup turns Usual into CoreCtlException.
-  enum class Thrown { Usual, NodeCtlException, CoreCtlException };
 
   Error(Kind kind, const std::string& text) : std::runtime_error(text), kind_(kind) {}
-  /// Answers of the description: by an exception, and by a status.
-  Error(Thrown thrown, const std::string& text) : std::runtime_error(text), thrown_(thrown) {}
-  explicit Error(std::uint32_t imaStatus);
 
   /// The kind that an error of the system, an errno, is of.
   static Kind KindOfSystem(int error);
@@ -54,14 +45,9 @@ class Error : public std::runtime_error {
   Kind GetKind() const { return kind_; }
   /// A word, such as "not-found".
   std::string_view Code() const;
-  Thrown GetThrown() const { return thrown_; }
-  /// The status with which an IMA call shows this failure; never 0.
-  std::uint32_t ImaStatus() const;
 
  private:
-  Kind kind_ = Kind::Failed;
-  Thrown thrown_ = Thrown::Usual;
-  std::uint32_t answer_ = 0;  // 0 where none decides the status
+  Kind kind_;
 };
 
 }  // namespace host

@@ -10,6 +10,7 @@
 #include <utility>
 
 #include "host/Description.h"
+#include "host/Failure.h"
 #include "host/Files.h"
 #include "host/Rehearsal.h"
 #include "host/Restart.h"
@@ -250,16 +251,16 @@ Host::Begun::Begun(Host& host, const Call& call, Transaction::Access access)
       const std::string text = answer.Has("text") ? answer.GetString("text") : "";
       switch (answer.GetWord("throw", kThrown)) {
         case 0:
-          throw Error(Error::Thrown::NodeCtlException, text);
+          throw AnsweredError(AnsweredError::Thrown::NodeCtlException, text);
         case 1:
-          throw Error(Error::Thrown::CoreCtlException, text);
+          throw AnsweredError(AnsweredError::Thrown::CoreCtlException, text);
         default:
           throw std::bad_alloc();
       }
     }
     if (answer.Has("imaStatus")) {
       const auto status = static_cast<std::uint32_t>(answer.GetInt64("imaStatus"));
-      if (status != 0) throw Error(status);
+      if (status != 0) throw AnsweredError(status);
     } else {
       tree_.SetAnswer(static_cast<Status>(answer.GetInt("status")));
     }
@@ -311,15 +312,17 @@ void Host::Fail(const Call& call) {
   const auto tell = [&](const Error& error, const char* exception) {
     CallLog::Current().Failed(call, AdapterOf(call, error), error);
     if (!call.traced) return;
-    const std::string outcome = call.style == Call::Style::Ima ? "= " + ImaStatusText(error.ImaStatus())
+    const std::string outcome = call.style == Call::Style::Ima ? "= " + ImaStatusText(ImaStatusOf(error))
                                                                : std::string("! ") + exception;
     const std::string text = error.what();
     Trace(call, outcome + (text.empty() ? "" : ": " + text));
   };
-  const auto fail = [&](const Error& error) {
-    const bool coreCtl = error.GetThrown() == Error::Thrown::CoreCtlException ||
-                         (error.GetThrown() == Error::Thrown::Usual && call.style == Call::Style::Lookup);
+  const auto tellError = [&](const Error& error) {
+    const bool coreCtl = ThrownFor(error, call.style) == AnsweredError::Thrown::CoreCtlException;
     tell(error, coreCtl ? "CoreCtlException" : "NodeCtlException");
+  };
+  const auto fail = [&](const Error& error) {
+    tellError(error);
     throw error;
   };
   try {
@@ -328,7 +331,9 @@ void Host::Fail(const Call& call) {
     tell(Error(Error::Kind::NoMemory, "out of memory"), "std::bad_alloc");
     throw;
   } catch (const Error& error) {
-    fail(Located(error));
+    if (error.GetKind() == Error::Kind::Damaged) fail(Located(error));
+    tellError(error);
+    throw;
   } catch (const std::exception& error) {
     fail(Error(Error::Kind::Failed, error.what()));
   }

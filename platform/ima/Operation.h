@@ -6,6 +6,7 @@
 #include <new>
 #include <string_view>
 
+#include "host/Failure.h"
 #include "host/Host.h"
 #include "ima/Memory.h"
 
@@ -17,7 +18,7 @@ IMA_STATUS StatusOf(const Work& work) noexcept try {
   work();
   return IMA_STATUS_SUCCESS;
 } catch (const host::Error& error) {
-  return error.ImaStatus();
+  return host::ImaStatusOf(error);
 } catch (const std::bad_alloc&) {
   return IMA_ERROR_INSUFFICIENT_MEMORY;
 } catch (...) {
