@@ -13,7 +13,7 @@
 
 #include "Support.h"
 #include "host/Formats.h"
-#include "host/Store.h"
+#include "host/Storage.h"
 #include "ima/Memory.h"
 #include "plinth/CommandLine.h"
 #include "plinth/Declarations.h"

@@ -4,8 +4,8 @@
 
 #include "Support.h"
 #include "host/Description.h"
-#include "host/Error.h"
 #include "host/Schema.h"
+#include "host/Storage.h"
 
 namespace {
 

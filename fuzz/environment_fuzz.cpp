@@ -4,7 +4,7 @@
 
 #include "Support.h"
 #include "corectl/EnvironmentText.h"
-#include "host/Error.h"
+#include "host/Storage.h"
 
 namespace {
 

@@ -8,8 +8,7 @@
 #include <filesystem>
 #include <fstream>
 
-#include "host/Error.h"
-#include "host/Files.h"
+#include "host/Storage.h"
 #include "support/FailingCall.h"
 #include "support/Harness.h"
 

@@ -4,7 +4,7 @@
 
 #include <fstream>
 
-#include "host/Error.h"
+#include "host/Storage.h"
 #include "ima/FirmwareImage.h"
 #include "support/Harness.h"
 

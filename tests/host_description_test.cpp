@@ -10,10 +10,9 @@
 #include <sstream>
 
 #include "host/Description.h"
-#include "host/Error.h"
 #include "host/Host.h"
-#include "host/Record.h"
 #include "host/Schema.h"
+#include "host/Storage.h"
 #include "simulator/Commands.h"
 #include "support/Harness.h"
 #include "support/ProjectFile.h"

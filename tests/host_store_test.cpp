@@ -12,9 +12,8 @@
 #include <sstream>
 
 #include "host/Description.h"
-#include "host/Error.h"
-#include "host/Files.h"
 #include "host/Host.h"
+#include "host/Storage.h"
 #include "support/Harness.h"
 
 using host::Host;

@@ -6,7 +6,7 @@
 #include <fstream>
 #include <sstream>
 
-#include "host/Error.h"
+#include "host/Storage.h"
 #include "linux/Check.h"
 #include "linux/Interfaces.h"
 #include "linux/Records.h"

@@ -4,7 +4,7 @@
 #include <tuple>
 
 #include "UnregisteredCommands.h"
-#include "host/Error.h"
+#include "host/Storage.h"
 #include "simulator/Commands.h"
 #include "support/Harness.h"
 #include "support/ProbeCommand.h"

@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "host/Error.h"
 #include "host/Formats.h"
+#include "host/Storage.h"
 
 namespace corectl {
 

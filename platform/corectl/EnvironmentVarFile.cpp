@@ -2,8 +2,8 @@
 
 #include "corectl/EnvironmentText.h"
 #include "corectl/Operation.h"
-#include "host/Files.h"
-#include "host/Rehearsal.h"
+#include "host/Storage.h"
+#include "store/Rehearsal.h"
 
 namespace CoreCtl::Util {
 

@@ -7,8 +7,8 @@
 #include <string>
 #include <variant>
 
-#include "host/Record.h"
 #include "host/Schema.h"
+#include "host/Storage.h"
 
 namespace corectl {
 

@@ -5,7 +5,7 @@
 
 #include <string>
 
-#include "host/Record.h"
+#include "host/Storage.h"
 
 namespace corectl {
 

@@ -1,3 +1,5 @@
+#include "host/Storage.h"
+
 #include <CoreCtl/Storage.h>
 #include <sys/stat.h>
 
@@ -7,7 +9,6 @@
 
 #include "corectl/Adapter.h"
 #include "corectl/EnvironmentText.h"
-#include "host/Files.h"
 #include "host/Formats.h"
 #include "host/Restart.h"
 

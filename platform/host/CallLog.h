@@ -7,9 +7,9 @@
 #include <vector>
 
 #include "host/Call.h"
-#include "host/Error.h"
 #include "host/PendingSchema.h"
 #include "host/Status.h"
+#include "host/Storage.h"
 
 #pragma GCC visibility push(default)
 

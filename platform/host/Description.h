@@ -9,8 +9,8 @@
 #include <string_view>
 #include <vector>
 
-#include "host/Record.h"
 #include "host/Schema.h"
+#include "host/Storage.h"
 
 #pragma GCC visibility push(default)
 

@@ -5,7 +5,7 @@
 
 #include "host/DescriptionChecks.h"
 #include "host/DescriptionReader.h"
-#include "host/Error.h"
+#include "host/Storage.h"
 
 namespace host {
 

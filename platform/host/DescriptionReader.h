@@ -10,9 +10,9 @@
 #include <utility>
 #include <vector>
 
-#include "host/Bson.h"
 #include "host/Description.h"
 #include "host/DescriptionChecks.h"
+#include "store/Bson.h"
 
 namespace host {
 

@@ -6,7 +6,7 @@
 #include <string>
 
 #include "host/Call.h"
-#include "host/Error.h"
+#include "host/Storage.h"
 
 #pragma GCC visibility push(default)
 

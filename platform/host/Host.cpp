@@ -11,10 +11,10 @@
 
 #include "host/Description.h"
 #include "host/Failure.h"
-#include "host/Files.h"
-#include "host/Rehearsal.h"
 #include "host/Restart.h"
-#include "host/Tables.h"
+#include "host/Storage.h"
+#include "store/Rehearsal.h"
+#include "store/Tables.h"
 
 namespace host {
 

@@ -11,8 +11,8 @@
 
 #include "host/Call.h"
 #include "host/CallLog.h"
-#include "host/Error.h"
 #include "host/Pending.h"
+#include "host/Storage.h"
 #include "host/Tree.h"
 
 #pragma GCC visibility push(default)

@@ -5,10 +5,10 @@
 #include <ctime>
 #include <set>
 
-#include "host/Error.h"
 #include "host/Formats.h"
 #include "host/LevelSchema.h"
 #include "host/Negotiation.h"
+#include "host/Storage.h"
 
 namespace host {
 

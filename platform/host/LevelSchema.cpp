@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "host/Formats.h"
-#include "host/Record.h"
+#include "host/Storage.h"
 
 namespace host {
 

@@ -5,7 +5,7 @@
 #include <optional>
 #include <string>
 
-#include "host/Error.h"
+#include "host/Storage.h"
 #include "host/Targets.h"
 
 #pragma GCC visibility push(default)

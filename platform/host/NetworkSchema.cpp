@@ -6,7 +6,7 @@
 
 #include "host/Formats.h"
 #include "host/LevelSchema.h"
-#include "host/Record.h"
+#include "host/Storage.h"
 
 namespace host {
 

@@ -3,7 +3,7 @@
 #include <nlohmann/json.hpp>
 
 #include "host/Description.h"
-#include "host/Error.h"
+#include "host/Storage.h"
 
 namespace host {
 

@@ -4,14 +4,13 @@
 #include <stdexcept>
 #include <vector>
 
-#include "host/Error.h"
 #include "host/Formats.h"
 #include "host/LevelSchema.h"
 #include "host/NetworkSchema.h"
 #include "host/Operations.h"
 #include "host/Pending.h"
-#include "host/Record.h"
 #include "host/RemoteSchema.h"
+#include "host/Storage.h"
 #include "host/TargetSchema.h"
 
 namespace host {

@@ -11,11 +11,11 @@
 #include <string>
 #include <string_view>
 
+#include "host/Storage.h"
+
 #pragma GCC visibility push(default)
 
 namespace host {
-
-class Record;
 
 /// The numbers stand in databases: new ones are added, none ever changes its meaning.
 enum class Kind : int {

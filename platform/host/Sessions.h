@@ -3,7 +3,7 @@
 
 #include <optional>
 
-#include "host/Error.h"
+#include "host/Storage.h"
 #include "host/Targets.h"
 
 #pragma GCC visibility push(default)

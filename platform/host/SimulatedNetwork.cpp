@@ -3,9 +3,9 @@
 #include <map>
 #include <set>
 
-#include "host/Error.h"
 #include "host/Formats.h"
 #include "host/RemoteSchema.h"
+#include "host/Storage.h"
 #include "host/Tree.h"
 
 namespace host {

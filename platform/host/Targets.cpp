@@ -5,7 +5,7 @@
 #include <unordered_set>
 
 #include "host/Description.h"
-#include "host/Error.h"
+#include "host/Storage.h"
 #include "host/TargetSchema.h"
 
 namespace host {

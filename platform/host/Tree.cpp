@@ -3,8 +3,8 @@
 #include <algorithm>
 
 #include "host/Description.h"
-#include "host/Error.h"
 #include "host/Formats.h"
+#include "host/Storage.h"
 
 namespace host {
 

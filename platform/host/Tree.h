@@ -8,10 +8,9 @@
 #include <string_view>
 #include <vector>
 
-#include "host/Record.h"
 #include "host/Schema.h"
 #include "host/Status.h"
-#include "host/Store.h"
+#include "host/Storage.h"
 
 #pragma GCC visibility push(default)
 

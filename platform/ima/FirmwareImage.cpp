@@ -11,8 +11,8 @@
 #include <iterator>
 #include <map>
 
-#include "host/Error.h"
 #include "host/Formats.h"
+#include "host/Storage.h"
 
 namespace ima {
 

@@ -5,7 +5,7 @@
 #include <optional>
 #include <set>
 
-#include "host/Store.h"
+#include "host/Storage.h"
 
 namespace ima {
 

@@ -4,8 +4,8 @@
 
 #include <algorithm>
 
-#include "host/Error.h"
 #include "host/Formats.h"
+#include "host/Storage.h"
 
 using host::Kind;
 using host::Object;

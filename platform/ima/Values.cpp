@@ -5,8 +5,8 @@
 #include <cwchar>
 #include <iterator>
 
-#include "host/Error.h"
 #include "host/Formats.h"
+#include "host/Storage.h"
 #include "ima/Operation.h"
 
 namespace ima {

@@ -7,7 +7,7 @@
 #include <string_view>
 
 #include "host/Call.h"
-#include "host/Record.h"
+#include "host/Storage.h"
 
 namespace ima {
 

@@ -5,7 +5,7 @@
 #include <filesystem>
 #include <fstream>
 
-#include "host/Files.h"
+#include "host/Storage.h"
 
 namespace linux {
 

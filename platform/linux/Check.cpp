@@ -9,9 +9,8 @@
 #include <cstring>
 #include <fstream>
 
-#include "host/Error.h"
-#include "host/Files.h"
 #include "host/Formats.h"
+#include "host/Storage.h"
 #include "linux/Attributes.h"
 #include "linux/Joined.h"
 #include "linux/OpenIscsi.h"

@@ -11,8 +11,7 @@
 #include <cerrno>
 #include <cstring>
 
-#include "host/Error.h"
-#include "host/Files.h"
+#include "host/Storage.h"
 
 namespace linux {
 

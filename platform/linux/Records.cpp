@@ -6,9 +6,8 @@
 #include <cerrno>
 #include <cstdint>
 
-#include "host/Error.h"
-#include "host/Files.h"
 #include "host/Formats.h"
+#include "host/Storage.h"
 #include "linux/Joined.h"
 
 namespace linux {

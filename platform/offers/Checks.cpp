@@ -2,9 +2,9 @@
 
 #include <map>
 
-#include "host/Error.h"
 #include "host/Host.h"
 #include "host/Pending.h"
+#include "host/Storage.h"
 
 namespace offers {
 

@@ -5,9 +5,8 @@
 
 #include "host/CallLog.h"
 #include "host/Description.h"
-#include "host/Error.h"
-#include "host/Files.h"
 #include "host/Host.h"
+#include "host/Storage.h"
 
 namespace simulator {
 

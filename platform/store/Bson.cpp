@@ -1,12 +1,12 @@
-#include "host/Bson.h"
+#include "store/Bson.h"
 
 #include <bit>
 #include <cstring>
 #include <limits>
 
-#include "host/Error.h"
+#include "store/Error.h"
 
-namespace host::bson {
+namespace store::bson {
 
 // The numbers of the format have their least byte first, and are copied as they are.
 static_assert(std::endian::native == std::endian::little);
@@ -145,4 +145,4 @@ void EndDocument(std::string& bytes) {
   bytes.replace(0, kLength, Number32(Length(bytes.size())));
 }
 
-}  // namespace host::bson
+}  // namespace store::bson

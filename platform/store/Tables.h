@@ -1,7 +1,7 @@
 /// The tables of a host's database, and the forms that they had in earlier versions of this program.
 #pragma once
 
-namespace host {
+namespace store {
 
 class Store;
 
@@ -12,4 +12,4 @@ void CreateTables(Store& store);
 /// version, or damaged.
 void UpdateTables(Store& store);
 
-}  // namespace host
+}  // namespace store

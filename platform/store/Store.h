@@ -1,6 +1,6 @@
 /// The database under a host: one connection, transactions and prepared statements, and a seam for faults.
 ///
-/// Every failure is a host::Error that names the file and tells the reason.
+/// Every failure is a store::Error that names the file and tells the reason.
 #pragma once
 
 #include <cstdint>
@@ -15,7 +15,7 @@ struct sqlite3_stmt;
 
 #pragma GCC visibility push(default)
 
-namespace host {
+namespace store {
 
 /// The files beside the database @p path that may hold a part of it.
 std::vector<std::string> JournalsOf(const std::string& path);
@@ -49,7 +49,7 @@ class Store {
   void CheckStructure();
   /// True where looking at the whole file takes no more than a few tenths of a millisecond.
   bool IsSmall();
-  /// How long a lock of another process is waited for; as host::Patience has it from the start.
+  /// How long a lock of another process is waited for; as store::Patience has it from the start.
   void SetPatience(int milliseconds);
 
   /// A dry run: what transactions change lasts until UndoAll, and is seen by this object alone. Nothing of it
@@ -167,6 +167,6 @@ class Transaction {
   bool isPart_ = false;
 };
 
-}  // namespace host
+}  // namespace store
 
 #pragma GCC visibility pop

@@ -12,7 +12,7 @@
 
 #pragma GCC visibility push(default)
 
-namespace host {
+namespace store {
 
 class Rehearsal {
  public:
@@ -38,6 +38,6 @@ class Rehearsal {
   int fileChanges_ = 0;
 };
 
-}  // namespace host
+}  // namespace store
 
 #pragma GCC visibility pop

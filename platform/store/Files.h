@@ -10,7 +10,7 @@
 
 #pragma GCC visibility push(default)
 
-namespace host {
+namespace store {
 
 /// Where the absolute path @p path of the host lies: under HCLI_ROOT, or as it is without one. An Error where
 /// that is empty, which a script with an unset variable makes it: the host is not to be this machine by
@@ -80,6 +80,6 @@ class NewFile {
 /// work on one. For where no NewFile follows, which would do it.
 void ClearLeftover(const std::string& path);
 
-}  // namespace host
+}  // namespace store
 
 #pragma GCC visibility pop

@@ -1,4 +1,4 @@
-#include "host/Store.h"
+#include "store/Store.h"
 
 #include <sqlite3.h>
 #include <stdlib.h>
@@ -9,12 +9,12 @@
 #include <ctime>
 #include <new>
 
-#include "host/Error.h"
-#include "host/Files.h"
-#include "host/Formats.h"
-#include "host/Tables.h"
+#include "store/Error.h"
+#include "store/Files.h"
+#include "store/Tables.h"
+#include "store/Text.h"
 
-namespace host {
+namespace store {
 
 namespace {
 
@@ -444,4 +444,4 @@ void Transaction::Commit() {
   store_.inTransaction_ = false;
 }
 
-}  // namespace host
+}  // namespace store

@@ -1,4 +1,4 @@
-#include "host/Files.h"
+#include "store/Files.h"
 
 #include <fcntl.h>
 #include <stdio.h>
@@ -12,10 +12,10 @@
 #include <cstring>
 #include <utility>
 
-#include "host/Error.h"
-#include "host/Rehearsal.h"
+#include "store/Error.h"
+#include "store/Rehearsal.h"
 
-namespace host {
+namespace store {
 
 namespace {
 
@@ -292,4 +292,4 @@ void KeepPrivate(const std::string& path, const struct stat& status) {
   close(file);
 }
 
-}  // namespace host
+}  // namespace store

@@ -6,7 +6,7 @@
 #include <string>
 #include <string_view>
 
-namespace host::bson {
+namespace store::bson {
 
 /// The types that records have; there are more, and their numbers are free.
 enum class Type : unsigned char {
@@ -75,4 +75,4 @@ void EndDocument(std::string& bytes);
 
 [[noreturn]] void Damaged();
 
-}  // namespace host::bson
+}  // namespace store::bson

@@ -1,13 +1,13 @@
-#include "host/Tables.h"
+#include "store/Tables.h"
 
 #include <nlohmann/json.hpp>
 #include <string>
 
-#include "host/Error.h"
-#include "host/Record.h"
-#include "host/Store.h"
+#include "store/Error.h"
+#include "store/Record.h"
+#include "store/Store.h"
 
-namespace host {
+namespace store {
 
 namespace {
 
@@ -99,4 +99,4 @@ void UpdateTables(Store& store) try {
   Refuse(store, Error::Kind::DamagedFile, std::string(" is damaged: ") + error.what() + ".");
 }
 
-}  // namespace host
+}  // namespace store

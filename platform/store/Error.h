@@ -7,7 +7,7 @@
 
 #pragma GCC visibility push(default)
 
-namespace host {
+namespace store {
 
 /// The one failure type; std::bad_alloc is the only other thing that is thrown. what() is a whole sentence
 /// for an administrator.
@@ -50,6 +50,6 @@ class Error : public std::runtime_error {
   Kind kind_;
 };
 
-}  // namespace host
+}  // namespace store
 
 #pragma GCC visibility pop

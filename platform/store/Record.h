@@ -5,7 +5,7 @@
 ///
 /// A path is a key, or keys and list indices with slashes between: "properties/vendor", "addresses/0/port".
 /// Records are stored complete, so a getter that finds nothing, or another type, means a damaged host and
-/// throws host::Error; a key that may be missing is asked for with Has first.
+/// throws store::Error; a key that may be missing is asked for with Has first.
 #pragma once
 
 #include <cstdint>
@@ -17,7 +17,7 @@
 
 #pragma GCC visibility push(default)
 
-namespace host {
+namespace store {
 
 using Json = nlohmann::ordered_json;
 
@@ -82,6 +82,6 @@ class Record {
   mutable std::size_t lastFound_ = 0;
 };
 
-}  // namespace host
+}  // namespace store
 
 #pragma GCC visibility pop

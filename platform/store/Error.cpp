@@ -1,10 +1,10 @@
-#include "host/Error.h"
+#include "store/Error.h"
 
 #include <cerrno>
 #include <cstddef>
 #include <iterator>
 
-namespace host {
+namespace store {
 
 namespace {
 
@@ -69,4 +69,4 @@ Kind Error::KindOfSystem(int error) {
 
 std::string_view Error::Code() const { return kKinds[static_cast<std::size_t>(kind_)].code; }
 
-}  // namespace host
+}  // namespace store

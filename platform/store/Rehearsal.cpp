@@ -1,13 +1,13 @@
-#include "host/Rehearsal.h"
+#include "store/Rehearsal.h"
 
 #include <fcntl.h>
 #include <unistd.h>
 
 #include <cerrno>
 
-#include "host/Files.h"
+#include "store/Files.h"
 
-namespace host {
+namespace store {
 
 std::unique_ptr<Rehearsal> Rehearsal::current;
 
@@ -29,4 +29,4 @@ const std::string* Rehearsal::FindFile(const std::string& path) const {
   return file == files_.end() ? nullptr : &file->second;
 }
 
-}  // namespace host
+}  // namespace store

@@ -1,4 +1,4 @@
-#include "host/Record.h"
+#include "store/Record.h"
 
 #include <algorithm>
 #include <array>
@@ -6,11 +6,11 @@
 #include <nlohmann/json.hpp>
 #include <optional>
 
-#include "host/Bson.h"
-#include "host/Error.h"
-#include "host/Formats.h"
+#include "store/Bson.h"
+#include "store/Error.h"
+#include "store/Text.h"
 
-namespace host {
+namespace store {
 
 namespace {
 
@@ -315,4 +315,4 @@ void Record::Erase(std::string_view path) {
   Splice(bytes_, way, way.element->begin, end, moved);
 }
 
-}  // namespace host
+}  // namespace store
