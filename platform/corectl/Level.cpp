@@ -3,10 +3,10 @@
 #include <algorithm>
 #include <variant>
 
-#include "host/Description.h"
 #include "host/Formats.h"
 #include "host/LevelSchema.h"
 #include "host/Targets.h"
+#include "store/Document.h"
 
 namespace corectl {
 

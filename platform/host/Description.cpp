@@ -39,7 +39,7 @@ void LoadDescription(Tree& tree, Description description) {
   tree.Clear();
   std::vector<std::int64_t> ids;
   ids.reserve(description.size());
-  for (DescribedObject& described : description) {
+  for (DocumentObject& described : description) {
     const std::int64_t parent = ids.empty() ? 0 : ids[described.parent];
     ids.push_back(tree.Insert(parent, described.kind, std::move(described.record)).id);
   }

@@ -2,10 +2,11 @@
 #include <cstdint>
 #include <iterator>
 #include <nlohmann/json.hpp>
+#include <set>
 
-#include "host/DescriptionChecks.h"
-#include "host/DescriptionReader.h"
-#include "host/Storage.h"
+#include "host/Description.h"
+#include "store/DocumentChecks.h"
+#include "store/DocumentReader.h"
 
 namespace host {
 
@@ -25,27 +26,12 @@ struct Cursor {
   bool operator==(const Cursor& other) const { return *at == *other.at; }
 };
 
-/// Numbers beyond 63 bits come unsigned.
-Scalar Whole(std::uint64_t number) {
-  if (number > INT64_MAX) return static_cast<double>(number);
-  return static_cast<std::int64_t>(number);
-}
-
-Scalar ScalarOf(const Json& json) {
-  if (json.is_boolean()) return json.get<bool>();
-  if (json.is_number_unsigned()) return Whole(json.get<std::uint64_t>());
-  if (json.is_number_integer()) return json.get<std::int64_t>();
-  if (json.is_number()) return json.get<double>();
-  if (json.is_string()) return std::string_view(json.get_ref<const std::string&>());
-  return {};
-}
-
 /// Hands on what the parser reads, and where it stands.
 class Parser {
  public:
   using Text = Json::string_t;
 
-  Parser(const std::string& text, DescriptionReader& reader)
+  Parser(const std::string& text, DocumentReader& reader)
       : reader_(reader), text_(text), at_(text.data()), before_(at_) {}
 
   void Parse() {
@@ -100,37 +86,31 @@ class Parser {
     return Do([&] { reader_.Value(value); });
   }
 
-  DescriptionReader& reader_;
+  DocumentReader& reader_;
   const std::string& text_;
   const char* at_;      // how far the parser has read
   const char* before_;  // how far it had with the event before; behind a number, one character more
 };
 
-/// Has @p reader read what stands in @p json.
-void Replay(const Json& json, DescriptionReader& reader) {
-  switch (json.type()) {
-    case Json::value_t::object:
-      reader.BeginObject();
-      for (const auto& [key, value] : json.get_ref<const Json::object_t&>()) {
-        reader.Name(key);
-        Replay(value, reader);
-      }
-      reader.EndObject();
-      break;
-    case Json::value_t::array:
-      reader.BeginList();
-      for (const Json& element : json) Replay(element, reader);
-      reader.EndList();
-      break;
-    default:
-      reader.Value(ScalarOf(json));
+/// Adapters may go ahead of the NICs that are bound to them.
+void RequireBoundNics(const Description& description) {
+  std::set<std::string> nics;
+  for (const DocumentObject& object : description) {
+    if (object.kind == Kind::Nic) nics.insert(NameOf(Kind::Nic, object.record));
+  }
+  for (std::size_t i = 0; i < description.size(); ++i) {
+    if (description[i].kind != Kind::NetworkPortal) continue;
+    const std::string name = NameOf(Kind::NetworkPortal, description[i].record);
+    if (nics.contains(name)) continue;
+    throw Fault(description[i].offset, Below(PathOf(description, i), "nic"),
+                "the host has no NIC " + Excerpt(name));
   }
 }
 
 }  // namespace
 
 Description ReadDescription(const std::string& text) try {
-  DescriptionReader reader(Kind::Host);
+  DocumentReader reader(Kind::Host);
   Parser(text, reader).Parse();
   Description description = reader.Take();
   RequireBoundNics(description);
@@ -141,14 +121,6 @@ Description ReadDescription(const std::string& text) try {
   const std::size_t column = fault.offset - (ahead.rfind('\n') + 1) + 1;
   throw Error(Error::Kind::Invalid,
               fault.what() + (" (line " + std::to_string(line)) + ", column " + std::to_string(column) + ")");
-}
-
-Record Complete(Kind kind, const Record& given) try {
-  DescriptionReader reader(kind);
-  Replay(given.GetJson(), reader);
-  return std::move(reader.Take().front().record);
-} catch (const Fault& fault) {
-  throw Error(Error::Kind::Invalid, fault.what());
 }
 
 }  // namespace host

@@ -2,8 +2,8 @@
 
 #include <nlohmann/json.hpp>
 
-#include "host/Description.h"
 #include "host/Storage.h"
+#include "store/Document.h"
 
 namespace host {
 

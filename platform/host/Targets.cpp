@@ -4,9 +4,9 @@
 #include <map>
 #include <unordered_set>
 
-#include "host/Description.h"
 #include "host/Storage.h"
 #include "host/TargetSchema.h"
+#include "store/Document.h"
 
 namespace host {
 

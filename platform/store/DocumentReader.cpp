@@ -1,9 +1,9 @@
-#include "host/DescriptionReader.h"
+#include "store/DocumentReader.h"
 
-#include "host/DescriptionChecks.h"
-#include "host/Formats.h"
+#include "store/DocumentChecks.h"
+#include "store/Text.h"
 
-namespace host {
+namespace store {
 
 namespace {
 
@@ -12,8 +12,8 @@ constexpr std::size_t kMostSettings = 100'000'000;
 
 }  // namespace
 
-DescriptionReader::Level& DescriptionReader::Push(Level::Shape shape, std::span<const Key> keys,
-                                                  const KindSpec* spec) {
+DocumentReader::Level& DocumentReader::Push(Level::Shape shape, std::span<const Key> keys,
+                                            const KindSpec* spec) {
   if (depth_ == levels_.size()) levels_.emplace_back();
   Level& level = levels_[depth_++];
   level.shape = shape;
@@ -30,14 +30,14 @@ DescriptionReader::Level& DescriptionReader::Push(Level::Shape shape, std::span<
 }
 
 /// The key whose value begins; null where it is a list of objects, or an object.
-const Key* DescriptionReader::KeyInTurn() {
+const Key* DocumentReader::KeyInTurn() {
   if (depth_ == 0) return nullptr;
   const Level& level = Top();
   if (level.shape == Level::Shape::List) return level.keys.data();
   return level.current < level.keys.size() ? &level.keys[level.current] : nullptr;
 }
 
-void DescriptionReader::Value(const Scalar& value) {
+void DocumentReader::Value(const Scalar& value) {
   const Key* key = KeyInTurn();
   if (key == nullptr) Refuse(depth_ > 0 && Top().shape == Level::Shape::Record ? kNoList : kNoObject);
   if (!(std::holds_alternative<std::monostate>(value) && key->optional && Top().partial)) {
@@ -48,7 +48,7 @@ void DescriptionReader::Value(const Scalar& value) {
 }
 
 /// @p value is right for the key in turn.
-void DescriptionReader::Put(const Scalar& value) {
+void DocumentReader::Put(const Scalar& value) {
   bytes_.clear();
   bson::Type type = bson::Type::Null;
   if (const auto* const text = std::get_if<std::string_view>(&value)) {
@@ -63,7 +63,7 @@ void DescriptionReader::Put(const Scalar& value) {
   Put(type, bytes_);
 }
 
-void DescriptionReader::Put(bson::Type type, std::string_view bytes) {
+void DocumentReader::Put(bson::Type type, std::string_view bytes) {
   Level& level = Top();
   if (level.shape == Level::Shape::List) {
     bson::AppendElement(level.document, type, std::to_string(level.count++), bytes);
@@ -76,13 +76,13 @@ void DescriptionReader::Put(bson::Type type, std::string_view bytes) {
 }
 
 /// Leaves the record or list that is complete, and puts it where it belongs.
-void DescriptionReader::PutTop(bson::Type type) {
+void DocumentReader::PutTop(bson::Type type) {
   const Level& level = Top();
   Pop();
   Put(type, level.document);
 }
 
-void DescriptionReader::BeginObject() {
+void DocumentReader::BeginObject() {
   if (depth_ == 0) {
     BeginObjectOf(top_);
   } else if (Top().shape == Level::Shape::Objects) {
@@ -95,8 +95,8 @@ void DescriptionReader::BeginObject() {
   }
 }
 
-void DescriptionReader::BeginObjectOf(Kind kind) {
-  DescribedObject object{.kind = kind, .offset = offset_, .record = {}};
+void DocumentReader::BeginObjectOf(Kind kind) {
+  DocumentObject object{.kind = kind, .offset = offset_, .record = {}};
   if (depth_ > 0) {
     object.parent = Top().object;
     object.place = Top().count;
@@ -108,14 +108,14 @@ void DescriptionReader::BeginObjectOf(Kind kind) {
   objects_.push_back(std::move(object));
 }
 
-void DescriptionReader::BeginRecord(const Key& key) {
+void DocumentReader::BeginRecord(const Key& key) {
   const bool partial = key.partial || Top().partial;
   Level& level = Push(Level::Shape::Record, key.keys, nullptr);
   level.partial = partial;
   level.offset = offset_;
 }
 
-void DescriptionReader::Name(std::string_view name) {
+void DocumentReader::Name(std::string_view name) {
   Level& level = Top();
   // Most documents have the keys in the order of the schema.
   const std::size_t size = level.Size();
@@ -138,7 +138,7 @@ void DescriptionReader::Name(std::string_view name) {
   if (level.slots[place].given) Refuse("is given twice");
 }
 
-void DescriptionReader::EndObject() {
+void DocumentReader::EndObject() {
   if (Top().spec != nullptr) {
     Complete();
   } else {
@@ -148,7 +148,7 @@ void DescriptionReader::EndObject() {
 }
 
 /// Completes the record, in the order of the schema and with the defaults of what was not written.
-void DescriptionReader::EndRecord() {
+void DocumentReader::EndRecord() {
   Level& level = Top();
   for (std::size_t i = 0; i < level.keys.size(); ++i) {
     const Key& key = level.keys[i];
@@ -171,7 +171,7 @@ void DescriptionReader::EndRecord() {
   }
 }
 
-void DescriptionReader::PutDefault(const Key& key) {
+void DocumentReader::PutDefault(const Key& key) {
   if (key.type == Type::Record) {
     BeginRecord(key);
     EndRecord();
@@ -183,7 +183,7 @@ void DescriptionReader::PutDefault(const Key& key) {
   }
 }
 
-void DescriptionReader::Complete() {
+void DocumentReader::Complete() {
   EndRecord();
   const Level& level = Top();
   const KindSpec& spec = *level.spec;
@@ -201,7 +201,7 @@ void DescriptionReader::Complete() {
   ++list.count;
 }
 
-void DescriptionReader::BeginList() {
+void DocumentReader::BeginList() {
   const Key* key = KeyInTurn();
   if (key == nullptr) {
     if (depth_ == 0 || Top().shape != Level::Shape::Record) Refuse(kNoObject);
@@ -215,7 +215,7 @@ void DescriptionReader::BeginList() {
   }
 }
 
-void DescriptionReader::EndList() {
+void DocumentReader::EndList() {
   Level& list = Top();
   if (list.shape == Level::Shape::Objects) {
     list.names = {};  // clearing would look through all the room that they had, whenever it is used again
@@ -227,7 +227,7 @@ void DescriptionReader::EndList() {
 }
 
 /// Of what is being read.
-std::string DescriptionReader::Path() const {
+std::string DocumentReader::Path() const {
   std::size_t level = depth_;
   const auto isObject = [](const Level& one) {
     return one.shape == Level::Shape::Record && one.spec != nullptr;
@@ -246,6 +246,6 @@ std::string DescriptionReader::Path() const {
   return path;
 }
 
-void DescriptionReader::Refuse(const std::string& text) const { throw Fault(offset_, Path(), text); }
+void DocumentReader::Refuse(const std::string& text) const { throw Fault(offset_, Path(), text); }
 
-}  // namespace host
+}  // namespace store

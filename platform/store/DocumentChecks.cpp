@@ -1,11 +1,16 @@
-#include "host/DescriptionChecks.h"
+#include "store/DocumentChecks.h"
 
 #include <algorithm>
 #include <set>
 
-#include "host/Formats.h"
+#include "store/Text.h"
 
-namespace host {
+namespace store {
+
+Scalar Whole(std::uint64_t number) {
+  if (number > INT64_MAX) return static_cast<double>(number);
+  return static_cast<std::int64_t>(number);
+}
 
 std::string Below(const std::string& path, std::string_view key) {
   return path.empty() ? std::string(key) : path + "." + std::string(key);
@@ -92,67 +97,52 @@ Scalar DefaultOf(const Key& key) {
 namespace {
 
 /// The path of the list that @p object is in.
-std::string ListOf(const Description& description, std::size_t object) {
-  const std::size_t parent = description[object].parent;
-  for (const Collection& collection : GetKindSpec(description[parent].kind).collections) {
-    if (collection.kind != description[object].kind) continue;
-    return Below(PathOf(description, parent), collection.key);
+std::string ListOf(const Document& document, std::size_t object) {
+  const std::size_t parent = document[object].parent;
+  for (const Collection& collection : GetKindSpec(document[parent].kind).collections) {
+    if (collection.kind != document[object].kind) continue;
+    return Below(PathOf(document, parent), collection.key);
   }
   return {};
 }
 
 /// @p fault is what is wrong with a whole object, and may begin with the path of a key in it.
-void RequireNone(const std::string& fault, const Description& description, std::size_t object) {
+void RequireNone(const std::string& fault, const Document& document, std::size_t object) {
   if (fault.empty()) return;
   const std::string_view first = std::string_view(fault).substr(0, fault.find_first_of(".[:"));
-  const std::string path = PathOf(description, object);
-  const std::size_t offset = description[object].offset;
-  if (FindKey(GetKindSpec(description[object].kind).keys, first) == nullptr) throw Fault(offset, path, fault);
+  const std::string path = PathOf(document, object);
+  const std::size_t offset = document[object].offset;
+  if (FindKey(GetKindSpec(document[object].kind).keys, first) == nullptr) throw Fault(offset, path, fault);
   throw Fault(offset, Below(path, fault), "");
 }
 
 }  // namespace
 
-std::string PathOf(const Description& description, std::size_t object) {
-  return object == 0 ? "" : Element(ListOf(description, object), description[object].place);
+std::string PathOf(const Document& document, std::size_t object) {
+  return object == 0 ? "" : Element(ListOf(document, object), document[object].place);
 }
 
-void RequireRight(const Description& description, std::size_t object) {
-  const KindSpec& spec = GetKindSpec(description[object].kind);
-  const Record& record = description[object].record;
-  if (spec.fault != nullptr) RequireNone(spec.fault(record), description, object);
+void RequireRight(const Document& document, std::size_t object) {
+  const KindSpec& spec = GetKindSpec(document[object].kind);
+  const Record& record = document[object].record;
+  if (spec.fault != nullptr) RequireNone(spec.fault(record), document, object);
   const auto isHeldAgainst = [](const Collection& collection) {
     return GetKindSpec(collection.kind).faultBelow != nullptr;
   };
   if (std::none_of(spec.collections.begin(), spec.collections.end(), isHeldAgainst)) return;
-  for (std::size_t i = object + 1; i < description.size(); ++i) {
-    if (description[i].parent != object) continue;
-    const KindSpec& below = GetKindSpec(description[i].kind);
+  for (std::size_t i = object + 1; i < document.size(); ++i) {
+    if (document[i].parent != object) continue;
+    const KindSpec& below = GetKindSpec(document[i].kind);
     if (below.faultBelow == nullptr) continue;
-    RequireNone(below.faultBelow(description[i].record, record), description, i);
+    RequireNone(below.faultBelow(document[i].record, record), document, i);
   }
 }
 
-void RefuseName(const Description& description, std::size_t object, const std::string& name,
-                std::size_t place) {
-  const std::string_view key = GetKindSpec(description[object].kind).nameKeys[0];
-  throw Fault(description[object].offset, Below(PathOf(description, object), key),
+void RefuseName(const Document& document, std::size_t object, const std::string& name, std::size_t place) {
+  const std::string_view key = GetKindSpec(document[object].kind).nameKeys[0];
+  throw Fault(document[object].offset, Below(PathOf(document, object), key),
               name.empty() ? "must not be empty"
-                           : Excerpt(name) + " is taken by " + Element(ListOf(description, object), place));
+                           : Excerpt(name) + " is taken by " + Element(ListOf(document, object), place));
 }
 
-void RequireBoundNics(const Description& description) {
-  std::set<std::string> nics;
-  for (const DescribedObject& object : description) {
-    if (object.kind == Kind::Nic) nics.insert(NameOf(Kind::Nic, object.record));
-  }
-  for (std::size_t i = 0; i < description.size(); ++i) {
-    if (description[i].kind != Kind::NetworkPortal) continue;
-    const std::string name = NameOf(Kind::NetworkPortal, description[i].record);
-    if (nics.contains(name)) continue;
-    throw Fault(description[i].offset, Below(PathOf(description, i), "nic"),
-                "the host has no NIC " + Excerpt(name));
-  }
-}
-
-}  // namespace host
+}  // namespace store

@@ -1,4 +1,4 @@
-/// Reads host descriptions: each object is held against the schema while it is read.
+/// Reads documents: each object is held against the schema while it is read.
 #pragma once
 
 #include <cstddef>
@@ -10,18 +10,18 @@
 #include <utility>
 #include <vector>
 
-#include "host/Description.h"
-#include "host/DescriptionChecks.h"
 #include "store/Bson.h"
+#include "store/Document.h"
+#include "store/DocumentChecks.h"
 
-namespace host {
+namespace store {
 
-/// Puts the values of a description, as they come, into the records that they belong to. What is wrong is
+/// Puts the values of a document, as they come, into the records that they belong to. What is wrong is
 /// refused where it stands, as a Fault, so nothing is kept that is no part of a host.
-class DescriptionReader {
+class DocumentReader {
  public:
   /// Reads one object of the kind @p top, with those below it.
-  explicit DescriptionReader(Kind top) : top_(top) {}
+  explicit DocumentReader(Kind top) : top_(top) {}
 
   /// Where in the text what follows begins.
   void MoveTo(std::size_t offset) { offset_ = offset; }
@@ -36,7 +36,7 @@ class DescriptionReader {
   [[noreturn]] void Refuse(const std::string& text) const;
 
   /// What was read, once all of it was.
-  Description Take() { return std::move(objects_); }
+  Document Take() { return std::move(objects_); }
 
  private:
   static constexpr std::size_t kNone = static_cast<std::size_t>(-1);
@@ -94,7 +94,7 @@ class DescriptionReader {
   std::string Path() const;
 
   Kind top_;
-  Description objects_;
+  Document objects_;
   std::deque<Level> levels_;  // those that are left stay, to be used again
   std::size_t depth_ = 0;
   std::string bytes_;  // of a value that is put, for its room
@@ -102,4 +102,4 @@ class DescriptionReader {
   std::size_t offset_ = 0;
 };
 
-}  // namespace host
+}  // namespace store

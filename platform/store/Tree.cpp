@@ -1,12 +1,12 @@
-#include "host/Tree.h"
+#include "store/Tree.h"
 
 #include <algorithm>
 
-#include "host/Description.h"
-#include "host/Formats.h"
-#include "host/Storage.h"
+#include "store/Document.h"
+#include "store/Error.h"
+#include "store/Text.h"
 
-namespace host {
+namespace store {
 
 namespace {
 
@@ -47,7 +47,7 @@ void BindName(Statement& statement, std::string_view name) {
 /// An Error where the object is not there, or of another kind.
 void Require(const Object* object, Kind kind) {
   if (object != nullptr && object->kind == kind) return;
-  if (kind == Kind::Host) throw Error(Error::Kind::Damaged, "the object of the host itself is missing");
+  if (kind == RootKind()) throw Error(Error::Kind::Damaged, "the object of the host itself is missing");
   const std::string word(GetKindSpec(kind).word);
   if (object == nullptr) throw Error(Error::Kind::NotFound, "The " + word + " is gone.");
   throw Error(Error::Kind::WrongObject, "The object is no " + word + ".");
@@ -159,7 +159,7 @@ Object Tree::Insert(std::int64_t parent, Kind kind, Record record) {
   Object object{.parent = parent, .kind = kind, .name = std::move(name), .record = std::move(record)};
   aheadCount_ = 0;
   Statement statement(store_, "INSERT INTO object(id, parent, kind, name, record) VALUES(?, ?, ?, ?, ?)");
-  if (kind == Kind::Host) {
+  if (kind == RootKind()) {
     statement.Bind(kRoot);
   } else {
     statement.BindNull();  // gets the next one
@@ -200,4 +200,4 @@ void Tree::Remove(std::int64_t id) {
   statement.Bind(id).Step();
 }
 
-}  // namespace host
+}  // namespace store

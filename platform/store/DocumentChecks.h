@@ -1,4 +1,4 @@
-/// What a description is held against: the schema, value by value, and what its objects say of each other.
+/// What a document is held against: the schema, value by value, and what its objects say of each other.
 #pragma once
 
 #include <cstdint>
@@ -8,17 +8,20 @@
 #include <string_view>
 #include <variant>
 
-#include "host/Description.h"
+#include "store/Document.h"
 
-namespace host {
+namespace store {
 
 /// A value that is no object or list. A number that is not whole, or beyond 64 bits, is a double.
 using Scalar = std::variant<std::monostate, bool, std::int64_t, double, std::string_view>;
 
+/// A number as a scalar: beyond 63 bits it is a double.
+Scalar Whole(std::uint64_t number);
+
 inline constexpr const char* kNoObject = "expected an object in braces";
 inline constexpr const char* kNoList = "expected a list";
 
-/// What is wrong with a description, and where: @p offset counts the bytes in front of it. @p text may be
+/// What is wrong with a document, and where: @p offset counts the bytes in front of it. @p text may be
 /// empty where @p path says all.
 struct Fault : std::runtime_error {
   Fault(std::size_t place, const std::string& path, const std::string& text)
@@ -30,7 +33,7 @@ struct Fault : std::runtime_error {
 std::string Below(const std::string& path, std::string_view key);
 std::string Element(const std::string& path, std::size_t index);
 /// The path of the object with the number @p object.
-std::string PathOf(const Description& description, std::size_t object);
+std::string PathOf(const Document& document, std::size_t object);
 
 /// A record that holds a secret, or nothing but records that do: what stands in the place of a key there may
 /// be a secret itself.
@@ -45,11 +48,9 @@ Scalar DefaultOf(const Key& key);
 // Each throws a Fault.
 
 /// Holds the object with the number @p object against itself, and what is below it against it.
-void RequireRight(const Description& description, std::size_t object);
+void RequireRight(const Document& document, std::size_t object);
 /// For an object whose @p name is empty, or that of the object at @p place of the same list.
-[[noreturn]] void RefuseName(const Description& description, std::size_t object, const std::string& name,
+[[noreturn]] void RefuseName(const Document& document, std::size_t object, const std::string& name,
                              std::size_t place);
-/// Adapters may go ahead of the NICs that are bound to them.
-void RequireBoundNics(const Description& description);
 
-}  // namespace host
+}  // namespace store
