@@ -8,6 +8,7 @@
 
 #include "host/Host.h"
 #include "plinth/CommandLine.h"
+#include "simulator/Simulator.h"
 
 extern "C" void AutoCli_RegisterNamespaces(boost::shared_ptr<Plinth::AutoCli::Namespace> parent);
 
@@ -32,9 +33,9 @@ void UseHost(int count) {
   }
   constexpr char kCapabilities[] =
       R"("capabilities": {"Static Discovery Settable": true, "Sendtarget Discovery Settable": true})";
-  host::Host::Use(host::Host::InMemory(R"({"adapters": [{"name": "hba0", "sendTargets": [)" + lists[0] +
-                                       R"(], "staticTargets": [)" + lists[1] + "], " + kCapabilities +
-                                       R"(}, {"name": "hba1", )" + kCapabilities + "}]}"));
+  host::Host::Use(simulator::HostOf(R"({"adapters": [{"name": "hba0", "sendTargets": [)" + lists[0] +
+                                    R"(], "staticTargets": [)" + lists[1] + "], " + kCapabilities +
+                                    R"(}, {"name": "hba1", )" + kCapabilities + "}]}"));
 }
 
 std::unique_ptr<iScsiInterface> FindAdapter(const char* name) {

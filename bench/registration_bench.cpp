@@ -4,6 +4,7 @@
 
 #include "host/Host.h"
 #include "plinth/CommandLine.h"
+#include "simulator/Simulator.h"
 
 // The plug-in's entry point, which the framework finds by its name.
 extern "C" void AutoCli_RegisterNamespaces(boost::shared_ptr<Plinth::AutoCli::Namespace> parent);
@@ -28,7 +29,7 @@ void AdapterList(benchmark::State& state) {
   for (std::int64_t number = 0; number < state.range(0); ++number) {
     adapters += (number == 0 ? "" : ",") + (R"({"name": "hba)" + std::to_string(number) + "\"}");
   }
-  host::Host::Use(host::Host::InMemory(R"({"adapters": [)" + adapters + "]}"));
+  host::Host::Use(simulator::HostOf(R"({"adapters": [)" + adapters + "]}"));
   const auto root = NewTree();
   for (auto _ : state) {
     Plinth::TextConsole console;

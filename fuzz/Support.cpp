@@ -8,6 +8,8 @@
 #include <iterator>
 #include <nlohmann/json.hpp>
 
+#include "simulator/Simulator.h"
+
 /// Here and not in the environment, so that a finding that is replayed meets the same. Memory that is kept
 /// back, and long histories of it, take most of the time otherwise.
 extern "C" const char* __asan_default_options() {
@@ -47,14 +49,14 @@ std::string FileContents(const std::string& path) {
 }
 
 void RequireThatItReloads(host::Host& host) {
-  static const std::unique_ptr<host::Host> again = host::Host::InMemory("{}");
-  const std::string shown = host.Show(true);
+  static const std::unique_ptr<host::Host> again = simulator::HostOf("{}");
+  const std::string shown = simulator::Show(true, host);
   try {
-    again->Load(shown);
+    simulator::Load(shown, *again);
   } catch (const host::Error& error) {
     Fail(std::string("the host that is shown is refused: ") + error.what() + "\n" + shown);
   }
-  const std::string shownAgain = again->Show(true);
+  const std::string shownAgain = simulator::Show(true, *again);
   // Keys that were set later stand behind others, and mean the same.
   Require(nlohmann::json::parse(shown) == nlohmann::json::parse(shownAgain),
           "the host that is shown is another one after load:\n" + shown + shownAgain);

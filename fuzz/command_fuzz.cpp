@@ -19,6 +19,7 @@
 #include "plinth/Declarations.h"
 #include "plinth/OwnCommands.h"
 #include "simulator/Commands.h"
+#include "simulator/Simulator.h"
 #include "support/SweepTable.h"
 #include "support/Words.h"
 
@@ -233,7 +234,7 @@ extern "C" std::size_t LLVMFuzzerCustomMutator(std::uint8_t* data, std::size_t s
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   static host::Store& store = [&]() -> host::Store& {
-    host::Host::Use(host::Host::InMemory(TheWorld().description));
+    host::Host::Use(simulator::HostOf(TheWorld().description));
     host::SetTraceSink([](const std::string&) {});
     host::Host::Current().GetStore().Execute("CREATE TABLE saved AS SELECT * FROM object");
     return host::Host::Current().GetStore();

@@ -3,9 +3,10 @@
 #include <nlohmann/json.hpp>
 
 #include "Support.h"
-#include "host/Description.h"
 #include "host/Schema.h"
 #include "host/Storage.h"
+#include "simulator/Description.h"
+#include "simulator/Simulator.h"
 
 namespace {
 
@@ -59,7 +60,7 @@ class Mutator {
   }
 
   Json Value(const Key& key) {
-    static const std::vector<std::string> texts = fuzz::TextsOf(std::string(host::DemoDescription()));
+    static const std::vector<std::string> texts = fuzz::TextsOf(std::string(simulator::DemoDescription()));
     switch (key.type) {
       case Type::Text: {
         std::vector<std::string> right;
@@ -102,17 +103,17 @@ extern "C" std::size_t LLVMFuzzerCustomMutator(std::uint8_t* data, std::size_t s
 }
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  static const std::unique_ptr<host::Host> host = host::Host::InMemory("{}");
+  static const std::unique_ptr<host::Host> host = simulator::HostOf("{}");
   try {
-    host->Load(std::string(reinterpret_cast<const char*>(data), size));
+    simulator::Load(std::string(reinterpret_cast<const char*>(data), size), *host);
   } catch (const host::Error& error) {
     fuzz::Require(error.GetKind() == host::Error::Kind::Invalid && *error.what() != 0,
                   std::string("not refused: ") + error.what());
     return 0;
   }
   fuzz::RequireThatItReloads(*host);
-  host->Show(false);
-  host->Reboot();
+  simulator::Show(false, *host);
+  simulator::Reboot(*host);
   fuzz::RequireThatItReloads(*host);
   return 0;
 }

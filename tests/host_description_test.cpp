@@ -9,11 +9,12 @@
 #include <fstream>
 #include <sstream>
 
-#include "host/Description.h"
 #include "host/Host.h"
 #include "host/Schema.h"
 #include "host/Storage.h"
 #include "simulator/Commands.h"
+#include "simulator/Description.h"
+#include "simulator/Simulator.h"
 #include "support/Harness.h"
 #include "support/ProjectFile.h"
 
@@ -40,8 +41,7 @@ void ExpectRefused(const std::string& before, const std::string& after, const st
     const Harness host(R"({"adapters": [{"name": "before"}]})");
     const json shown = host.Show();
     const std::string description = before + keys + after;
-    EXPECT_THAT([&] { host::Host::Current().Load(description); },
-                ThrowsMessage<host::Error>(StartsWith(path + fault)));
+    EXPECT_THAT([&] { simulator::Load(description); }, ThrowsMessage<host::Error>(StartsWith(path + fault)));
     EXPECT_EQ(host.Show(), shown);
   }
 }
@@ -130,7 +130,7 @@ TEST(HostDescription, FaultsOfTheDocumentDoNotRepeatIt) {
   for (const char* text :
        {"{\"secret\": \"hush", "{\"secret\": \"hush; last read: \\q\"}", "{\"secret\" \"hush\"}",
         "{\"secret\": \"hush\"} x", "{\"secret\": hush}", "{\"secret\": \"hush\xff\"}"}) {
-    EXPECT_THAT([&] { host::Host::Current().Load(text); },
+    EXPECT_THAT([&] { simulator::Load(text); },
                 ThrowsMessage<host::Error>(AllOf(HasSubstr("line 1, column"), Not(HasSubstr("hush")))));
   }
 }
@@ -144,8 +144,8 @@ TEST(HostDescription, TextsThatCannotBeStoredAreNotRepeated) {
 }
 
 TEST(HostDescription, OnlyDefaultsComeOnTopOfWhatWasWritten) {
-  const Harness host{std::string(host::DemoDescription())};
-  const json written = json::parse(host::DemoDescription()).flatten();
+  const Harness host{std::string(simulator::DemoDescription())};
+  const json written = json::parse(simulator::DemoDescription()).flatten();
   for (const auto& [pointer, value] : written.items()) EXPECT_EQ(host.Show(pointer), value) << pointer;
 }
 

@@ -13,6 +13,7 @@
 #include "host/Host.h"
 #include "ima/Memory.h"
 #include "ima/Operation.h"
+#include "simulator/Simulator.h"
 #include "support/Harness.h"
 
 using CoreCtl::Storage::iScsiInterfaceImpl;
@@ -70,7 +71,7 @@ TEST(HostOperation, Adapters) {
   EXPECT_THROW(adapter->SetInitiatorAlias(std::string(256, 'x')), NodeCtlException);
   EXPECT_THROW(adapter->SetInitiatorAlias("\xff"), NodeCtlException);
   EXPECT_NO_THROW(adapter->SetInitiatorAlias(std::string(255, 'x')));
-  host::Host::Current().Load("{}");
+  simulator::Load("{}");
   EXPECT_THROW(adapter->GetName(), NodeCtlException);  // gone since
 }
 
@@ -86,7 +87,7 @@ TEST(HostOperation, TheSoftwareAdapterComesAndGoesWithTheInitiator) {
   auto description = host.Show();
   EXPECT_EQ(description["adapters"].size(), 4u);
   description["softwareIscsi"] = {{"enabled", false}};
-  host::Host::Current().Load(description.dump());
+  simulator::Load(description.dump());
   EXPECT_EQ(Adapter("hba2"), nullptr);
 }
 

@@ -11,9 +11,10 @@
 #include <functional>
 #include <sstream>
 
-#include "host/Description.h"
 #include "host/Host.h"
 #include "host/Storage.h"
+#include "simulator/Description.h"
+#include "simulator/Simulator.h"
 #include "support/Harness.h"
 
 using host::Host;
@@ -46,7 +47,7 @@ TEST_F(HostStore, TheJournalIsItsOwnersAlone) {
   for (const mode_t mask : {0u, 0277u}) {
     std::filesystem::remove_all(root_.Path() + "/var");
     umask(mask);
-    Host::Current().Show(false);
+    simulator::Show(false);
     Host::Use(nullptr);
     struct stat journal {};
     {
@@ -67,11 +68,11 @@ TEST_F(HostStore, AnEmptyRootIsNotThisMachine) {
 }
 
 TEST_F(HostStore, ALockThatStaysIsTold) {
-  Host::Current().Show(false);
+  simulator::Show(false);
   host::Store other(File());
   const host::Transaction lock(other, host::Transaction::Access::Change);
   const int before = Host::SetPatience(10);
-  EXPECT_NO_THROW(Host::Current().Show(true));  // who writes does not keep readers out
+  EXPECT_NO_THROW(simulator::Show(true));  // who writes does not keep readers out
   EXPECT_THAT([] { SetAlias("x"); }, ThrowsMessage<NodeCtl::Lib::NodeCtlException>(
                                          HasSubstr(File() + " is locked by another process.")));
   EXPECT_EQ(Host::SetPatience(before), 10);
@@ -84,15 +85,15 @@ TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
   } cases[] = {
       {"alias", [] { SetAlias("other"); }},
       {"disable", [] { CoreCtl::Storage::StorageInfoImpl().DisableSoftwareiScsi(); }},
-      {"load", [] { Host::Current().Load(R"({"adapters": [{"name": "x"}, {"name": "y"}]})"); }},
+      {"load", [] { simulator::Load(R"({"adapters": [{"name": "x"}, {"name": "y"}]})"); }},
   };
   for (const auto& [name, change] : cases) {
     for (const int code : {SQLITE_IOERR, SQLITE_FULL, SQLITE_CORRUPT, SQLITE_NOMEM}) {
       int number = 0;
       bool failed = true;
       while (failed) {
-        Host::Current().Load(std::string(host::DemoDescription()));
-        const std::string before = Host::Current().Show(true);
+        simulator::Load(std::string(simulator::DemoDescription()));
+        const std::string before = simulator::Show(true);
         host::Store& store = Host::Current().GetStore();
         store.FailStatement(++number, code);
         try {
@@ -100,9 +101,9 @@ TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
           failed = false;
           EXPECT_FALSE(store.HasFailed()) << name << ": statement " << number << " failed in silence";
           store.FailStatement(0, 0);
-          EXPECT_NE(Host::Current().Show(true), before) << name;
+          EXPECT_NE(simulator::Show(true), before) << name;
         } catch (const std::exception&) {
-          EXPECT_EQ(Host::Current().Show(true), before) << name << ": statement " << number;
+          EXPECT_EQ(simulator::Show(true), before) << name << ": statement " << number;
         }
       }
       EXPECT_GT(number, 4) << name;
@@ -117,13 +118,13 @@ TEST_F(HostStore, WhicheverStatementOfABatchFailsItsAnswersAreTrue) {
   for (const int code : {SQLITE_IOERR, SQLITE_FULL, SQLITE_BUSY, SQLITE_NOMEM}) {
     int refused = 0;
     for (int number = 1;; ++number) {
-      Host::Use(Host::InMemory(std::string(host::DemoDescription())));
+      Host::Use(simulator::HostOf(std::string(simulator::DemoDescription())));
       host::Store& store = Host::Current().GetStore();
       store.FailStatement(number, code);
       Plinth::TextConsole console;
       Plinth::RunCommandLine(CommandTree(), {"--batch", path, "--keep-going", "--output", "json"}, console);
       if (!store.HasFailed()) break;
-      const auto adapters = nlohmann::json::parse(Host::Current().Show(true)).at("adapters");
+      const auto adapters = nlohmann::json::parse(simulator::Show(true)).at("adapters");
       std::istringstream answers(console.out.text);
       for (std::size_t line = 0; line < 3; ++line) {
         std::string text;

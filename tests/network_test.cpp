@@ -1,7 +1,8 @@
 // The network that adapters see: discovery, logins and their outcomes, what is negotiated, and ways out.
-#include "host/Description.h"
 #include "host/Host.h"
 #include "host/Negotiation.h"
+#include "simulator/Description.h"
+#include "simulator/Simulator.h"
 #include "support/Harness.h"
 
 namespace {
@@ -59,7 +60,7 @@ std::string Rediscover(Harness& host) {
 void Alter(const Harness& host, const json& change) {
   json description = host.Show();
   description.merge_patch(change);
-  host::Host::Current().Load(description.dump());
+  simulator::Load(description.dump());
 }
 
 TEST(Network, EachOutcomeOfALoginShowsAsItself) {
@@ -491,7 +492,7 @@ TEST(Paths, EachBoundNicCarriesASession) {
 }
 
 TEST(DemoHost, IsAsIfItHadBeenRunning) {
-  Harness host{std::string(host::DemoDescription())};
+  Harness host{std::string(simulator::DemoDescription())};
   const json before = host.Show();
   for (const char* adapter : {"hba0", "hba1", "hba2"}) {
     host(std::string("iscsi adapter discovery rediscover -A ") + adapter);

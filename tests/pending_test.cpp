@@ -3,6 +3,7 @@
 
 #include "host/Host.h"
 #include "simulator/Commands.h"
+#include "simulator/Simulator.h"
 #include "support/Harness.h"
 
 namespace {
@@ -87,28 +88,28 @@ TEST(Pending, TakesEffectWhenTheAdapterSaysSo) {
       EXPECT_EQ(shown(), waits && !setting.configured ? setting.before : setting.after);
 
       // Both are in the description, and load brings both back.
-      const std::string described = host::Host::Current().Show(true);
+      const std::string described = simulator::Show(true);
       EXPECT_EQ(described.find("\"pending\"") != described.npos, waits);
-      host::Host::Current().Load(described);
-      EXPECT_EQ(host::Host::Current().Show(true), described);
+      simulator::Load(described);
+      EXPECT_EQ(simulator::Show(true), described);
 
       EXPECT_EQ(Reboot(host).result, true);
       EXPECT_EQ(shown(), setting.after);
-      EXPECT_EQ(host::Host::Current().Show(true).find("\"pending\""), std::string::npos);
+      EXPECT_EQ(simulator::Show(true).find("\"pending\""), std::string::npos);
     }
   }
 }
 
 TEST(Pending, WhatWaitsCanBeTakenBackAndIsKeptBySetsOfOthers) {
   Harness host(HostWith(R"({"applies": {"mtu": "reboot", "parameters": "reboot"}})"));
-  const std::string before = host::Host::Current().Show(true);
+  const std::string before = simulator::Show(true);
   const auto mtu = [&](const char* value) {
     return host(std::string("iscsi physicalnetworkportal param set -A a0 -o MTU -v ") + value).messages;
   };
   EXPECT_THAT(mtu("9000"), ElementsAre(kReboot));
   EXPECT_THAT(mtu("9000"), ElementsAre(kReboot));
   EXPECT_THAT(mtu("1500"), IsEmpty());
-  EXPECT_EQ(host::Host::Current().Show(true), before);
+  EXPECT_EQ(simulator::Show(true), before);
 
   // The second set is written back whole, and must not take the first one back.
   host("iscsi adapter param set -A a0 -k MaxCmds -v 64");
@@ -123,14 +124,14 @@ TEST(Pending, ParametersThatTheDescriptionDoesNotNameAreTakenBack) {
   for (const char* line :
        {"-k LoginTimeout -v 20|-k LoginTimeout -v 15", "-k HeaderDigest -v required|-k HeaderDigest -D"}) {
     Harness host(HostWith(R"({"applies": {"parameters": "reboot"}})"));
-    const std::string before = host::Host::Current().Show(true);
+    const std::string before = simulator::Show(true);
     const std::string lines = line;
     const std::string set = "iscsi adapter param set -A a0 ";
     for (int time = 0; time < 2; ++time) {
       EXPECT_THAT(host(set + lines.substr(0, lines.find('|'))).messages, ElementsAre(kReboot)) << line;
     }
     EXPECT_THAT(host(set + lines.substr(lines.find('|') + 1)).messages, IsEmpty()) << line;
-    EXPECT_EQ(host::Host::Current().Show(true), before);
+    EXPECT_EQ(simulator::Show(true), before);
   }
 }
 
@@ -182,7 +183,7 @@ TEST(Pending, InheritanceWaitsToo) {
   const Outcome run = host("iscsi adapter target portal param set -k MaxCmds -I" + kPlace);
   EXPECT_EQ(run.result, true) << run.failure;
   EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/pending/reboot/parameters"), (json{{"MaxCmds", nullptr}}));
-  host::Host::Current().Load(host.Show().dump());
+  simulator::Load(host.Show().dump());
   EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/parameters/MaxCmds"), 64);
   Reboot(host);
   EXPECT_EQ(host.Show("/adapters/0/staticTargets/0/parameters"), json::object());

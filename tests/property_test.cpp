@@ -4,6 +4,7 @@
 
 #include "host/Host.h"
 #include "simulator/Commands.h"
+#include "simulator/Simulator.h"
 #include "support/Harness.h"
 #include "support/SweepTable.h"
 
@@ -58,15 +59,15 @@ class Sequence {
       host["remoteTargets"].push_back(std::move(remote));
     }
     lines_ += "load " + host["remoteTargets"].dump() + '\n';
-    host::Host::Current().Load(host.dump());
+    simulator::Load(host.dump());
   }
 
   /// No two sessions are one, and what is shown loads, and is an equal host then.
   void Look() {
     const std::vector<std::string> sessions = host_("iscsi session list").Column("ID");
     EXPECT_EQ(std::set<std::string>(sessions.begin(), sessions.end()).size(), sessions.size());
-    const std::string shown = host::Host::Current().Show(true);
-    host::Host::Current().Load(shown);
+    const std::string shown = simulator::Show(true);
+    simulator::Load(shown);
     EXPECT_EQ(json::diff(json::parse(shown), host_.Show()), json::array());
   }
 

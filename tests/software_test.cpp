@@ -2,6 +2,7 @@
 #include <fstream>
 
 #include "host/Host.h"
+#include "simulator/Simulator.h"
 #include "support/Harness.h"
 
 namespace {
@@ -89,7 +90,7 @@ TEST_F(Software, TheNameGivenLastHoldsFromTheNextStartOn) {
   };
   for (const auto& [line, name] : steps) {
     if (line == "reboot") {
-      host::Host::Current().Reboot();
+      simulator::Reboot();
     } else {
       ASSERT_EQ(host(line).status, 0) << line;
     }

@@ -9,12 +9,10 @@
 #include <new>
 #include <utility>
 
-#include "host/Description.h"
 #include "host/Failure.h"
-#include "host/Restart.h"
+#include "host/Platform.h"
 #include "host/Storage.h"
 #include "store/Rehearsal.h"
-#include "store/Tables.h"
 
 namespace host {
 
@@ -53,17 +51,6 @@ void Trace(const Call& call, const std::string& outcome) {
   if (!IsTraceWanted()) return;
   if (Rehearsal* rehearsal = Rehearsal::Current()) return rehearsal->trace.push_back(line);
   std::fprintf(stderr, "%s\n", line.c_str());
-}
-
-std::unique_ptr<Store> DescribedStore(const std::string& text) {
-  Description description = ReadDescription(text);
-  auto store = std::make_unique<Store>();
-  Transaction transaction(*store, Transaction::Access::Change);
-  CreateTables(*store);
-  Tree tree(*store);
-  LoadDescription(tree, std::move(description));
-  transaction.Commit();
-  return store;
 }
 
 }  // namespace
@@ -147,8 +134,8 @@ bool Host::CommitGroup() noexcept {
   }
 }
 
-std::unique_ptr<Host> Host::InMemory(const std::string& description) {
-  return std::unique_ptr<Host>(new Host("", DescribedStore(description)));
+std::unique_ptr<Host> Host::InMemory(std::unique_ptr<Store> store) {
+  return std::unique_ptr<Host>(new Host("", std::move(store)));
 }
 
 Store& Host::GetStore() {
@@ -166,13 +153,13 @@ Store& Host::GetStore() {
     }
     if (Rehearsal::Current() != nullptr) {
       isStoreRehearsed_ = true;
-      store_ = DescribedStore(std::string(DemoDescription()));
+      store_ = Platform::Current().NewStore();
       store_->BeginRehearsal();
       tree_.emplace(*store_);
       return *store_;
     }
     // Built whole before it gets its name: nobody ever opens half a host, and the first of two wins.
-    const std::string bytes = DescribedStore(std::string(DemoDescription()))->Serialize();
+    const std::string bytes = Platform::Current().NewStore()->Serialize();
     MakeFoldersFor(path_);
     NewFile file(path_);
     file.Write(bytes);
@@ -193,8 +180,8 @@ Error Host::Located(const Error& error) {
                "The host database " + GetStore().GetPath() + " is damaged: " + error.what() + ".");
 }
 
-template <class Work>
-void Host::Simulate(const char* call, Transaction::Access access, Work work) try {
+void Host::Administer(const char* call, Transaction::Access access,
+                      const std::function<void(Tree&)>& work) try {
   GetStore().CheckStructure();
   Transaction transaction(GetStore(), access);
   Tree tree(GetStore());
@@ -205,29 +192,6 @@ void Host::Simulate(const char* call, Transaction::Access access, Work work) try
 } catch (const Error& error) {
   throw Located(error);
 }
-
-void Host::Load(const std::string& text) {
-  // Nobody has to wait while a large one is read.
-  Description description = ReadDescription(text);
-  // A page written before its time would lock out readers for the whole of a long load.
-  GetStore().Execute("PRAGMA cache_spill=off");
-  Simulate("Load(...)", Transaction::Access::Change,
-           [&](Tree& tree) { LoadDescription(tree, std::move(description)); });
-}
-
-std::string Host::Show(bool secrets) {
-  std::string text;
-  Simulate("Show()", Transaction::Access::Read, [&](Tree& tree) { text = ShowDescription(tree, secrets); });
-  return text;
-}
-
-std::vector<WaitingChange> Host::ShowPending() {
-  std::vector<WaitingChange> changes;
-  Simulate("ShowPending()", Transaction::Access::Read, [&](Tree& tree) { changes = WaitingChanges(tree); });
-  return changes;
-}
-
-void Host::Reboot() { Simulate("Reboot()", Transaction::Access::Change, host::Reboot); }
 
 Host::Begun::Begun(Host& host, const Call& call, Transaction::Access access)
     : transaction_(host.GetStore(), access), tree_(*host.tree_) {

@@ -1,4 +1,4 @@
-/// The simulated host, and the one point that every library operation passes.
+/// The host, and the one point that every library operation passes.
 #pragma once
 
 #include <cstdint>
@@ -11,7 +11,6 @@
 
 #include "host/Call.h"
 #include "host/CallLog.h"
-#include "host/Pending.h"
 #include "host/Storage.h"
 #include "host/Tree.h"
 
@@ -22,7 +21,7 @@ namespace host {
 class Host {
  public:
   /// The host of this process: the one given to Use, else the one under HCLI_ROOT, opened at the first call
-  /// and made from the demo description where there is none.
+  /// and made by its platform where there is none.
   static Host& Current();
   /// Makes @p host the current one. Null closes it, and the next Current() opens the one under HCLI_ROOT.
   static void Use(std::unique_ptr<Host> host);
@@ -47,7 +46,7 @@ class Host {
   /// that would not be undone with the group, and of all that others should not have to wait for.
   void Settle();
 
-  static std::unique_ptr<Host> InMemory(const std::string& description);
+  static std::unique_ptr<Host> InMemory(std::unique_ptr<Store> store);
 
   /// Runs @p body with a Tree& as the work of @p call: in one transaction, whole or not at all, durable when
   /// it returns. Answers of the description go before the body or instead of it, and the trace gets its line.
@@ -71,22 +70,15 @@ class Host {
     });
   }
 
-  /// For the simulator's own use: neither traced nor answered.
-  /// @p text is a host description.
-  void Load(const std::string& text);
-  std::string Show(bool secrets);
-  std::vector<WaitingChange> ShowPending();
-  void Reboot();
+  /// Runs @p work in one transaction, neither traced nor answered, for what a platform does to the host as a
+  /// whole. @p call is what a rehearsal shows of a change.
+  void Administer(const char* call, Transaction::Access access, const std::function<void(Tree&)>& work);
 
   /// Opens the store where that was not done yet.
   Store& GetStore();
 
  private:
   Host(std::string path, std::unique_ptr<Store> store);
-
-  /// @p call is what a rehearsal shows of it.
-  template <class Work>
-  void Simulate(const char* call, Transaction::Access access, Work work);
 
   /// A transaction in which the answers have had their say: it throws, or its tree knows the status to give.
   class Begun {

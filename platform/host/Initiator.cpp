@@ -8,6 +8,7 @@
 #include "host/Formats.h"
 #include "host/LevelSchema.h"
 #include "host/Negotiation.h"
+#include "host/Platform.h"
 #include "host/Storage.h"
 
 namespace host {
@@ -170,7 +171,7 @@ bool GoesBy(const Object& session, const WayOut& way) {
 }  // namespace
 
 Initiator::Initiator(Tree& tree, const Object& adapter)
-    : tree_(tree), adapter_(adapter), network_(NetworkOf(tree)) {
+    : tree_(tree), adapter_(adapter), network_(Platform::Current().NetworkOf(tree)) {
   if (adapter.record.GetInt("state") != 0) {
     throw Error(Error::Kind::WrongState, "The adapter " + adapter.name + " is not online.");
   }

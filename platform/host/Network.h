@@ -6,7 +6,6 @@
 #pragma once
 
 #include <cstdint>
-#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
@@ -14,8 +13,6 @@
 #pragma GCC visibility push(default)
 
 namespace host {
-
-class Tree;
 
 /// How one side of a login stands to something that it may do or not; the words are kDemands.
 enum class Demand : std::uint8_t { Prohibited, Discouraged, Preferred, Required };
@@ -140,9 +137,6 @@ class Network {
   /// Ends a session; what the target says to it changes nothing.
   virtual void Logout(const LogoutRequest& request) = 0;
 };
-
-/// The network of the host @p tree, for the length of one operation.
-std::unique_ptr<Network> NetworkOf(Tree& tree);
 
 }  // namespace host
 

@@ -2,6 +2,7 @@
 
 #include "host/Initiator.h"
 #include "host/LoginStatus.h"
+#include "host/Platform.h"
 
 namespace host {
 
@@ -13,7 +14,7 @@ Initiator InitiatorOf(Tree& tree, const KnownTarget& target) {
 
 void LogoutFrom(Tree& tree, const Object& adapter, const Object& target,
                 const std::vector<Object>& sessions) {
-  const std::unique_ptr<Network> network = NetworkOf(tree);
+  const std::unique_ptr<Network> network = Platform::Current().NetworkOf(tree);
   for (const Object& session : sessions) {
     network->Logout({adapter.record.GetString("initiatorName"), target.name, session.record.GetString("isid"),
                      session.record.GetInt("tsih")});

@@ -4,9 +4,9 @@
 #include <string>
 
 #include "host/CallLog.h"
-#include "host/Description.h"
-#include "host/Host.h"
 #include "host/Storage.h"
+#include "simulator/Description.h"
+#include "simulator/Simulator.h"
 
 namespace simulator {
 
@@ -62,7 +62,7 @@ class SimulatorCommand : public AutoCli::Command {
 
   /// Makes @p description the host.
   static boost::shared_ptr<MetaObj::MetaObject> Load(const std::string& description) {
-    host::Host::Current().Load(description);
+    simulator::Load(description);
     return MetaObj::MetaBool::New(true);
   }
 };
@@ -115,7 +115,7 @@ class SimulatorShow final : public SimulatorCommand {
   boost::shared_ptr<MetaObj::MetaObject> Prototype() override { return MetaObj::MetaString::New("{}"); }
 
   boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input& input) override {
-    return MetaObj::MetaString::New(host::Host::Current().Show(input.GetFlag(kSecrets)));
+    return MetaObj::MetaString::New(simulator::Show(input.GetFlag(kSecrets)));
   }
 };
 
@@ -145,7 +145,7 @@ class SimulatorPending final : public SimulatorCommand {
 
   boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input&) override {
     const auto list = MetaObj::MetaList::New(MetaObj::MetaType::Struct, Row({}));
-    for (const host::WaitingChange& change : host::Host::Current().ShowPending()) list->Append(Row(change));
+    for (const host::WaitingChange& change : simulator::ShowPending()) list->Append(Row(change));
     return list;
   }
 };
@@ -156,7 +156,7 @@ class SimulatorReset final : public SimulatorCommand {
 
  private:
   boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input&) override {
-    return Load(std::string(host::DemoDescription()));
+    return Load(std::string(DemoDescription()));
   }
 };
 
@@ -168,7 +168,7 @@ class SimulatorReboot final : public SimulatorCommand {
 
  private:
   boost::shared_ptr<MetaObj::MetaObject> Run(const CallSpec::Input&) override {
-    host::Host::Current().Reboot();
+    simulator::Reboot();
     return MetaObj::MetaBool::New(true);
   }
 };

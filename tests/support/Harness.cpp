@@ -10,6 +10,7 @@
 #include "plinth/Declarations.h"
 #include "plinth/Formatter.h"
 #include "plinth/OwnCommands.h"
+#include "simulator/Simulator.h"
 #include "support/ProjectFile.h"
 #include "support/Words.h"
 
@@ -82,7 +83,7 @@ Plinth::AutoCli::Namespace& CommandTree() {
 }
 
 Harness::Harness(const std::string& description) {
-  host::Host::Use(host::Host::InMemory(description));
+  host::Host::Use(simulator::HostOf(description));
   host::SetTraceSink([this](const std::string& line) { trace.push_back(line); });
 }
 
@@ -126,7 +127,7 @@ Outcome Harness::Finish(Plinth::RunRecord record, Plinth::TextConsole& console) 
   return run;
 }
 
-json Harness::Show() const { return json::parse(host::Host::Current().Show(true)); }
+json Harness::Show() const { return json::parse(simulator::Show(true)); }
 
 json Harness::Show(const std::string& pointer) const { return Show().at(json::json_pointer(pointer)); }
 

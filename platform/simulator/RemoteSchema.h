@@ -4,7 +4,9 @@
 #include "host/LevelSchema.h"
 #include "host/Negotiation.h"
 
-namespace host {
+namespace simulator {
+
+using namespace host;
 
 inline constexpr Key kRemoteChapKeys[] = {
     Word("level",
@@ -79,4 +81,4 @@ inline constexpr Key kRemoteTargetKeys[] = {
 
 inline constexpr std::string_view kRemotePortalName[] = {"host", "port"};
 
-}  // namespace host
+}  // namespace simulator

@@ -1,14 +1,17 @@
-/// The network that the description of the host tells of.
+#include "simulator/SimulatedNetwork.h"
+
 #include <algorithm>
 #include <map>
 #include <set>
 
 #include "host/Formats.h"
-#include "host/RemoteSchema.h"
 #include "host/Storage.h"
 #include "host/Tree.h"
+#include "simulator/RemoteSchema.h"
 
-namespace host {
+namespace simulator {
+
+using namespace host;
 
 namespace {
 
@@ -51,7 +54,7 @@ std::uint32_t Authenticate(const ChapSettings& own, const Record& theirs, bool& 
 
 class SimulatedNetwork final : public Network {
  public:
-  explicit SimulatedNetwork(Tree& tree) : tree_(tree) {}
+  explicit SimulatedNetwork(host::Tree& tree) : tree_(tree) {}
 
   SendTargetsAnswer SendTargets(const Request& request) override {
     const auto portal = FindPortal(request.portal);
@@ -172,13 +175,13 @@ class SimulatedNetwork final : public Network {
     return tsihs;
   }
 
-  Tree& tree_;
+  host::Tree& tree_;
   std::vector<std::int64_t> adapters_;
   std::optional<std::map<std::string, std::vector<FoundTarget>>> targetsAt_;
 };
 
 }  // namespace
 
-std::unique_ptr<Network> NetworkOf(Tree& tree) { return std::make_unique<SimulatedNetwork>(tree); }
+std::unique_ptr<Network> MakeNetwork(host::Tree& tree) { return std::make_unique<SimulatedNetwork>(tree); }
 
-}  // namespace host
+}  // namespace simulator

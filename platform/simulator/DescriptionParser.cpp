@@ -4,11 +4,13 @@
 #include <nlohmann/json.hpp>
 #include <set>
 
-#include "host/Description.h"
+#include "simulator/Description.h"
 #include "store/DocumentChecks.h"
 #include "store/DocumentReader.h"
 
-namespace host {
+namespace simulator {
+
+using namespace host;
 
 namespace {
 
@@ -123,4 +125,4 @@ Description ReadDescription(const std::string& text) try {
               fault.what() + (" (line " + std::to_string(line)) + ", column " + std::to_string(column) + ")");
 }
 
-}  // namespace host
+}  // namespace simulator

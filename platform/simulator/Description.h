@@ -14,25 +14,25 @@
 
 #pragma GCC visibility push(default)
 
-namespace host {
+namespace simulator {
 
 /// The objects in the order in which they begin: the host, and each behind its parent.
-using Description = Document;
+using Description = store::Document;
 
 /// What @p text describes. What is no part of a host is refused where it begins, so that neither memory nor
 /// depth is ever more than a host of this size takes.
 Description ReadDescription(const std::string& text);
 
 /// Replaces all that is in @p tree by what @p description has.
-void LoadDescription(Tree& tree, Description description);
+void LoadDescription(host::Tree& tree, Description description);
 
 /// The description of @p tree, which LoadDescription reads into an equal one. Without @p secrets, they are
 /// masked, and LoadDescription refuses it.
-std::string ShowDescription(Tree& tree, bool secrets);
+std::string ShowDescription(host::Tree& tree, bool secrets);
 
 /// The description of the demo host, which a first run starts from.
 std::string_view DemoDescription();
 
-}  // namespace host
+}  // namespace simulator
 
 #pragma GCC visibility pop

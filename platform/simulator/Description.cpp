@@ -1,11 +1,13 @@
-#include "host/Description.h"
+#include "simulator/Description.h"
 
 #include <nlohmann/json.hpp>
 #include <vector>
 
 #include "host/Tree.h"
 
-namespace host {
+namespace simulator {
+
+using namespace host;
 
 namespace {
 
@@ -21,7 +23,7 @@ void Mask(std::span<const Key> keys, Json& record) {
   }
 }
 
-Json Show(Tree& tree, const Object& object, bool secrets) {
+Json Show(host::Tree& tree, const Object& object, bool secrets) {
   const KindSpec& spec = GetKindSpec(object.kind);
   Json json = object.record.GetJson();
   if (!secrets) Mask(spec.keys, json);
@@ -35,7 +37,7 @@ Json Show(Tree& tree, const Object& object, bool secrets) {
 
 }  // namespace
 
-void LoadDescription(Tree& tree, Description description) {
+void LoadDescription(host::Tree& tree, Description description) {
   tree.Clear();
   std::vector<std::int64_t> ids;
   ids.reserve(description.size());
@@ -45,8 +47,8 @@ void LoadDescription(Tree& tree, Description description) {
   }
 }
 
-std::string ShowDescription(Tree& tree, bool secrets) {
+std::string ShowDescription(host::Tree& tree, bool secrets) {
   return Show(tree, tree.Get(kRoot, Kind::Host), secrets).dump(2);
 }
 
-}  // namespace host
+}  // namespace simulator
