@@ -106,6 +106,11 @@ TEST(PlinthFormatters, FitTablesToTheTerminal) {
   }
 }
 
+const std::string kHelpEnd =
+    " 0 a result, nothing reported; 1 something reported, no result; 2 a\n"
+    "wrong command line, nothing run; 3 a result, and something reported; 4 a failure\nof the program.\n\n"
+    "\"hcli --help\" lists the global options.\n";
+
 TEST(PlinthFormatters, ColourHeadingsAndFailures) {
   const auto probe = NewProbe(Port("p", 1, true));
   probe->SetDefaultOutputParameter("header:Port", "%Name%");
@@ -114,10 +119,10 @@ TEST(PlinthFormatters, ColourHeadingsAndFailures) {
                        {{colours, "--fields=MTU", "--output=table"}, "\x1b[1mMTU\n\x1b[0m---\n  1\n"},
                        {{colours, "--fields=MTU", "--output=csv"}, "MTU\r\n1\r\n"},
                        {{colours, "--output=json", "--version"}, Document(0, "", R"("hcli 0.1.0\n")")}});
-  ExpectLines(*NewProbe(MetaBool::New(true)),
-              {{{colours, "--help"},
-                "\x1b[1mUsage:\x1b[0m hcli\n\nhcli --help lists the global options.\n\n"
-                "\x1b[1mResult:\x1b[0m bool\n"}});
+  ExpectLines(
+      *NewProbe(MetaBool::New(true)),
+      {{{colours, "--help"},
+        "\x1b[1mUsage:\x1b[0m hcli\n\n\x1b[1mResult:\x1b[0m bool\n\n\x1b[1mExit status:\x1b[0m" + kHelpEnd}});
   TextConsole console;
   RunCommand(*probe, {colours, "--nope"}, console);
   EXPECT_EQ(console.error.text, "\x1b[31mhcli: unknown option \"--nope\"; --help lists the options\n\x1b[0m");
@@ -238,8 +243,9 @@ TEST(PlinthRun, ResolvesWordsOrTellsWhatIsThere) {
            "Usage: hcli net port list --way TEXT [OPTIONS]\n\nList ports.\n\nOptions:\n"
            "  -w, --way TEXT (required)\n          Way. [in, out]\n          in: inwards\n"
            "      --mode\n          \"-\" reads it from standard input, without echo.\n\n"
-           "hcli --help lists the global options.\n\n"
-           "Result: list with the fields\n  Name     string\n  MTU      int\n  Link Up  bool\n"},
+           "Result: list with the fields\n  Name     string\n  MTU      int\n  Link Up  bool\n\nExit "
+           "status:" +
+               kHelpEnd},
       });
 }
 

@@ -127,8 +127,8 @@ class Catalogue final : public virtual AutoCli::Command {
 
 }  // namespace
 
-boost::shared_ptr<AutoCli::Command> NewCatalogue(AutoCli::Namespace& root) {
-  return boost::shared_ptr<AutoCli::Command>(new Catalogue(root));
+boost::shared_ptr<AutoCli::NamespaceNode> NewCatalogue(AutoCli::Namespace& root) {
+  return boost::shared_ptr<AutoCli::NamespaceNode>(new Catalogue(root));
 }
 
 }  // namespace Plinth

@@ -1,6 +1,8 @@
 #include <stdlib.h>
 
+#include <algorithm>
 #include <cstring>
+#include <iterator>
 
 #include "plinth/Run.h"
 #include "plinth/Text.h"
@@ -28,7 +30,9 @@ std::string WithHeadings(const std::string& help) {
   for (std::string& line : lines) {
     const std::size_t end = line.find(':');
     if (line.empty() || line.front() == ' ' || end == line.npos) continue;
-    if (end + 1 == line.size() || line.starts_with("Usage:") || line.starts_with("Result:")) {
+    static constexpr const char* kWithText[] = {"Usage:", "Result:", "Exit status:"};
+    const auto begins = [&](const char* heading) { return line.starts_with(heading); };
+    if (end + 1 == line.size() || std::any_of(std::begin(kWithText), std::end(kWithText), begins)) {
       line = kHeading + line.substr(0, end + 1) + kPlain + line.substr(end + 1);
     }
   }

@@ -71,10 +71,6 @@ RunRecord RunCommand(AutoCli::Command& command, const std::vector<std::string>& 
 /// without fields is open: its fields are not looked at.
 std::string CheckResult(const MetaObj::MetaObject* prototype, const MetaObj::MetaObject& posted);
 
-/// The help of a node that stands at @p path ("" for the root), as --help shows it on @p screen
-/// columns.
-std::string HelpText(AutoCli::NamespaceNode& node, const std::string& path, std::size_t screen);
-
 /// Hangs the framework's own commands under @p root.
 void RegisterOwnCommands(AutoCli::Namespace& root);
 

@@ -113,12 +113,12 @@ OpenLine LineAtCursor() {
   return line;
 }
 
-boost::shared_ptr<AutoCli::Command> NewCompletion(AutoCli::Namespace&) {
-  return boost::shared_ptr<AutoCli::Command>(new Completion);
+boost::shared_ptr<AutoCli::NamespaceNode> NewCompletion(AutoCli::Namespace&) {
+  return boost::shared_ptr<AutoCli::NamespaceNode>(new Completion);
 }
 
-boost::shared_ptr<AutoCli::Command> NewProposal(AutoCli::Namespace& root) {
-  return boost::shared_ptr<AutoCli::Command>(new Proposal(root));
+boost::shared_ptr<AutoCli::NamespaceNode> NewProposal(AutoCli::Namespace& root) {
+  return boost::shared_ptr<AutoCli::NamespaceNode>(new Proposal(root));
 }
 
 }  // namespace Plinth

@@ -46,7 +46,7 @@ constexpr GlobalOption kGlobalOptions[] = {
     {"plugins", ParameterType::String, "", "The folder to load plug-ins from; HCLI_PLUGINS names it too.",
      nullptr, nullptr, nullptr},
     {"help", ParameterType::Flag, "h", "Show this help.", nullptr, nullptr, nullptr},
-    {"version", ParameterType::Flag, "", "Show the version.", nullptr, nullptr, nullptr},
+    {"version", ParameterType::Flag, "V", "Show the version.", nullptr, nullptr, nullptr},
 };
 
 }  // namespace

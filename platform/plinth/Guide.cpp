@@ -10,7 +10,7 @@
 #include <new>
 #include <string_view>
 
-#include "plinth/Declarations.h"
+#include "plinth/Options.h"
 #include "plinth/OwnCommands.h"
 #include "plinth/Text.h"
 
@@ -47,7 +47,7 @@ class GuideReader {
         ForEachItem(value, [&](const yaml_node_t& item) { guide.values.push_back(ReadSource(item)); });
       } else if (key == "commands") {
         ForEachPair(value, [&](const std::string& path, const yaml_node_t& command) {
-          guide.examples[path] = ReadExamples(command);
+          ReadCommand(command, path, guide);
         });
       } else if (key == "fields") {
         ForEachPair(value, [&](const std::string& structure, const yaml_node_t& fields) {
@@ -55,14 +55,25 @@ class GuideReader {
             guide.fields[structure][field] = Text(meaning);
           });
         });
+      } else if (KeyValues* const texts = FindTexts(guide, key)) {
+        ForEachPair(value, [&](const std::string& name, const yaml_node_t& meaning) {
+          texts->emplace_back(name, Text(meaning));
+        });
       } else {
-        FailKey(value, key, "values, commands and fields");
+        FailKey(value, key, "values, commands, fields, terms, environment and files");
       }
     });
     return guide;
   }
 
  private:
+  static KeyValues* FindTexts(Guide& guide, const std::string& key) {
+    return key == "terms"         ? &guide.terms
+           : key == "environment" ? &guide.environment
+           : key == "files"       ? &guide.files
+                                  : nullptr;
+  }
+
   [[noreturn]] void Fail(std::size_t line, const std::string& text) const {
     throw GuideError(file_ + ':' + std::to_string(line + 1) + ": " + text);
   }
@@ -116,8 +127,10 @@ class GuideReader {
         ForEachItem(value, [&](const yaml_node_t& option) { source.with.push_back(Text(option)); });
       } else if (key == "kind") {
         source.kind = ReadKind(value);
+      } else if (key == "listed") {
+        if (!ReadTruth(Text(value), source.isListed)) Fail(value, "either yes or no has to stand here");
       } else {
-        FailKey(value, key, "option, of, from, field, about, with and kind");
+        FailKey(value, key, "option, of, from, field, about, with, kind and listed");
       }
     });
     const bool isShown = source.kind == ValueSource::Kind::Shown;
@@ -135,20 +148,27 @@ class GuideReader {
     Fail(node, "the kind " + Quoted(kind) + " is none; there are file and folder");
   }
 
-  std::vector<Example> ReadExamples(const yaml_node_t& node) {
-    std::vector<Example> examples;
-    ForEachPair(node, [&](const std::string& key, const yaml_node_t& list) {
-      if (key != "examples") FailKey(list, key, "examples");
-      ForEachItem(list, [&](const yaml_node_t& item) {
-        Example& example = examples.emplace_back();
-        ForEachPair(item, [&](const std::string& name, const yaml_node_t& text) {
-          if (name != "about" && name != "line") FailKey(text, name, "about and line");
-          (name == "about" ? example.about : example.line) = Text(text);
-        });
-        if (example.about.empty() || example.line.empty()) Fail(item, "an example has about and line");
-      });
+  void ReadCommand(const yaml_node_t& node, const std::string& path, Guide& guide) {
+    ForEachPair(node, [&](const std::string& key, const yaml_node_t& value) {
+      if (key == "result") {
+        guide.results[path] = Text(value);
+      } else if (key == "examples") {
+        ForEachItem(value,
+                    [&](const yaml_node_t& item) { guide.examples[path].push_back(ReadExample(item)); });
+      } else {
+        FailKey(value, key, "result and examples");
+      }
     });
-    return examples;
+  }
+
+  Example ReadExample(const yaml_node_t& node) {
+    Example example;
+    ForEachPair(node, [&](const std::string& key, const yaml_node_t& text) {
+      if (key != "about" && key != "line") FailKey(text, key, "about and line");
+      (key == "about" ? example.about : example.line) = Text(text);
+    });
+    if (example.about.empty() || example.line.empty()) Fail(node, "an example has about and line");
+    return example;
   }
 
   std::string file_;
@@ -159,6 +179,13 @@ class GuideReader {
 std::string& GuideFolder() {
   static std::string folder;
   return folder;
+}
+
+template <class Value>
+const Value& FindOrEmpty(const std::map<std::string, Value>& values, const std::string& key) {
+  static const Value empty;
+  const auto found = values.find(key);
+  return found == values.end() ? empty : found->second;
 }
 
 /// True where @p path is @p place, or stands in it.
@@ -178,17 +205,13 @@ const ValueSource* Guide::FindValues(const std::string& path, const std::string&
 }
 
 const std::vector<Example>& Guide::ExamplesOf(const std::string& path) const {
-  static const std::vector<Example> none;
-  const auto found = examples.find(path);
-  return found == examples.end() ? none : found->second;
+  return FindOrEmpty(examples, path);
 }
 
+const std::string& Guide::ResultOf(const std::string& path) const { return FindOrEmpty(results, path); }
+
 const std::string& Guide::MeaningOf(const std::string& structure, const std::string& field) const {
-  static const std::string none;
-  const auto meanings = fields.find(structure);
-  if (meanings == fields.end()) return none;
-  const auto meaning = meanings->second.find(field);
-  return meaning == meanings->second.end() ? none : meaning->second;
+  return FindOrEmpty(FindOrEmpty(fields, structure), field);
 }
 
 Guide ReadGuide(const std::string& file) { return GuideReader(file).Read(); }

@@ -12,6 +12,8 @@
 #include <string>
 #include <vector>
 
+#include "plinth/Declarations.h"
+
 #pragma GCC visibility push(default)
 
 namespace Plinth {
@@ -31,6 +33,8 @@ struct ValueSource {
   /// Options that both commands have, and that narrow down what is shown.
   std::vector<std::string> with;
   enum class Kind { Shown, File, Folder } kind = Kind::Shown;
+  /// Few enough, and the same for long enough, to be listed in help.
+  bool isListed = false;
 };
 
 /// A command line that works on the demo host.
@@ -43,14 +47,23 @@ struct Guide {
   std::vector<ValueSource> values;
   /// By the words that lead to the command.
   std::map<std::string, std::vector<Example>> examples;
+  /// What a result that has no fields says, likewise.
+  std::map<std::string, std::string> results;
   /// What fields mean, by the type name of their structure and their own.
   std::map<std::string, std::map<std::string, std::string>> fields;
+  /// Other words that results show and options take, with their meanings.
+  KeyValues terms;
+  /// Variables of the environment, and files, with what they are for.
+  KeyValues environment;
+  KeyValues files;
 
   /// Where the values of the option of the command at @p path come from: the source that is about the
   /// nearest place; null where nothing is known.
   const ValueSource* FindValues(const std::string& path, const std::string& option) const;
   /// None where none are known.
   const std::vector<Example>& ExamplesOf(const std::string& path) const;
+  /// What the result of the command at @p path says; empty where nothing is known.
+  const std::string& ResultOf(const std::string& path) const;
   /// What the field means; empty where nothing is known.
   const std::string& MeaningOf(const std::string& structure, const std::string& field) const;
 };

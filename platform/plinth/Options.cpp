@@ -133,7 +133,8 @@ void OptionTable::Take(const Parameter& parameter, const std::string* text) {
 
 bool OptionTable::TakeOperand(const std::string& text) {
   for (const Parameter& parameter : parameters_) {
-    if (!MayBeOperand(parameter) || For(parameter).given) continue;
+    const bool isFull = For(parameter).given && parameter.type != ParameterType::StringList;
+    if (!MayBeOperand(parameter) || isFull) continue;
     Take(parameter, &text);
     return true;
   }

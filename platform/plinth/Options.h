@@ -48,7 +48,8 @@ class OptionTable {
 
   /// Takes @p text, checked, as a value of the parameter; null means a bare flag.
   void Take(const Parameter& parameter, const std::string* text);
-  /// Takes a value for the next parameter that may stand without its name. False where there is none.
+  /// Takes a value for the next parameter that may stand without its name; a list takes all that follow.
+  /// False where there is none.
   bool TakeOperand(const std::string& text);
   void RequireAll() const;
   /// Takes over what @p other, of the same parameters, has for the parameter, unless it is given here.

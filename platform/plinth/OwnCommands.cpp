@@ -13,6 +13,12 @@ const OwnCommand* FindOwnCommand(const std::string& name) {
   return found == std::end(kOwnCommands) ? nullptr : found;
 }
 
+boost::shared_ptr<AutoCli::NamespaceNode> NewHelp(AutoCli::Namespace&) {
+  auto help = AutoCli::Namespace::New();
+  help->SetDescription("Show the help on what the words behind it lead to.");
+  return help;
+}
+
 void RegisterOwnCommands(AutoCli::Namespace& root) {
   for (const OwnCommand& command : kOwnCommands) {
     root.RegisterNamespaceNode(command.make(root), command.name);

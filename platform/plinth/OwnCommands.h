@@ -11,11 +11,18 @@
 namespace Plinth {
 
 /// Shows every node under @p root, which holds the command and so outlives it.
-boost::shared_ptr<AutoCli::Command> NewCatalogue(AutoCli::Namespace& root);
+boost::shared_ptr<AutoCli::NamespaceNode> NewCatalogue(AutoCli::Namespace& root);
 /// Writes the scripts by which shells complete command lines.
-boost::shared_ptr<AutoCli::Command> NewCompletion(AutoCli::Namespace& root);
+boost::shared_ptr<AutoCli::NamespaceNode> NewCompletion(AutoCli::Namespace& root);
 /// Answers those scripts, for the tree under @p root, which outlives the command.
-boost::shared_ptr<AutoCli::Command> NewProposal(AutoCli::Namespace& root);
+boost::shared_ptr<AutoCli::NamespaceNode> NewProposal(AutoCli::Namespace& root);
+/// Tells what result fields mean, for the tree under @p root, which outlives the command.
+boost::shared_ptr<AutoCli::NamespaceNode> NewExplain(AutoCli::Namespace& root);
+/// Stands in the tree for what is read as --help.
+boost::shared_ptr<AutoCli::NamespaceNode> NewHelp(AutoCli::Namespace& root);
+
+/// In front of other words, what is read as --help.
+inline constexpr const char* kHelpWord = "help";
 
 /// Which plug-ins have to be loaded for one of them: all, none, or what the line needs that a
 /// shell is asking about.
@@ -23,14 +30,16 @@ enum class Needs { AllPlugins, PluginsOfLineAtCursor, NoPlugins };
 
 struct OwnCommand {
   const char* name;
-  boost::shared_ptr<AutoCli::Command> (*make)(AutoCli::Namespace& root);
+  boost::shared_ptr<AutoCli::NamespaceNode> (*make)(AutoCli::Namespace& root);
   Needs needs = Needs::AllPlugins;
 };
 
 /// In the order in which they hang under the root. No plug-in gets one of these names.
 inline constexpr OwnCommand kOwnCommands[] = {{"catalogue", NewCatalogue},
                                               {"completion", NewCompletion, Needs::NoPlugins},
-                                              {"propose", NewProposal, Needs::PluginsOfLineAtCursor}};
+                                              {"propose", NewProposal, Needs::PluginsOfLineAtCursor},
+                                              {"explain", NewExplain},
+                                              {kHelpWord, NewHelp}};
 
 /// The row of that name, or null.
 const OwnCommand* FindOwnCommand(const std::string& name);

@@ -3,6 +3,7 @@
 #include "plinth/CommandLine.h"
 #include "plinth/Declarations.h"
 #include "plinth/Failure.h"
+#include "plinth/OwnCommands.h"
 #include "plinth/Text.h"
 
 namespace Plinth {
@@ -92,6 +93,9 @@ class RequestReader {
     if (!child) {
       request_.isLost = true;
       throw UsageError(UnknownWord(*request_.node, request_.path, word));
+    }
+    if (request_.path.empty() && word == kHelpWord && !request_.global.For("help").given) {
+      return request_.global.Take(*request_.global.Find("help"), nullptr);
     }
     request_.path += (request_.path.empty() ? "" : " ") + word;
     request_.node = child;

@@ -12,8 +12,10 @@
 namespace Plinth {
 
 struct Request {
-  explicit Request(AutoCli::NamespaceNode& start) : node(&start) {}
+  explicit Request(AutoCli::NamespaceNode& from) : start(&from), node(&from) {}
 
+  /// Where the words begin.
+  AutoCli::NamespaceNode* start;
   /// Where the words lead; they may end at a namespace.
   AutoCli::NamespaceNode* node;
   /// The words that lead there, blanks between.

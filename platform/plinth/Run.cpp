@@ -5,6 +5,7 @@
 
 #include "plinth/Failure.h"
 #include "plinth/Formatter.h"
+#include "plinth/Help.h"
 #include "plinth/InputOutput.h"
 #include "plinth/Reasons.h"
 #include "plinth/Text.h"
@@ -59,7 +60,15 @@ void ShowHelp(Run& run) {
   const std::size_t columns = run.console.OutScreen().columns;
   // Longer lines are hard to read, and shorter ones hold no option.
   const std::size_t screen = columns == 0 ? 80 : std::clamp<std::size_t>(columns, 40, 120);
-  ShowText(run, HelpText(*run.request.node, run.request.path, screen));
+  // In the middle of a batch, the host is in use.
+  Place place{*run.request.start, *run.request.node, run.request.path, run.line == 0};
+  for (const Parameter& parameter : run.request.own.Parameters()) {
+    if (parameter.sensitive) continue;
+    for (const std::string& text : run.request.own.For(parameter).texts) {
+      place.options.push_back("--" + parameter.name + '=' + text);
+    }
+  }
+  ShowText(run, HelpText(place, screen));
 }
 
 /// Enters the stage of each option that is given, from the one at @p index on, and @p last within them.
