@@ -6,9 +6,11 @@
 #include <fstream>
 #include <sstream>
 
+#include "host/LevelSchema.h"
 #include "host/Storage.h"
 #include "linux/Check.h"
 #include "linux/Interfaces.h"
+#include "linux/Parameters.h"
 #include "linux/Records.h"
 #include "linux/Sessions.h"
 #include "support/Harness.h"
@@ -110,6 +112,23 @@ TEST(Linux, RecordsAreReadAsTheyAreWritten) {
   linux::RemoveRecord(path, linux::kNodes);
   linux::RemoveRecord(path, linux::kNodes);
   EXPECT_TRUE(std::filesystem::is_empty(root.Path() + "/etc/iscsi/nodes"));
+}
+
+TEST(Linux, EachParameterHasItsPlaceInARecord) {
+  std::vector<std::string_view> ours;
+  std::vector<std::string_view> there;
+  for (const host::ParameterSpec& spec : host::kParameters) ours.push_back(spec.name);
+  ours.insert(ours.end(), std::begin(host::kDigests), std::end(host::kDigests));
+  for (const linux::ParameterName& name : linux::kParameterNames) there.push_back(name.parameter);
+  EXPECT_THAT(there, testing::UnorderedElementsAreArray(ours));
+  const linux::ParameterValue values[] = {
+      {"ErrorRecoveryLevel", 2}, {"DelayedAck", 1},   {"InitialR2T", 0}, {"MaxCmds", 64},
+      {"ImmediateData", 1},      {"HeaderDigest", 1}, {"DataDigest", 3}};
+  EXPECT_EQ(linux::ParameterLines(values), (linux::Record{{"node.session.iscsi.InitialR2T", "No"},
+                                                          {"node.session.cmds_max", "64"},
+                                                          {"node.session.iscsi.ImmediateData", "Yes"},
+                                                          {"node.conn[0].iscsi.HeaderDigest", "None,CRC32C"},
+                                                          {"node.conn[0].iscsi.DataDigest", "CRC32C"}}));
 }
 
 TEST(Linux, NothingBreaksOutOfARecord) {

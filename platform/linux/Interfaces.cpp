@@ -7,6 +7,7 @@
 #include <netinet/in.h>
 
 #include <algorithm>
+#include <array>
 #include <bit>
 #include <charconv>
 #include <memory>

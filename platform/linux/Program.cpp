@@ -48,6 +48,7 @@ class Pipe {
 pid_t Start(const std::string& path, std::vector<std::string>& words, const Pipe& output,
             const Pipe& complaints) {
   std::vector<char*> arguments;
+  arguments.reserve(words.size() + 1);
   for (std::string& word : words) arguments.push_back(word.data());
   arguments.push_back(nullptr);
   std::string locale = "LC_ALL=C";

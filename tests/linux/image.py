@@ -131,10 +131,11 @@ def base():
 
 
 def tested(path):
-    """An archive with hcli as it is installed."""
+    """An archive with hcli as it is installed, and the program that tests parts of it alone."""
     with tempfile.TemporaryDirectory(prefix="hcli-installed-") as root:
         prefix = os.path.join(root, "usr")
         done("cmake", "--install", os.environ["HCLI_BUILD_DIR"], "--prefix", prefix, "--strip")
+        copy(os.path.join(os.environ["HCLI_BUILD_DIR"], "bin/linux-driver"), root, "usr/bin/linux-driver")
         for binary in [os.path.join(prefix, "bin/hcli"), *glob.glob(f"{prefix}/lib/**/*.so", recursive=True)]:
             copy_libraries(binary, root, os.path.join(prefix, "lib"))
         archive(root, path)
