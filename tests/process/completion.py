@@ -17,6 +17,7 @@ ADAPTERS = ["hba0", "hba1", "hba2"]
 TRUTH = ["true", "false"]
 GET, CHAP, PARAM = "iscsi adapter get", "iscsi adapter auth chap set", "iscsi adapter discovery sendtarget param set"
 FILES, FOLDERS = "files", "folders"
+TRIES = 5  # on a crowded machine, a host may not answer for longer than a person waits
 
 # A line, and all that may follow; a text is the kind of name that a shell knows by itself.
 CASES = {
@@ -88,8 +89,7 @@ def propose(host, line, **more):
 
 
 def expect(host, line, expected):
-    # On a crowded machine, the host may be asked for longer than a person waits.
-    for _ in range(5):
+    for _ in range(TRIES):
         kind, words = propose(host, line)
         if (kind if isinstance(expected, str) else words) == expected:
             return
@@ -137,7 +137,7 @@ LINES = {
     f"{CHAP} --secret geheim --auth": [*CHAP.split(), "--secret", "geheim", "--authname"],
 }
 
-SHOW = r"hcli() { printf '\002'; printf '%s\n' \"$@\"; printf '\003'; }; printf '\002\003'"
+SHOW = r"""hcli() { printf '\002'; printf '%s\n' "$@"; printf '\003'; }; printf '\002\003'"""
 ALL = "\x14"  # the key that puts in every candidate
 READY = {
     "bash": ["bash --norc --noprofile -i", "PS1=", "source FILE", "bind 'set page-completions off'",
@@ -157,7 +157,7 @@ class Terminal:
         self.process = subprocess.Popen(setup[0].split(), stdin=follower, stdout=follower, stderr=follower,
                                         env=environment, cwd=folder, start_new_session=True)
         os.close(follower)
-        os.write(self.leader, "; ".join([*setup[1:], SHOW.replace('\\"', '"')]).encode() + b"\n")
+        os.write(self.leader, "; ".join([*setup[1:], SHOW]).encode() + b"\n")
         self.read(b"\x02\x03")
 
     def read(self, end):
@@ -201,7 +201,7 @@ with tempfile.TemporaryDirectory(prefix="hcli-completion-") as folder:
         setup = [part.replace("FILE", scripts["bash"]).replace("LOADED", loaded) for part in READY[name]]
         terminal = Terminal(setup, environment, work)
         for line, expected in LINES.items():
-            for _ in range(5):
+            for _ in range(TRIES):
                 words = terminal.words(f"hcli {line}{ALL}")
                 if words == expected:
                     break
@@ -221,7 +221,7 @@ with tempfile.TemporaryDirectory(prefix="hcli-completion-") as folder:
             f"{CHAP} --secret geheim --auth": ["--authname\tThe iSCSI CHAP authentication name"],
         }.items():
             command = f"source {scripts['fish']}; complete -C {json.dumps('hcli ' + line)}"
-            for _ in range(5):
+            for _ in range(TRIES):
                 done = subprocess.run(["fish", "--no-config", "-c", command], capture_output=True, text=True,
                                       env={**environment, "HOME": folder}, cwd=work)
                 words = succeeded(done).splitlines()
