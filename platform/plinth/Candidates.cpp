@@ -99,13 +99,10 @@ class CandidateFinder {
     const NodeData& place = NodeData::Of(*request_.node);
     if (!place.isCommand) {
       if (request_.global.For("batch").given) return;  // the words stand in the file
-      for (const AutoCli::Child& child : place.children) {
-        Add(child.name, NodeData::Of(*child.node).description);
-      }
-      return;
+      return AddChildren(place, "");
     }
     for (const Parameter& parameter : request_.own.Parameters()) {
-      if (!MayBeOperand(parameter) || request_.own.For(parameter).given) continue;
+      if (!MayBeOperand(parameter) || !MayBeGiven(parameter)) continue;
       AddValues(parameter, "");
       break;
     }
@@ -131,11 +128,17 @@ class CandidateFinder {
     } else {
       const std::string path = IsGlobal(parameter) ? "" : request_.path;
       const ValueSource* const source = GuideTo(root_, path).FindValues(path, parameter.name);
-      if (source) AddKnown(*source, before);
+      if (source) AddKnown(parameter, *source, before);
     }
   }
 
-  void AddKnown(const ValueSource& source, const std::string& before) {
+  void AddChildren(const NodeData& place, const std::string& before) {
+    for (const AutoCli::Child& child : place.children) {
+      Add(before + child.name, NodeData::Of(*child.node).description);
+    }
+  }
+
+  void AddKnown(const Parameter& parameter, const ValueSource& source, const std::string& before) {
     switch (source.kind) {
       case ValueSource::Kind::File:
         found_.files = Candidates::Files::All;
@@ -143,6 +146,15 @@ class CandidateFinder {
       case ValueSource::Kind::Folder:
         found_.files = Candidates::Files::Folders;
         break;
+      case ValueSource::Kind::Command: {
+        // Of a list, the values so far are the words that lead there.
+        const AutoCli::NamespaceNode* node = &root_;
+        for (const std::string& word : request_.own.For(parameter).texts) {
+          if (node) node = NodeData::FindChild(*node, word);
+        }
+        if (node) AddChildren(NodeData::Of(*node), before);
+        break;
+      }
       case ValueSource::Kind::Shown:
         for (const Candidate& value : ShownValues(root_, OptionsFor(source), source)) {
           Add(before + value.word, value.description);

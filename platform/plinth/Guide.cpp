@@ -145,7 +145,8 @@ class GuideReader {
     const std::string kind = Text(node);
     if (kind == "file") return ValueSource::Kind::File;
     if (kind == "folder") return ValueSource::Kind::Folder;
-    Fail(node, "the kind " + Quoted(kind) + " is none; there are file and folder");
+    if (kind == "command") return ValueSource::Kind::Command;
+    Fail(node, "the kind " + Quoted(kind) + " is none; there are file, folder and command");
   }
 
   void ReadCommand(const yaml_node_t& node, const std::string& path, Guide& guide) {

@@ -24,7 +24,8 @@ struct ValueSource {
   std::string option;
   /// The command, or the namespace, that it is about; empty for every command that has the option.
   std::string of;
-  /// The command that shows the values: one that only reads. Empty where the value names a file or a folder.
+  /// The command that shows the values: one that only reads. Empty where the value names a file, a
+  /// folder or a command.
   std::string from;
   /// The field of that command's result that holds the value.
   std::string field;
@@ -32,7 +33,7 @@ struct ValueSource {
   std::string about;
   /// Options that both commands have, and that narrow down what is shown.
   std::vector<std::string> with;
-  enum class Kind { Shown, File, Folder } kind = Kind::Shown;
+  enum class Kind { Shown, File, Folder, Command } kind = Kind::Shown;
   /// Few enough, and the same for long enough, to be listed in help.
   bool isListed = false;
 };

@@ -28,6 +28,9 @@ CASES = {
     "--output json iscsi software ": ["get", "set"],
     "iscsi --output=json software s": ["set"],
     "iscsi 'soft": ["software"],
+    "help iscsi soft": ["software"],
+    "explain iscsi soft": ["software"],
+    "explain iscsi soft adapter": [],
     # Options: each once, but for lists; those of the command alone until a dash is written.
     f"{GET} ": ["--adapter"],
     f"{GET} -A hba0 ": [],
