@@ -1,5 +1,5 @@
 """Command lines of a file, in one process: what each answers, which of them fail, when the answer comes, and that what
-is answered is so, also where lines are made durable together."""
+is answered is so, also where lines are made durable together. batch.py [KILLS]"""
 
 import json
 import os
@@ -7,6 +7,7 @@ import random
 import signal
 import sqlite3
 import subprocess
+import sys
 import time
 
 from support.program import BUSY, Host, check, finished, is_sound, write
@@ -126,7 +127,7 @@ def locked():
 def killed(kills):
     """Wherever it is killed, the first lines are done, as many as were answered at least, and no others."""
     random.seed(20261123)
-    longest, ended = 0.2, 0
+    longest, ended, done_count, most_behind = 0.2, 0, 0, 0
     addresses = [f"10.0.{number // 250}.{number % 250 + 1}:3260" for number in range(600)]
     for _ in range(kills):
         host = Host({"adapters": [{"name": "hba0", "capabilities": {"Sendtarget Discovery Settable": True}}]})
@@ -145,8 +146,11 @@ def killed(kills):
         check(there == addresses[:len(there)] and len(there) >= count, f"answered: {count}, there:", there)
         check(is_sound(host.database), "the database is damaged")
         ended += done.returncode == 0
+        done_count += len(there)
+        most_behind = max(most_behind, len(there) - count)
         longest *= 0.8 if done.returncode == 0 else 1.1
     check(0 < ended < kills, f"{ended} of {kills} were not killed in time")
+    print(f"{kills - ended} killed, {ended} not in time; {done_count} lines done, at most {most_behind} behind those answered")
 
 
 answered()
@@ -154,4 +158,4 @@ refused()
 while_it_is_written()
 unread()
 locked()
-killed(20)
+killed(int(sys.argv[1]) if len(sys.argv) > 1 else 20)
