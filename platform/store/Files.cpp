@@ -169,7 +169,6 @@ bool ReadHostFile(const std::string& path, std::string& contents) {
 
 /// Waits until no other process has the open file @p file locked, and locks it; closed where that fails.
 void NewFile::Lock(int file) {
-  constexpr int kPauseMilliseconds = 5;
   for (int waited = 0; flock(file, LOCK_EX | LOCK_NB) != 0; waited += kPauseMilliseconds) {
     const int error = errno;
     if (error == EWOULDBLOCK && waited < patience) {

@@ -22,6 +22,8 @@ std::string HostPath(std::string_view path);
 
 /// How long another process that writes is waited for, unless SetPatience says otherwise.
 constexpr int kPatienceMilliseconds = 20000;
+/// How long between two looks whether it has ended.
+constexpr int kPauseMilliseconds = 5;
 
 /// How long it is waited for now, in milliseconds.
 int Patience();

@@ -2,6 +2,7 @@
 
 #include <sqlite3.h>
 #include <stdlib.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -75,6 +76,14 @@ time_t Now() {
   timespec now{};
   clock_gettime(CLOCK_MONOTONIC_COARSE, &now);
   return now.tv_sec;
+}
+
+/// SQLite's own way to wait is to sleep for up to 100 ms between two looks, which would miss most of the
+/// moments in which a process that writes much lets others in.
+int KeepWaiting(void* patience, int looks) {
+  if (looks * kPauseMilliseconds >= *static_cast<const int*>(patience)) return 0;
+  usleep(kPauseMilliseconds * 1000);
+  return 1;
 }
 
 bool IsKeptTooLong() { return Now() - keptSince > kPatienceMilliseconds / 2 / 1000; }
@@ -193,7 +202,10 @@ void Store::Fail(int code) {
           Reason(code, systemError, Words(real ? sqlite3_errmsg(database_) : sqlite3_errstr(code), code)));
 }
 
-void Store::SetPatience(int milliseconds) { sqlite3_busy_timeout(database_, milliseconds); }
+void Store::SetPatience(int milliseconds) {
+  patience_ = milliseconds;
+  sqlite3_busy_handler(database_, KeepWaiting, &patience_);
+}
 
 void Store::FailStatement(int number, int code) { fault_ = {.countdown = number, .code = code}; }
 

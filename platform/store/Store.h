@@ -99,6 +99,7 @@ class Store {
   bool isGroupBegun_ = false;  // something was to be changed in it
   std::uint64_t state_ = 0;
   sqlite3* database_ = nullptr;
+  int patience_ = 0;  // in milliseconds
   /// By the address of the text: each statement has one place in the code.
   std::vector<std::pair<const char*, sqlite3_stmt*>> statements_;
   Fault fault_;
