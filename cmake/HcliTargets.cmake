@@ -20,6 +20,7 @@ function(hcli_library name kind)
     set_target_properties(${name} PROPERTIES
       PREFIX "" LIBRARY_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/${HCLI_PLUGIN_FOLDER}")
     install(TARGETS ${name} LIBRARY DESTINATION ${HCLI_PLUGIN_FOLDER})
+    set_property(GLOBAL APPEND PROPERTY HCLI_PLUGINS ${name})
     if(EXISTS "${CMAKE_CURRENT_SOURCE_DIR}/guide.yaml")
       hcli_guide(${name})
     endif()
@@ -79,6 +80,22 @@ function(hcli_guide name)
   install(FILES guide.yaml DESTINATION share/hcli/guides RENAME ${name}.yaml)
   file(MAKE_DIRECTORY "${guides}")
   file(CREATE_LINK "${CMAKE_CURRENT_SOURCE_DIR}/guide.yaml" "${guides}/${name}.yaml" SYMBOLIC)
+  set_property(GLOBAL APPEND PROPERTY HCLI_GUIDES "${CMAKE_CURRENT_SOURCE_DIR}/guide.yaml")
+endfunction()
+
+# hcli_manual(): manual pages of all commands, in share/man of both trees, by the program itself. To be called once,
+# behind the plug-ins.
+function(hcli_manual)
+  get_property(plugins GLOBAL PROPERTY HCLI_PLUGINS)
+  get_property(guides GLOBAL PROPERTY HCLI_GUIDES)
+  set(pages "${PROJECT_BINARY_DIR}/share/man/man1")
+  add_custom_command(OUTPUT "${pages}/hcli.1"
+    COMMAND ${CMAKE_COMMAND} -E rm -rf "${pages}"
+    COMMAND ${CMAKE_COMMAND} -E make_directory "${pages}"
+    COMMAND ${CMAKE_COMMAND} -E env --unset=HCLI_PLUGINS $<TARGET_FILE:hcli> --quiet manual --folder "${pages}"
+    DEPENDS hcli plinth ${plugins} ${guides} COMMENT "Writing the manual pages" VERBATIM)
+  add_custom_target(manual ALL DEPENDS "${pages}/hcli.1")
+  install(DIRECTORY "${PROJECT_BINARY_DIR}/share/man" DESTINATION share)
 endfunction()
 
 # hcli_share(FOLDER): data, in share/hcli of both trees. The build tree has a link, so that an edit needs no build.

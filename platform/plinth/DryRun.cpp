@@ -62,6 +62,8 @@ class Rehearsing {
 
 void AddRehearsal(Rehearsal& rehearsal) { Rehearsals().push_back(&rehearsal); }
 
+bool IsRehearsing() { return Rehearsing::IsOn(); }
+
 bool CanRehearse() { return !Rehearsals().empty(); }
 
 void CheckDryRun(Run&, const Given& given) {

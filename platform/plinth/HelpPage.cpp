@@ -34,35 +34,27 @@ AutoCli::Command* FindCommand(AutoCli::NamespaceNode& root, const std::string& p
 
 /// The values that the host has for an option whose values are few, narrowed down by the options of the line.
 /// What else the command that shows them requires is what the host shows first of that.
-std::vector<std::string> AskForValues(const Place& place, const ValueSource& source) {
+std::vector<std::string> AskForValues(const Place& place, const Parameter& parameter) {
+  const ValueSource* const source = place.OwnGuide().FindValues(place.path, parameter.name);
   auto* const root = dynamic_cast<AutoCli::Namespace*>(&place.root);
-  AutoCli::Command* const command = FindCommand(place.root, source.from);
-  if (!place.isAsking || !source.isListed || !root || !command) return {};
+  if (!place.isAsking || !source || !source->isListed || !root) return {};
+  AutoCli::Command* const command = FindCommand(place.root, source->from);
+  if (!command) return {};
   std::vector<std::string> options;
-  for (const Parameter& parameter : ParametersOf(*command->GetInputSpec())) {
-    if (const std::string* const given = FindOption(place.options, parameter.name)) {
+  for (const Parameter& needed : ParametersOf(*command->GetInputSpec())) {
+    if (const std::string* const given = FindOption(place.options, needed.name)) {
       options.push_back(*given);
-    } else if (parameter.required) {
-      const ValueSource* const other = place.OwnGuide().FindValues(source.from, parameter.name);
+    } else if (needed.required) {
+      const ValueSource* const other = place.OwnGuide().FindValues(source->from, needed.name);
       const std::vector<Candidate> values =
           other ? ShownValues(*root, options, *other) : std::vector<Candidate>();
       if (values.empty()) return {};
-      options.push_back("--" + parameter.name + '=' + values.front().word);
+      options.push_back("--" + needed.name + '=' + values.front().word);
     }
   }
   std::vector<std::string> values;
-  for (const Candidate& value : ShownValues(*root, options, source)) values.push_back(value.word);
+  for (const Candidate& value : ShownValues(*root, options, *source)) values.push_back(value.word);
   return values;
-}
-
-/// What else there is to say of the option.
-std::string MoreText(const Place& place, const Parameter& parameter) {
-  std::string text = SourceText(place, parameter);
-  if (text.empty()) return text;
-  const std::vector<std::string> values =
-      AskForValues(place, *place.OwnGuide().FindValues(place.path, parameter.name));
-  if (!values.empty()) text.replace(text.size() - 1, 1, ": " + Join(values, ", ") + '.');
-  return text;
 }
 
 /// "0 this; 1 that."
@@ -74,9 +66,10 @@ std::string Sentence(const std::vector<PageItem>& items) {
 
 Page CommandPage(const Place& place) {
   Page page = BeginPage(place);
-  PageSection options =
-      OptionsSection("Options", ParametersOf(*place.Command()->GetInputSpec()),
-                     [&](const Parameter& parameter) { return MoreText(place, parameter); });
+  PageSection options = OptionsSection("Options", ParametersOf(*place.Command()->GetInputSpec()),
+                                       [&](const Parameter& parameter) {
+                                         return SourceText(place, parameter, AskForValues(place, parameter));
+                                       });
   if (!options.items.empty()) page.sections.push_back(std::move(options));
   page.sections.push_back(ResultSection(place));
   if (KnowsMeanings(place)) {

@@ -18,6 +18,10 @@ boost::shared_ptr<AutoCli::NamespaceNode> NewCompletion(AutoCli::Namespace& root
 boost::shared_ptr<AutoCli::NamespaceNode> NewProposal(AutoCli::Namespace& root);
 /// Tells what result fields mean, for the tree under @p root, which outlives the command.
 boost::shared_ptr<AutoCli::NamespaceNode> NewExplain(AutoCli::Namespace& root);
+/// Writes manual pages of the tree under @p root, which outlives the command.
+boost::shared_ptr<AutoCli::NamespaceNode> NewManual(AutoCli::Namespace& root);
+/// Shows the same as one Markdown document.
+boost::shared_ptr<AutoCli::NamespaceNode> NewReference(AutoCli::Namespace& root);
 /// Stands in the tree for what is read as --help.
 boost::shared_ptr<AutoCli::NamespaceNode> NewHelp(AutoCli::Namespace& root);
 
@@ -39,7 +43,9 @@ inline constexpr OwnCommand kOwnCommands[] = {{"catalogue", NewCatalogue},
                                               {"completion", NewCompletion, Needs::NoPlugins},
                                               {"propose", NewProposal, Needs::PluginsOfLineAtCursor},
                                               {"explain", NewExplain},
-                                              {kHelpWord, NewHelp}};
+                                              {kHelpWord, NewHelp},
+                                              {"manual", NewManual},
+                                              {"reference", NewReference}};
 
 /// The row of that name, or null.
 const OwnCommand* FindOwnCommand(const std::string& name);

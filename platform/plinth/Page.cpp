@@ -100,10 +100,13 @@ PageSection OptionsSection(const std::string& heading, const std::vector<Paramet
   return section;
 }
 
-std::string SourceText(const Place& place, const Parameter& parameter) {
+std::string SourceText(const Place& place, const Parameter& parameter,
+                       const std::vector<std::string>& values) {
   const ValueSource* const source = place.OwnGuide().FindValues(place.path, parameter.name);
   if (!source || source->from.empty() || parameter.sensitive) return "";
-  return "One of what \"" + ProgramWith(source->from) + "\" shows as " + source->field + '.';
+  std::string text = "One of what \"" + ProgramWith(source->from) + "\" shows as " + source->field;
+  if (!values.empty()) text += ": " + Join(values, ", ");
+  return text + (source->isListed ? ". \"hcli explain\" tells what each is." : ".");
 }
 
 PageSection ResultSection(const Place& place) {

@@ -61,6 +61,8 @@ struct Place {
 
 /// What --help tells: in short, with values that the host has now.
 Page HelpPage(const Place& place);
+/// What a manual page tells of the root or of a command.
+Page ManualPage(const Place& place);
 
 // What both are made of.
 
@@ -71,8 +73,10 @@ Page BeginPage(const Place& place);
 /// What @p more tells of a parameter stands behind its help, unless it is empty.
 PageSection OptionsSection(const std::string& heading, const std::vector<Parameter>& parameters,
                            const std::function<std::string(const Parameter&)>& more);
-/// Which command shows the values of the parameter; empty where none is known.
-std::string SourceText(const Place& place, const Parameter& parameter);
+/// Which command shows the values of the parameter, and @p values where some are known; empty where no
+/// command is.
+std::string SourceText(const Place& place, const Parameter& parameter,
+                       const std::vector<std::string>& values = {});
 /// What the command gives: no items where it has no fields.
 PageSection ResultSection(const Place& place);
 PageSection ExamplesSection(const Place& place);

@@ -69,6 +69,7 @@ def main():
     texts = {f"{name}.txt": "".join(transcript(host, line, faults) for line in lines) for name, lines in CASES.items()}
     # All that is declared: paths, descriptions, options, fields, and how results are shown.
     texts["catalogue.json"] = json.dumps(host.result("catalogue"), indent=1, ensure_ascii=False) + "\n"
+    texts["../../docs/reference/commands.md"] = host.succeed("reference")
     renewed = os.environ.get("UPDATE_GOLDEN") == "1"
     faults += filter(None, [expect_file(f"{GOLDEN}/{name}", text, renewed) for name, text in texts.items()])
     if faults:

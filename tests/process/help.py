@@ -31,4 +31,4 @@ check(f"{KEYS}: ErrorRecoveryLevel" in text(new) and not os.listdir(new.root), "
 with contextlib.closing(sqlite3.connect(demo.database)) as other:
     other.execute("BEGIN EXCLUSIVE")
     begin = time.monotonic()
-    check(f"{KEYS}." in text(demo) and time.monotonic() - begin < 10, "help waited for the host")
+    check(f"{KEYS}. " in text(demo) and time.monotonic() - begin < 10, "help waited for the host")
