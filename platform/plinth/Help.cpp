@@ -33,6 +33,41 @@ std::string Wrap(const std::string& text, std::size_t indent, std::size_t screen
   return wrapped;
 }
 
+/// The words of a line for a shell, each with its quotes.
+std::vector<std::string> ShellWords(const std::string& line) {
+  std::vector<std::string> words{""};
+  char quote = 0;
+  for (const char character : line) {
+    if (quote == 0 && character == ' ') {
+      words.emplace_back();
+      continue;
+    }
+    if (quote == character) {
+      quote = 0;
+    } else if (quote == 0 && (character == '"' || character == '\'')) {
+      quote = character;
+    }
+    words.back() += character;
+  }
+  return words;
+}
+
+/// @p line as a shell takes it too, continued behind backslashes.
+std::string WrapLine(const std::string& line, std::size_t screen) {
+  std::string wrapped = "     ";
+  std::size_t column = wrapped.size();
+  for (const std::string& word : ShellWords(Visible(line))) {
+    const std::size_t width = 1 + DisplayWidth(word);
+    if (column > 6 && column + width + 2 > screen) {
+      wrapped += " \\\n       ";
+      column = 7;
+    }
+    wrapped += ' ' + word;
+    column += width;
+  }
+  return wrapped + '\n';
+}
+
 std::string UsageText(const std::vector<std::string>& synopsis, std::size_t screen) {
   std::vector<std::string> parts = Split(synopsis.front(), ' ');
   parts.insert(parts.end(), synopsis.begin() + 1, synopsis.end());
@@ -69,8 +104,7 @@ std::string ItemsText(const PageSection& section, std::size_t screen) {
   std::string text;
   for (const PageItem& item : section.items) {
     if (section.form == Form::Examples) {
-      // A line to be copied is not broken.
-      text += "  " + Wrap(item.term, 2, screen) + "\n      " + Visible(item.text) + '\n';
+      text += "  " + Wrap(item.term, 2, screen) + '\n' + WrapLine(item.text, screen);
     } else {
       text += (item.term.starts_with("--") ? "      " : "  ") + item.term + '\n';
       if (!item.text.empty()) text += std::string(10, ' ') + Wrap(item.text, 10, screen) + '\n';

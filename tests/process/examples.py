@@ -21,7 +21,7 @@ write(os.path.join(BESIDE, "host.json"), read(os.path.join(SOURCE, "hosts/demo.j
 def examples(path):
     """The command lines below "Examples:" in the help on the command; sentences have a smaller indent."""
     section = NEW_HOST.succeed(f"help {path}").partition("\nExamples:\n")[2].partition("\n\n")[0]
-    return [line.strip() for line in section.splitlines() if line.startswith(" " * 6)]
+    return [line.strip() for line in section.replace("\\\n        ", "").splitlines() if line.startswith(" " * 6)]
 
 
 def fault(path, line):

@@ -32,7 +32,8 @@ faults = []
 for name, node in sorted(nodes.items()):
     page = os.path.join(PAGES, name + ".1")
     summary = node["description"].removesuffix(".")
-    examples = host.succeed(f"help {node['path']}").partition("\nExamples:\n")[2].partition("\n\n")[0].splitlines()
+    examples = host.succeed(f"help {node['path']}").partition("\nExamples:\n")[2].partition("\n\n")[0]
+    examples = examples.replace("\\\n", "").splitlines()
     wanted = [f"{name} - {summary}", *examples, *(f"--{option['name']}" for option in node["parameters"])]
     text = shown(page)
     faults += [f"{name}: not shown: {part}" for part in wanted if words(part) not in text]
