@@ -52,6 +52,7 @@ TEST(Linux, SessionsAreTheKernels) {
   EXPECT_TRUE(linux::ReadSessions().empty());
   WriteKernelFiles(root);
   Write(root, "/sys/class/iscsi_session/session10/state", "FREE");  // one that is just going
+  Write(root, "/sys/class/iscsi_connection/connection2:0/address", "fe80:0000:0000:0000:0000:0000:0000:0010");
   const std::vector<linux::Session> sessions = linux::ReadSessions();
   ASSERT_EQ(sessions.size(), 2u);
   const linux::Session& ours = sessions[0];
@@ -74,8 +75,9 @@ TEST(Linux, SessionsAreTheKernels) {
                         Field(&Connection::headerDigest, false), Field(&Connection::maxTransmit, 8192))));
   EXPECT_THAT(
       sessions[1].connections,
-      ElementsAre(AllOf(Field(&Connection::headerDigest, true), Field(&Connection::dataDigest, false),
-                        Field(&Connection::persistentPort, 3261), Field(&Connection::maxReceive, 262144))));
+      ElementsAre(AllOf(Field(&Connection::address, "fe80::10"), Field(&Connection::headerDigest, true),
+                        Field(&Connection::dataDigest, false), Field(&Connection::persistentPort, 3261),
+                        Field(&Connection::maxReceive, 262144))));
 }
 
 TEST(Linux, InterfacesAreTheKernels) {

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <charconv>
 
+#include "host/Formats.h"
 #include "linux/Attributes.h"
 
 namespace linux {
@@ -31,12 +32,18 @@ class Attributes {
   std::string folder_;
 };
 
+/// The kernel writes an IPv6 address in full; it is to be the one that RFC 5952 has.
+std::string Canonical(const std::string& address) {
+  const std::optional<host::Ipv6Bytes> bytes = host::ParseIpv6(address);
+  return bytes ? host::FormatIpv6(*bytes) : address;
+}
+
 Connection ReadConnection(const std::string& name) {
   const Attributes own("/sys/class/iscsi_connection/" + name);
   Connection connection;
   connection.number = NumberIn(name, name.find(':') + 1);
   connection.state = own.Text("state");
-  connection.address = own.Text("address");
+  connection.address = Canonical(own.Text("address"));
   connection.port = own.Number("port");
   connection.persistentAddress = own.Text("persistent_address");
   connection.persistentPort = own.Number("persistent_port");

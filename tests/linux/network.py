@@ -23,7 +23,7 @@ DEMANDS = PROHIBITED, DISCOURAGED, PREFERRED, REQUIRED = range(4)
 
 
 def driver(machine, operation, port=3260, **given):
-    asked = json.dumps({"operation": operation, "host": "127.0.0.1", "port": port, **given})
+    asked = json.dumps({"operation": operation, "host": "127.0.0.1", "port": port} | given)
     done = machine.succeed(f"echo {shlex.quote(asked)} | LD_LIBRARY_PATH=/usr/lib linux-driver")
     return json.loads(done)
 
@@ -111,6 +111,37 @@ def moved(machine):
     check((answer["status"], answer.get("movedTo")) == (MOVED, ["127.0.0.2", 3261]), answer)
 
 
+def ipv6(machine):
+    machine.succeed("modprobe dummy && ip link add eth1 type dummy && ip link set eth1 up && ip -6 addr add fe80::10/64 dev eth1")
+    machine.until("! ip -6 addr | grep tentative")
+    for address in "::1", "fe80::10%eth1":
+        given = {"target": TGT, "uni": ["user", SECRET], "host": address}
+        answer = driver(machine, "login", **given)
+        check(answer["status"] == DONE, address, answer)
+        check(driver(machine, "login", **given).get("code") == "exists", "no session was found at", address)
+        driver(machine, "logout", target=TGT, session=answer["tsih"])
+        check(sessions(machine) == [] and set(records(machine)) == {"ifaces/hcli.hba0"}, address, records(machine))
+
+
+def killed(machine):
+    """At any time of a login: at most one session comes of it, and the next login or logout works."""
+    outcomes = {"a session": 0, "none": 0}
+    given = {"target": TGT, "uni": ["user", SECRET]}
+    asked = shlex.quote(json.dumps({"operation": "login", "host": "127.0.0.1", "port": 3260, **given}))
+    for kill in range(20):
+        machine.succeed(f"(echo {asked} | LD_LIBRARY_PATH=/usr/lib linux-driver & p=$!; usleep {kill * 30000}; kill -9 $p) "
+                        ">/dev/null 2>&1; while pidof iscsiadm; do sleep 0.1; done >/dev/null")
+        left = sessions(machine)
+        outcomes["a session" if left else "none"] += 1
+        answer = driver(machine, "login", **given)
+        check(answer.get("code") == "exists" if left else answer.get("status") == DONE, kill, left, answer)
+        now = sessions(machine)
+        check(len(now) == 1 and (not left or left == now), kill, left, now)
+        driver(machine, "logout", target=TGT, session=int(now[0].removeprefix("session")))
+        check(sessions(machine) == [] and set(records(machine)) == {"ifaces/hcli.hba0"}, kill, records(machine))
+    check(all(outcomes.values()), "the delays miss what they are for:", outcomes)
+
+
 def refusals(machine):
     kernel = {"port": targets.KERNEL_PORT}
     refused(machine, NOT_FOUND, target="iqn.2026-11.org.example:none")
@@ -151,7 +182,7 @@ with Machine() as emulated:
     emulated.succeed(f"echo 0 >{targets.CONFIG}/iscsi/{CLOSED}/tpgt_1/attrib/generate_node_acls")
     # Everything that anybody could see of a process is looked at throughout.
     emulated.succeed("while :; do cat /proc/[0-9]*/cmdline; done >/tmp/command-lines 2>/dev/null &")
-    for part in found, logged_in, digests, chap_words, moved, refusals, without_daemon:
+    for part in found, logged_in, digests, chap_words, ipv6, killed, moved, refusals, without_daemon:
         part(emulated)
     lines = emulated.succeed(r"tr '\0' '\n' </tmp/command-lines | sort -u")
     check("--login" in lines, "no login was seen in the list of processes")
