@@ -3,7 +3,7 @@
 #include <CoreCtl/Util.h>
 
 #include "Support.h"
-#include "corectl/EnvironmentText.h"
+#include "host/EnvironmentText.h"
 #include "host/Storage.h"
 
 namespace {
@@ -24,7 +24,7 @@ bool Works(Step step) {
 }
 
 bool Assigns(const std::string& line, const std::string& name) {
-  corectl::EnvironmentText text;
+  host::EnvironmentText text;
   text.Parse(line);
   return text.Get(name).has_value();
 }
@@ -61,7 +61,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     fuzz::Require(after == before, "a file in which nothing was set has changed");
     return 0;
   }
-  corectl::EnvironmentText text;
+  host::EnvironmentText text;
   text.Parse(after);
   fuzz::Require(text.Get(name) == value, "the value reads back as another");
   RequireTheOtherLines(before, after, name);

@@ -1,6 +1,6 @@
 #include <CoreCtl/Util.h>
 
-#include "corectl/EnvironmentText.h"
+#include "host/EnvironmentText.h"
 #include "corectl/Operation.h"
 #include "host/Storage.h"
 #include "store/Rehearsal.h"
@@ -9,7 +9,7 @@ namespace CoreCtl::Util {
 
 struct EnvironmentVarFile::State {
   std::string path;  // on the host
-  corectl::EnvironmentText text;
+  host::EnvironmentText text;
 };
 
 EnvironmentVarFile::EnvironmentVarFile(std::string path) : state_(std::make_unique<State>()) {

@@ -8,8 +8,8 @@
 #include <utility>
 
 #include "corectl/Adapter.h"
-#include "corectl/EnvironmentText.h"
 #include "host/Formats.h"
+#include "host/InitiatorNameFile.h"
 #include "host/Restart.h"
 
 namespace NodeCtl::Storage {
@@ -24,21 +24,10 @@ namespace corectl {
 
 namespace {
 
-constexpr const char* kInitiatorNameFile = "/etc/tessaro/coreiscsid/initiatorname.iscsi";
-
 host::Object Root(host::Tree& tree) { return tree.Get(host::kRoot, host::Kind::Host); }
 
 std::vector<host::Object> Adapters(host::Tree& tree) {
   return tree.Children(host::kRoot, host::Kind::Adapter);
-}
-
-/// The name that the initiator's daemon is to use; nothing where none is configured.
-std::optional<std::string> ConfiguredInitiatorName() {
-  std::string contents;
-  if (!host::ReadHostFile(host::HostPath(kInitiatorNameFile), contents)) return {};
-  EnvironmentText file;
-  file.Parse(contents);
-  return file.Get("InitiatorName");
 }
 
 /// Adds the adapter that the software initiator is, under the first free name.
@@ -65,7 +54,7 @@ host::Object InsertSoftwareAdapter(host::Tree& tree) {
 /// that was given to the adapter itself after the file was written stays. Gives the adapters whose name
 /// waits.
 std::vector<std::string> NameSoftware(host::Tree& tree, bool starts) {
-  const std::optional<std::string> name = ConfiguredInitiatorName();
+  const std::optional<std::string> name = host::ConfiguredInitiatorName();
   const bool isUsable = name && host::IscsiNameFault(*name).empty();
   std::vector<host::Object> adapters = Adapters(tree);
   std::erase_if(adapters,
@@ -94,7 +83,7 @@ void RequireInitiatorName(const std::string& name) {
 
 bool HeedNameFile(host::Object& adapter) {
   struct stat file;
-  if (!host::IsRegularFile("The file", host::HostPath(kInitiatorNameFile), file)) return false;
+  if (!host::IsRegularFile("The file", host::InitiatorNameFile(), file)) return false;
   // Each writing makes a new file.
   const std::string writing = std::to_string(file.st_ino) + ' ' + std::to_string(file.st_mtim.tv_sec) + '.' +
                               std::to_string(file.st_mtim.tv_nsec);

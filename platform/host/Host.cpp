@@ -18,8 +18,6 @@ namespace host {
 
 namespace {
 
-constexpr std::string_view kDatabase = "/var/lib/tessaro/host.db";
-
 std::unique_ptr<Host>& CurrentHost() {
   // Not closed when the process ends: no transaction is open then, and the rest is gone by itself.
   static auto& current = *new std::unique_ptr<Host>;
@@ -138,9 +136,11 @@ std::unique_ptr<Host> Host::InMemory(std::unique_ptr<Store> store) {
   return std::unique_ptr<Host>(new Host("", std::move(store)));
 }
 
+std::string Host::DatabasePath() { return HostPath("/var/lib/tessaro/host.db"); }
+
 Store& Host::GetStore() {
   if (store_ != nullptr) return *store_;
-  if (path_.empty()) path_ = HostPath(kDatabase);
+  if (path_.empty()) path_ = DatabasePath();
   struct stat status;
   if (!IsRegularFile("The host database", path_, status)) {
     for (const std::string& journal : JournalsOf(path_)) {

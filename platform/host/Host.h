@@ -74,6 +74,8 @@ class Host {
   /// whole. @p call is what a rehearsal shows of a change.
   void Administer(const char* call, Transaction::Access access, const std::function<void(Tree&)>& work);
 
+  /// The file of the host under HCLI_ROOT. An Error where that is empty.
+  static std::string DatabasePath();
   /// Opens the store where that was not done yet.
   Store& GetStore();
 

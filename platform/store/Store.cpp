@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <cstring>
 #include <ctime>
+#include <fstream>
 #include <new>
 
 #include "store/Error.h"
@@ -31,7 +32,7 @@ std::string WithoutLinks(const std::string& path) {
 
 /// Opens a connection. What SQLite sets aside for a long life, a process of one command would only pay for:
 /// each page that is touched for the first time is an interrupt.
-int Open(const std::string& path, sqlite3** database) {
+int Open(const std::string& path, int access, sqlite3** database) {
   static const int configured = [] {
     sqlite3_config(SQLITE_CONFIG_PAGECACHE, nullptr, 0, 0);
     sqlite3_config(SQLITE_CONFIG_LOOKASIDE, 0, 0);
@@ -39,8 +40,8 @@ int Open(const std::string& path, sqlite3** database) {
   }();
   static_cast<void>(configured);  // without effect where SQLite works already
   const auto open = [&](const std::string& name) {
-    return sqlite3_open_v2(name.c_str(), database,
-                           SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX | SQLITE_OPEN_NOFOLLOW, nullptr);
+    return sqlite3_open_v2(name.c_str(), database, access | SQLITE_OPEN_NOMUTEX | SQLITE_OPEN_NOFOLLOW,
+                           nullptr);
   };
   const int code = open(path);
   if (code == SQLITE_OK || sqlite3_extended_errcode(*database) != SQLITE_CANTOPEN_SYMLINK) return code;
@@ -64,6 +65,19 @@ void RollBack(Store& store) {
   } catch (const std::exception&) {
     // SQLite has rolled back by itself: after some failures there is no transaction left.
   }
+}
+
+int workers = 0;  // stores that have a file open to work with it
+
+/// Whether SQLite would make files beside the database to read it: the form that its header names has a log.
+/// This program makes none of that form.
+bool HasLog(const std::string& path) {
+  constexpr std::size_t kForms = 18;  // https://www.sqlite.org/fileformat2.html#the_database_header
+  // Where this process works with the file it is none; and to close it here would end the process's locks.
+  if (workers > 0) return false;
+  char begin[kForms + 2] = "";
+  std::ifstream(path, std::ios::binary).read(begin, sizeof begin);
+  return std::strcmp(begin, "SQLite format 3") == 0 && (begin[kForms] == 2 || begin[kForms + 1] == 2);
 }
 
 int readings = 0;
@@ -139,13 +153,15 @@ std::vector<std::string> JournalsOf(const std::string& path) {
 }
 
 Store::Store() : path_("in memory"), checked_(true) {
-  if (Open(":memory:", &database_) != SQLITE_OK) {
+  if (Open(":memory:", SQLITE_OPEN_READWRITE, &database_) != SQLITE_OK) {
     sqlite3_close(database_);
     throw std::bad_alloc();
   }
 }
 
-Store::Store(const std::string& path) : path_(path) {
+Store::Store(const std::string& path, Use use) : path_(path) {
+  constexpr int kMostToLook = 1000;
+  const bool isWork = use == Use::Work;
   struct stat status;
   const auto refuse = [&](Error::Kind kind, const std::string& reason) {
     throw Error(kind, "The host database " + path_ + reason);
@@ -154,15 +170,22 @@ Store::Store(const std::string& path) : path_(path) {
     refuse(Error::Kind::NotFound, std::string(" cannot be opened: ") + strerror(ENOENT) + ".");
   }
   if (status.st_size == 0) refuse(Error::Kind::DamagedFile, " is damaged: it is empty.");
-  KeepPrivate(path, status);
+  if (!isWork && HasLog(path)) {
+    refuse(Error::Kind::DamagedFile,
+           " is damaged: it is of a form with a log, which this program does not use.");
+  }
+  if (isWork) KeepPrivate(path, status);
   for (const std::string& journal : JournalsOf(path)) {
-    if (IsRegularFile("The host database's journal", journal, status)) KeepPrivate(journal, status);
+    const bool isThere = IsRegularFile("The host database's journal", journal, status);
+    if (isThere && isWork) KeepPrivate(journal, status);
   }
   try {
-    const int code = Open(path, &database_);
+    const int code = Open(path, isWork ? SQLITE_OPEN_READWRITE : SQLITE_OPEN_READONLY, &database_);
     if (code != SQLITE_OK) Fail(code);
-    SetPatience(Patience());
-    UpdateTables(*this);
+    SetPatience(isWork ? Patience() : std::min(Patience(), kMostToLook));
+    if (isWork) UpdateTables(*this);
+    isWorker_ = isWork;
+    workers += isWork ? 1 : 0;
   } catch (...) {
     Close();
     throw;
@@ -173,6 +196,7 @@ Store::~Store() { Close(); }
 
 void Store::Close() {
   if (kept == this) kept = nullptr;
+  workers -= isWorker_ ? 1 : 0;
   for (const auto& [sql, statement] : statements_) sqlite3_finalize(statement);
   sqlite3_close(database_);
 }

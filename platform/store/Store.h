@@ -24,8 +24,12 @@ class Store {
  public:
   /// An empty database in memory.
   Store();
+  /// What a database is opened for: to work with it, which brings it up to date, or only to look at it. Then
+  /// nothing about the file is changed, not even its mode; what it is, CheckVersion tells; and a lock of
+  /// another process is waited for a second at most.
+  enum class Use { Work, Look };
   /// The database in the file @p path, which exists and is a host's.
-  explicit Store(const std::string& path);
+  explicit Store(const std::string& path, Use use = Use::Work);
   Store(const Store&) = delete;
   Store& operator=(const Store&) = delete;
   ~Store();
@@ -93,6 +97,7 @@ class Store {
     bool happened = false;
   };
   std::string path_;
+  bool isWorker_ = false;  // it has a file open to work with it
   bool checked_ = false;
   bool inTransaction_ = false;
   Around around_ = Around::Nothing;

@@ -60,10 +60,14 @@ void FromVersion1(Store& store) {
       "DROP TABLE former");
 }
 
-void Migrate(Store& store, std::int64_t version) {
+void RequireKnown(const Store& store, std::int64_t version) {
   if (version > kVersion)
     Refuse(store, Error::Kind::NotSupported, " belongs to a newer version of this program.");
   if (version < 1) Refuse(store, Error::Kind::DamagedFile, " is damaged: it has no schema version.");
+}
+
+void Migrate(Store& store, std::int64_t version) {
+  RequireKnown(store, version);
   store.CheckStructure();  // what damage hides would be lost
   if (version == 1) FromVersion1(store);
 }
@@ -78,15 +82,18 @@ void CreateTables(Store& store) {
   SetVersion(store);
 }
 
+bool CheckVersion(Store& store) {
+  Transaction reading(store, Transaction::Access::Read);  // one look at the file for both
+  if (store.Number("PRAGMA application_id") != kApplicationId)
+    Refuse(store, Error::Kind::DamagedFile, " is not a host database.");
+  const std::int64_t version = store.Number("PRAGMA user_version");
+  reading.Commit();
+  RequireKnown(store, version);
+  return version == kVersion;
+}
+
 void UpdateTables(Store& store) try {
-  {
-    Transaction reading(store, Transaction::Access::Read);  // one look at the file for both
-    if (store.Number("PRAGMA application_id") != kApplicationId)
-      Refuse(store, Error::Kind::DamagedFile, " is not a host database.");
-    const bool present = store.Number("PRAGMA user_version") == kVersion;
-    reading.Commit();
-    if (present) return;
-  }
+  if (CheckVersion(store)) return;
   Transaction transaction(store, Transaction::Access::Change);
   const std::int64_t version = store.Number("PRAGMA user_version");  // another process may have been first
   if (version != kVersion) {

@@ -6,7 +6,9 @@
 #include <string_view>
 #include <vector>
 
-namespace corectl {
+#pragma GCC visibility push(default)
+
+namespace host {
 
 class EnvironmentText {
  public:
@@ -33,4 +35,6 @@ class EnvironmentText {
   std::vector<Line> lines_;
 };
 
-}  // namespace corectl
+}  // namespace host
+
+#pragma GCC visibility pop

@@ -1,11 +1,11 @@
-#include "corectl/EnvironmentText.h"
+#include "host/EnvironmentText.h"
 
 #include <algorithm>
 
 #include "host/Formats.h"
 #include "host/Storage.h"
 
-namespace corectl {
+namespace host {
 
 namespace {
 
@@ -146,4 +146,4 @@ std::string EnvironmentText::Text() const {
   return text;
 }
 
-}  // namespace corectl
+}  // namespace host
