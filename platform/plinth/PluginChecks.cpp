@@ -22,7 +22,7 @@ namespace {
 using AutoCli::Namespace;
 using std::chrono::steady_clock;
 
-constexpr std::chrono::seconds kMostTime{10};
+constexpr std::chrono::seconds kMostTime{5};
 constexpr char kDone = '\0';  // stands behind what the child has to say
 
 /// The child: says what became of the plug-in, and ends without more ado.
