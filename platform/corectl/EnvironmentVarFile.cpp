@@ -1,7 +1,7 @@
 #include <CoreCtl/Util.h>
 
-#include "host/EnvironmentText.h"
 #include "corectl/Operation.h"
+#include "host/EnvironmentText.h"
 #include "host/Storage.h"
 #include "store/Rehearsal.h"
 

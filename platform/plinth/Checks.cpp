@@ -28,7 +28,8 @@ class FrameworkChecks final : public CheckSource {
   }
 
   std::vector<Enclosure> Describe() override {
-    return {{"version", "hcli " HCLI_VERSION "\n"}, {"commands of plug-ins", plugins_ ? CommandsText(*plugins_) : ""}};
+    return {{"version", "hcli " HCLI_VERSION "\n"},
+            {"commands of plug-ins", plugins_ ? CommandsText(*plugins_) : ""}};
   }
 
   std::vector<Variable> Variables() override {
