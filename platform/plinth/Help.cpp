@@ -52,22 +52,6 @@ std::vector<std::string> ShellWords(const std::string& line) {
   return words;
 }
 
-/// @p line as a shell takes it too, continued behind backslashes.
-std::string WrapLine(const std::string& line, std::size_t screen) {
-  std::string wrapped = "     ";
-  std::size_t column = wrapped.size();
-  for (const std::string& word : ShellWords(Visible(line))) {
-    const std::size_t width = 1 + DisplayWidth(word);
-    if (column > 6 && column + width + 2 > screen) {
-      wrapped += " \\\n       ";
-      column = 7;
-    }
-    wrapped += ' ' + word;
-    column += width;
-  }
-  return wrapped + '\n';
-}
-
 std::string UsageText(const std::vector<std::string>& synopsis, std::size_t screen) {
   std::vector<std::string> parts = Split(synopsis.front(), ' ');
   parts.insert(parts.end(), synopsis.begin() + 1, synopsis.end());
@@ -104,7 +88,7 @@ std::string ItemsText(const PageSection& section, std::size_t screen) {
   std::string text;
   for (const PageItem& item : section.items) {
     if (section.form == Form::Examples) {
-      text += "  " + Wrap(item.term, 2, screen) + '\n' + WrapLine(item.text, screen);
+      text += "  " + Wrap(item.term, 2, screen) + '\n' + WrappedLine(item.text, 6, screen) + '\n';
     } else {
       text += (item.term.starts_with("--") ? "      " : "  ") + item.term + '\n';
       if (!item.text.empty()) text += std::string(10, ' ') + Wrap(item.text, 10, screen) + '\n';
@@ -121,6 +105,23 @@ std::string SectionText(const PageSection& section, std::size_t screen) {
 }
 
 }  // namespace
+
+std::string WrappedLine(const std::string& line, std::size_t indent, std::size_t screen) {
+  std::string wrapped(indent, ' ');
+  std::size_t column = indent;
+  for (const std::string& word : ShellWords(Visible(line))) {
+    const std::size_t width = 1 + DisplayWidth(word);
+    if (column > indent && column + width + 2 > screen) {
+      wrapped += " \\\n  " + std::string(indent, ' ');
+      column = indent + 2;
+    } else if (column > indent) {
+      wrapped += ' ';
+    }
+    wrapped += word;
+    column += width;
+  }
+  return wrapped;
+}
 
 std::string HelpText(const Place& place, std::size_t columns) {
   const Page page = HelpPage(place);

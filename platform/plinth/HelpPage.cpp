@@ -52,8 +52,10 @@ std::vector<std::string> AskForValues(const Place& place, const Parameter& param
       options.push_back("--" + needed.name + '=' + values.front().word);
     }
   }
-  std::vector<std::string> values;
-  for (const Candidate& value : ShownValues(*root, options, *source)) values.push_back(value.word);
+  const std::vector<Candidate> shown = ShownValues(*root, options, *source);
+  std::vector<std::string> values(shown.size());
+  std::transform(shown.begin(), shown.end(), values.begin(),
+                 [](const Candidate& value) { return value.word; });
   return values;
 }
 

@@ -9,7 +9,6 @@ namespace Plinth {
 
 namespace {
 
-using AutoCli::Child;
 using AutoCli::NodeData;
 using Form = PageSection::Form;
 

@@ -1,5 +1,6 @@
 #include <cstdio>
 
+#include "plinth/Help.h"
 #include "plinth/Manual.h"
 #include "plinth/Text.h"
 
@@ -94,7 +95,10 @@ std::string SectionText(const PageSection& section) {
   if (!section.text.empty()) text += Paragraph(section.text);
   for (const PageItem& item : section.items) {
     if (section.form == Form::Examples) {
-      text += ".PP\n" + Paragraph(item.term) + ".RS 4\n.EX\n" + Escaped(item.text) + "\n.EE\n.RE\n";
+      text += ".PP\n" + Paragraph(item.term) + ".RS 4\n.EX\n";
+      // What a terminal of 80 columns holds behind the indents.
+      for (const std::string& line : Split(WrappedLine(item.text, 0, 68), '\n')) text += Escaped(line) + '\n';
+      text += ".EE\n.RE\n";
     } else {
       const bool isOption = item.term.starts_with('-');
       text += ".TP\n" + (isOption ? Styled(item.term) : InFont(kBold, item.term)) + '\n';

@@ -11,8 +11,8 @@ PAGES = os.path.join(os.environ["HCLI_BUILD_DIR"], "share/man/man1")
 
 
 def words(text):
-    """The text with its lines put together."""
-    return " ".join(text.split())
+    """The text with its lines put together, also those that a backslash continues."""
+    return " ".join(text.replace("\\\n", "").split())
 
 
 def shown(page):
@@ -28,6 +28,8 @@ nodes = {"hcli" + "".join(f"-{word}" for word in node["path"].split()): node
          for node in host.result("catalogue") if node["kind"] == "command"}
 names = {name.removesuffix(".1") for name in os.listdir(PAGES)}
 check(names == {"hcli", *nodes}, "pages without commands, and the other way round", names ^ {"hcli", *nodes})
+host.succeed(f"--dry-run manual --folder {host.root}")
+check("hcli.1" not in os.listdir(host.root), "a dry run wrote pages")
 faults = []
 for name, node in sorted(nodes.items()):
     page = os.path.join(PAGES, name + ".1")
