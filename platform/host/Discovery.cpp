@@ -32,7 +32,7 @@ class Discovery {
   Discovery(Tree& tree, const Object& adapter) : tree_(tree), adapter_(adapter) {}
 
   Outcome Run() {
-    Ask();
+    if (!Ask()) return kCompleted;
     SettleTargets(tree_, adapter_.id);
     for (const FoundTarget* target : inOrder_) Take(*target);
     for (const Told& told : told_) Take(told);
@@ -54,17 +54,21 @@ class Discovery {
     if (outcome_ != kTimedOut) outcome_ = outcome;
   }
 
-  void Ask() {
+  /// False where not all were asked: the outcome is not known yet.
+  bool Ask() {
     Initiator initiator(tree_, adapter_);
+    bool areAsked = true;
     sendTargets_ = tree_.Children(adapter_.id, Kind::SendTarget);
     for (const Object& sendTarget : sendTargets_) {
       SendTargetsAnswer answer = initiator.Ask(sendTarget);
+      areAsked = areAsked && answer.status != kNotAsked;
       if (answer.status != kDone) {
         silent_.insert(sendTarget.name);
         Fail(answer.status == kNoAnswer || answer.status == kNoWayOut ? kTimedOut : kCompletedWithFailures);
       }
       for (const FoundTarget& target : answer.targets) Note(target, sendTarget);
     }
+    return areAsked;
   }
 
   /// Portals that the adapter cannot be given are passed over, and what is behind no other.

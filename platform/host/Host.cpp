@@ -183,28 +183,52 @@ Error Host::Located(const Error& error) {
 void Host::Administer(const char* call, Transaction::Access access,
                       const std::function<void(Tree&)>& work) try {
   GetStore().CheckStructure();
-  Transaction transaction(GetStore(), access);
-  Tree tree(GetStore());
-  work(tree);
-  transaction.Commit();
+  {
+    Work running(*this, access);
+    do work(running.GetTree());
+    while (!running.Commit());
+  }
   Rehearsal* const rehearsal = Rehearsal::Current();
   if (rehearsal != nullptr && access == Transaction::Access::Change) rehearsal->calls.emplace_back(call);
 } catch (const Error& error) {
   throw Located(error);
 }
 
-Host::Begun::Begun(Host& host, const Call& call, Transaction::Access access)
-    : transaction_(host.GetStore(), access), tree_(*host.tree_) {
-  tree_.SetAnswer({});
-  const std::vector<Object>& answers = host.Answers(tree_);
+Host::Work::Work(Host& host, Transaction::Access access)
+    : host_(host), access_(access), transaction_(std::in_place, host.GetStore(), access), tree_(*host.tree_) {
+  tree_.BeginOperation();
+}
+
+Host::Work::~Work() {
+  transaction_.reset();
+  tree_.BeginOperation();  // which ends the sessions of one that has failed
+}
+
+bool Host::Work::Commit() {
+  Exchanges* const exchanges = tree_.GetExchanges();
+  if (exchanges != nullptr && exchanges->ArePlanned()) {
+    transaction_.reset();
+    host_.Settle();
+    exchanges->Perform();
+    transaction_.emplace(host_.GetStore(), access_);
+    tree_.BeginAnew();
+    return false;
+  }
+  transaction_->Commit();
+  if (exchanges != nullptr) exchanges->Keep();
+  return true;
+}
+
+void Host::HearAnswers(const Call& call, Tree& tree) {
+  const std::vector<Object>& answers = Answers(tree);
   if (answers.empty()) return;  // who it is that calls matters to answers alone
   std::string adapter = call.adapter;
   if (call.object != 0) {
-    if (const auto object = tree_.Above(call.object, Kind::Adapter)) adapter = object->name;
+    if (const auto object = tree.Above(call.object, Kind::Adapter)) adapter = object->name;
   }
   const std::string operation(call.operation.Name());
-  const int count = ++host.calls_[operation];
-  const int countOnAdapter = adapter.empty() ? 0 : ++host.calls_[operation + " " + adapter];
+  const int count = ++calls_[operation];
+  const int countOnAdapter = adapter.empty() ? 0 : ++calls_[operation + " " + adapter];
   for (const Object& object : answers) {
     const Record& answer = object.record;
     if (answer.GetString("operation") != operation) continue;
@@ -226,7 +250,7 @@ Host::Begun::Begun(Host& host, const Call& call, Transaction::Access access)
       const auto status = static_cast<std::uint32_t>(answer.GetInt64("imaStatus"));
       if (status != 0) throw AnsweredError(status);
     } else {
-      tree_.SetAnswer(static_cast<Status>(answer.GetInt("status")));
+      tree.SetAnswer(static_cast<Status>(answer.GetInt("status")));
     }
     return;
   }

@@ -65,7 +65,11 @@ class Host {
   template <class Body>
   auto Outside(const Call& call, Body&& body) {
     return Traced(call, [&] {
-      Begun(*this, call, Transaction::Access::Read).Commit();
+      {
+        Work work(*this, Transaction::Access::Read);
+        HearAnswers(call, work.GetTree());
+        work.Commit();
+      }
       return body();
     });
   }
@@ -82,16 +86,23 @@ class Host {
  private:
   Host(std::string path, std::unique_ptr<Store> store);
 
-  /// A transaction in which the answers have had their say: it throws, or its tree knows the status to give.
-  class Begun {
+  /// The transactions of one operation. While it asks something of a network that makes it wait, none is
+  /// open.
+  class Work {
    public:
-    Begun(Host& host, const Call& call, Transaction::Access access);
-    void Commit() { transaction_.Commit(); }
+    Work(Host& host, Transaction::Access access);
+    Work(const Work&) = delete;
+    Work& operator=(const Work&) = delete;
+    ~Work();
     Tree& GetTree() { return tree_; }
+    /// Keeps what was done. False where that was a plan only, and is to be done anew: see Exchanges.
+    bool Commit();
 
    private:
     Reading reading_;  // so that opening the store and the work itself read once
-    Transaction transaction_;
+    Host& host_;
+    Transaction::Access access_;
+    std::optional<Transaction> transaction_;
     Tree& tree_;
   };
 
@@ -100,24 +111,29 @@ class Host {
     using Result = std::invoke_result_t<Body&, Tree&>;
     constexpr bool mayFailAfterAll = std::is_same_v<Result, std::optional<Error>>;
     return Traced(call, [&]() -> std::conditional_t<mayFailAfterAll, void, Result> {
-      Begun begun(*this, call, access);
+      Work work(*this, access);
+      Tree& tree = work.GetTree();
+      HearAnswers(call, tree);
       if constexpr (std::is_void_v<Result>) {
-        body(begun.GetTree());
-        begun.Commit();
-      } else if constexpr (std::is_same_v<Result, Status>) {
-        const std::optional<Status>& answer = begun.GetTree().Answer();
-        if (answer == Status::NotSupported) return Status::NotSupported;
-        const Status status = body(begun.GetTree());
-        begun.Commit();
-        return answer.value_or(status);
-      } else if constexpr (mayFailAfterAll) {
-        const Result failure = body(begun.GetTree());
-        begun.Commit();
-        if (failure) throw Error(*failure);
+        do body(tree);
+        while (!work.Commit());
       } else {
-        Result result = body(begun.GetTree());
-        begun.Commit();
-        return result;
+        const std::optional<Status> answer = tree.Answer();
+        if constexpr (std::is_same_v<Result, Status>) {
+          if (answer == Status::NotSupported) return Status::NotSupported;
+        }
+        for (;;) {
+          Result result = body(tree);
+          if (!work.Commit()) continue;
+          if constexpr (mayFailAfterAll) {
+            if (result) throw Error(*result);
+            return;
+          } else if constexpr (std::is_same_v<Result, Status>) {
+            return answer.value_or(result);
+          } else {
+            return result;
+          }
+        }
       }
     });
   }
@@ -169,6 +185,8 @@ class Host {
     }
   }
 
+  /// Lets the answers of the description have their say: throws, or @p tree knows the status to give.
+  void HearAnswers(const Call& call, Tree& tree);
   /// The operations that the description has answered; as they are in the transaction that @p tree reads in.
   const std::vector<Object>& Answers(Tree& tree);
   /// How many changes this rehearsal has seen; 0 where there is none.

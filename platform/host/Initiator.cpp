@@ -8,7 +8,6 @@
 #include "host/Formats.h"
 #include "host/LevelSchema.h"
 #include "host/Negotiation.h"
-#include "host/Platform.h"
 #include "host/Storage.h"
 
 namespace host {
@@ -77,6 +76,16 @@ OperationalParameters OfferAt(const Inheritance& levels) {
   offer.headerDigest = DigestAt(levels, 0);
   offer.dataDigest = DigestAt(levels, 1);
   return offer;
+}
+
+Conduct ConductAt(const Inheritance& levels) {
+  return {.loginRetries = OfferAt(levels, "InitialLoginRetryMax"),
+          .maxCommands = OfferAt(levels, "MaxCmds"),
+          .loginTimeout = OfferAt(levels, "LoginTimeout"),
+          .logoutTimeout = OfferAt(levels, "LogoutTimeout"),
+          .noopOutInterval = OfferAt(levels, "NoopOutInterval"),
+          .noopOutTimeout = OfferAt(levels, "NoopOutTimeout"),
+          .recoveryTimeout = OfferAt(levels, "RecoveryTimeout")};
 }
 
 Record SessionOf(const Agreement& agreement) {
@@ -170,8 +179,7 @@ bool GoesBy(const Object& session, const WayOut& way) {
 
 }  // namespace
 
-Initiator::Initiator(Tree& tree, const Object& adapter)
-    : tree_(tree), adapter_(adapter), network_(Platform::Current().NetworkOf(tree)) {
+Initiator::Initiator(Tree& tree, const Object& adapter) : tree_(tree), adapter_(adapter) {
   if (adapter.record.GetInt("state") != 0) {
     throw Error(Error::Kind::WrongState, "The adapter " + adapter.name + " is not online.");
   }
@@ -195,10 +203,14 @@ void Initiator::ReadWaysOut() {
   }
 }
 
-Request Initiator::RequestFor(const Inheritance& levels) const {
+Request Initiator::RequestFor(const Inheritance& levels, const WayOut& way, const Portal& portal) const {
   Request request;
+  request.adapter = adapter_.name;
+  request.way = way.name;
   request.initiator = adapter_.record.GetString("initiatorName");
+  request.portal = portal;
   request.chap = {.uni = ChapAt(levels, 0), .mutual = ChapAt(levels, 1)};
+  request.conduct = ConductAt(levels);
   return request;
 }
 
@@ -206,9 +218,9 @@ SendTargetsAnswer Initiator::Ask(const Object& sendTarget) {
   SendTargetsAnswer answer;
   answer.status = ways_.empty() ? kNoWayOut : kNoAnswer;
   for (const WayOut& way : ways_) {
-    Request request = RequestFor({&sendTarget.record, &adapter_.record});
-    request.portal = {sendTarget.record.GetString("host"), sendTarget.record.GetInt64("port")};
-    answer = Follow(way, request, [&] { return network_->SendTargets(request); });
+    Request request = RequestFor({&sendTarget.record, &adapter_.record}, way,
+                                 {sendTarget.record.GetString("host"), sendTarget.record.GetInt64("port")});
+    answer = Follow(way, request, [&] { return tree_.GetNetwork().SendTargets(request); });
     if (answer.status != kNoAnswer) break;
   }
   return answer;
@@ -275,6 +287,7 @@ std::uint32_t Initiator::LoginByEach(KnownTarget& target, const std::vector<cons
   std::uint32_t status = ways.empty() ? kNoWayOut : kDone;
   for (const WayOut* way : ways) {
     const std::uint32_t outcome = LoginBy(target, *way);
+    if (outcome == kNotAsked) return kNotAsked;  // the ways behind it may depend on what comes of this one
     if (outcome != kDone) status = status == kDone ? outcome : MoreTelling(status, outcome);
   }
   object.record.Set("loginStatus", std::int64_t{status});
@@ -286,7 +299,7 @@ std::uint32_t Initiator::LoginBy(KnownTarget& target, const WayOut& way) {
   std::uint32_t status = kNoAnswer;
   for (const Place& place : PlacesOf(target)) {
     const std::uint32_t outcome = LoginAt(target, way, place);
-    if (outcome == kDone) return kDone;
+    if (outcome == kDone || outcome == kNotAsked) return outcome;
     status = MoreTelling(status, outcome);
   }
   return status;
@@ -305,16 +318,19 @@ void Initiator::NoteTag(const KnownTarget& target, const Portal& portal, int tag
 
 std::uint32_t Initiator::LoginAt(KnownTarget& target, const WayOut& way, const Place& place) {
   LoginRequest request;
-  static_cast<Request&>(request) = RequestFor(place.levels);
-  request.portal = place.portal;
+  static_cast<Request&>(request) = RequestFor(place.levels, way, place.portal);
   request.target = target.object.record.GetString("name");
   request.isid = FreeIsid(adapter_, tree_.Children(target.object.id, Kind::Session));
   request.offer = OfferAt(place.levels);
-  const LoginAnswer answer = Follow(way, request, [&] { return network_->Login(request); });
+  const LoginAnswer answer = Follow(way, request, [&] { return tree_.GetNetwork().Login(request); });
   if (answer.status != kDone) return answer.status;
   const auto agreement = Negotiate(request.offer, answer.offer);
   if (!agreement) {
-    network_->Logout({request.initiator, request.target, request.isid, answer.tsih});
+    tree_.GetNetwork().Logout({.initiator = request.initiator,
+                               .target = request.target,
+                               .isid = request.isid,
+                               .tsih = answer.tsih,
+                               .session = answer.session});
     return kNoCommonDigest;
   }
   if (!answer.alias.empty()) target.object.record.Set("alias", answer.alias);

@@ -29,7 +29,7 @@ class Initiator {
 
   /// One session by each way out by which the target has none; where it has them all, nothing happens. Gives
   /// the target's status word: it tells of the first failure that was answered, else of the first, or of
-  /// none (kDone).
+  /// none (kDone); with kNotAsked it is not known yet.
   std::uint32_t LoginWhereMissing(KnownTarget& target);
   /// The same; but where it has them all, one session more.
   std::uint32_t LoginOnceMore(KnownTarget& target);
@@ -45,7 +45,7 @@ class Initiator {
 
   void ReadWaysOut();
   std::vector<Place> PlacesOf(const KnownTarget& target) const;
-  Request RequestFor(const Inheritance& levels) const;
+  Request RequestFor(const Inheritance& levels, const WayOut& way, const Portal& portal) const;
   std::vector<const WayOut*> WaysWithout(const std::vector<Object>& sessions) const;
 
   std::uint32_t LoginByEach(KnownTarget& target, const std::vector<const WayOut*>& ways);
@@ -56,7 +56,6 @@ class Initiator {
 
   Tree& tree_;
   Object adapter_;
-  std::unique_ptr<Network> network_;
   std::map<std::string, Object> sendTargets_;
   std::vector<WayOut> ways_;
 };

@@ -60,7 +60,7 @@ std::string LoginStatusText(std::uint32_t status) {
 }
 
 void FailedLogins::Note(const KnownTarget& target, std::uint32_t status) {
-  if (status == kDone || count_++ > 0) return;
+  if (status == kDone || status == kNotAsked || count_++ > 0) return;
   target_ = target.object.record.GetString("name");
   status_ = status;
 }

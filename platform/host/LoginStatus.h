@@ -18,7 +18,7 @@ std::string LoginStatusText(std::uint32_t status);
 /// The logins of one operation that failed.
 class FailedLogins {
  public:
-  /// The login to @p target ended with @p status, which may be kDone.
+  /// The login to @p target ended with @p status, which may be kDone, or kNotAsked.
   void Note(const KnownTarget& target, std::uint32_t status);
   /// Tells of the first that failed, and how many there were; nothing where none failed.
   std::optional<Error> GetError() const;

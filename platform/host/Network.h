@@ -36,6 +36,8 @@ inline constexpr std::uint32_t kNotAllowed = LoginResponse(0x0202);
 inline constexpr std::uint32_t kNotFound = LoginResponse(0x0203);
 inline constexpr std::uint32_t kNameMissing = LoginResponse(0x0207);
 inline constexpr std::uint32_t kOutOfResources = LoginResponse(0x0302);
+/// The network was not asked, or not yet: see Exchanges.
+inline constexpr std::uint32_t kNotAsked = 0xffffffffu;
 /// Nothing answered.
 inline constexpr std::uint32_t kNoAnswer = 0x00010000u;
 /// The adapter has no network portal to go out by.
@@ -50,12 +52,14 @@ struct ChapEntry {
   Demand demand = Demand::Prohibited;
   std::string name;
   std::string secret;
+  bool operator==(const ChapEntry&) const = default;
 };
 
 /// What the initiator brings to the security stage.
 struct ChapSettings {
   ChapEntry uni;     // the target asks the initiator
   ChapEntry mutual;  // the initiator asks the target too
+  bool operator==(const ChapSettings&) const = default;
 };
 
 /// What one side brings to the operational stage: RFC 7143 section 13. Truth values are 0 and 1.
@@ -74,20 +78,38 @@ struct OperationalParameters {
   std::uint32_t errorRecoveryLevel = 0;
   Demand headerDigest = Demand::Prohibited;
   Demand dataDigest = Demand::Prohibited;
+  bool operator==(const OperationalParameters&) const = default;
+};
+
+/// What the initiator goes by itself, and the target is not told.
+struct Conduct {
+  std::uint32_t loginRetries = 4;   // how often a login that nobody answers is tried anew
+  std::uint32_t maxCommands = 128;  // at most so many commands at a time
+  std::uint32_t loginTimeout = 15;  // seconds, as all below
+  std::uint32_t logoutTimeout = 15;
+  std::uint32_t noopOutInterval = 15;
+  std::uint32_t noopOutTimeout = 10;
+  std::uint32_t recoveryTimeout = 10;
+  bool operator==(const Conduct&) const = default;
 };
 
 /// From whom, where to, and with which proof.
 struct Request {
+  std::string adapter;    // its name
+  std::string way;        // the NIC or the adapter's own portal to go out by; empty where it has no name
   std::string initiator;  // its iSCSI name
   std::string from;       // the address to go out by; empty for any
   Portal portal;
   ChapSettings chap;
+  Conduct conduct;
+  bool operator==(const Request&) const = default;
 };
 
 struct LoginRequest : Request {
   std::string target;
   std::string isid;  // twelve hexadecimal digits
   OperationalParameters offer;
+  bool operator==(const LoginRequest&) const = default;
 };
 
 struct LogoutRequest {
@@ -95,6 +117,8 @@ struct LogoutRequest {
   std::string target;
   std::string isid;
   int tsih = 0;
+  std::int64_t session = 0;  // its id: of a machine's, where one tells of its sessions
+  bool operator==(const LogoutRequest&) const = default;
 };
 
 struct Answer {
@@ -120,7 +144,9 @@ struct LoginAnswer : Answer {
   std::string alias;  // of the target; empty where it tells none
   int portalGroupTag = 1;
   int tsih = 0;  // other than 0 after a login
+  /// What the target brings. A network that has negotiated by itself gives what was agreed on.
   OperationalParameters offer;
+  std::int64_t session = 0;  // the id of a machine's session, where one tells of them
 };
 
 class Network {
@@ -129,6 +155,14 @@ class Network {
   Network(const Network&) = delete;
   Network& operator=(const Network&) = delete;
   virtual ~Network() = default;
+
+  /// True where an exchange takes time. Then none happens while a transaction is open: the operation that
+  /// asks runs once to plan them, and once more with the answers (Exchanges.h). The answers of a network that
+  /// does not wait are a part of the operation's one transaction.
+  virtual bool DoesWait() const = 0;
+
+  // Each ends within a time of its own; what is no answer of the other side, such as a program that is
+  // missing, is an Error.
 
   /// A discovery session with one portal.
   virtual SendTargetsAnswer SendTargets(const Request& request) = 0;

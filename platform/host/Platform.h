@@ -4,6 +4,7 @@
 
 #include <memory>
 
+#include "host/Machine.h"
 #include "host/Network.h"
 #include "host/Tree.h"
 
@@ -23,6 +24,9 @@ class Platform {
 
   /// The network that the adapters of @p tree see, for the length of one operation.
   virtual std::unique_ptr<Network> NetworkOf(Tree& tree) = 0;
+  /// The machine that tells what is; null where that stands in the store too, as with an imagined one. It
+  /// asks @p tree for nothing that it tells of itself.
+  virtual std::unique_ptr<Machine> MachineOf(Tree&) { return nullptr; }
   /// The host that is there before anybody has made one: a store in memory.
   virtual std::unique_ptr<Store> NewStore() = 0;
 

@@ -2,7 +2,6 @@
 
 #include "host/Initiator.h"
 #include "host/LoginStatus.h"
-#include "host/Platform.h"
 
 namespace host {
 
@@ -14,10 +13,12 @@ Initiator InitiatorOf(Tree& tree, const KnownTarget& target) {
 
 void LogoutFrom(Tree& tree, const Object& adapter, const Object& target,
                 const std::vector<Object>& sessions) {
-  const std::unique_ptr<Network> network = Platform::Current().NetworkOf(tree);
   for (const Object& session : sessions) {
-    network->Logout({adapter.record.GetString("initiatorName"), target.name, session.record.GetString("isid"),
-                     session.record.GetInt("tsih")});
+    tree.GetNetwork().Logout({.initiator = adapter.record.GetString("initiatorName"),
+                              .target = target.name,
+                              .isid = session.record.GetString("isid"),
+                              .tsih = session.record.GetInt("tsih"),
+                              .session = session.id});
     tree.Remove(session.id);
   }
   if (!sessions.empty()) ForgetTarget(tree, target);

@@ -77,6 +77,9 @@ std::vector<std::int64_t> TargetIds(Tree& tree, std::int64_t adapter) {
   tree.ForEachChild(adapter, Kind::StaticTarget, [&](std::int64_t id, const Record& portal) {
     if (seen.insert(portal.GetString("name")).second) ids.push_back(id);
   });
+  for (const Object& target : tree.OfMachine(adapter, Kind::Target)) {
+    if (seen.insert(target.name).second) ids.push_back(target.id);
+  }
   return ids;
 }
 

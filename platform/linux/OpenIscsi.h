@@ -25,6 +25,7 @@ class OpenIscsi final : public host::Network {
  public:
   explicit OpenIscsi(Way way) : way_(std::move(way)) {}
 
+  bool DoesWait() const override { return true; }
   host::SendTargetsAnswer SendTargets(const host::Request& request) override;
   /// The session comes back when the machine has been started anew. The kernel tells no TSIH: the number of
   /// its session stands for it. The ISID is open-iscsi's own, too. Where open-iscsi has such a session

@@ -56,6 +56,8 @@ class SimulatedNetwork final : public Network {
  public:
   explicit SimulatedNetwork(host::Tree& tree) : tree_(tree) {}
 
+  bool DoesWait() const override { return false; }
+
   SendTargetsAnswer SendTargets(const Request& request) override {
     const auto portal = FindPortal(request.portal);
     const std::vector<FoundTarget>* targets = TargetsAt(request.portal);

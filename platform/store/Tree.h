@@ -31,37 +31,40 @@ struct Object {
 class Tree {
  public:
   explicit Tree(Store& store) : store_(store) {}
+  Tree(const Tree&) = delete;
+  Tree& operator=(const Tree&) = delete;
+  virtual ~Tree() = default;
 
   /// The object @p id; an Error (NotFound) where there is none, (WrongObject) where it is of another kind.
   Object Get(std::int64_t id, Kind kind);
-  std::optional<Object> Lookup(std::int64_t id);
+  virtual std::optional<Object> Lookup(std::int64_t id);
   /// The same as Get without a copy, for walks: it stays until the next See, or a change. Who goes from one
   /// object to the next in their order has them read ahead.
   const Object& See(std::int64_t id, Kind kind);
   /// The same of any kind; null where there is none.
-  const Object* Look(std::int64_t id);
+  virtual const Object* Look(std::int64_t id);
   /// The child of that name (see NameOf), if there is one.
-  std::optional<Object> Find(std::int64_t parent, Kind kind, std::string_view name);
+  virtual std::optional<Object> Find(std::int64_t parent, Kind kind, std::string_view name);
   /// In order of place.
-  std::vector<Object> Children(std::int64_t parent, Kind kind);
-  std::vector<std::int64_t> ChildIds(std::int64_t parent, Kind kind);
+  virtual std::vector<Object> Children(std::int64_t parent, Kind kind);
+  virtual std::vector<std::int64_t> ChildIds(std::int64_t parent, Kind kind);
   /// Shows the id and the record of each to @p visit, which asks for no others of that kind.
-  void ForEachChild(std::int64_t parent, Kind kind,
-                    const std::function<void(std::int64_t id, const Record& record)>& visit);
+  virtual void ForEachChild(std::int64_t parent, Kind kind,
+                            const std::function<void(std::int64_t id, const Record& record)>& visit);
   /// The closest object of @p kind at or above the object @p id, if there is one.
   std::optional<Object> Above(std::int64_t id, Kind kind);
 
   /// Adds an object behind its siblings. Its name follows from the record; one that is taken is an Error
   /// (Exists).
-  Object Insert(std::int64_t parent, Kind kind, Record record);
+  virtual Object Insert(std::int64_t parent, Kind kind, Record record);
   /// Adds an object with every key at its default, except for those in @p given.
   Object InsertNew(std::int64_t parent, Kind kind, const Record& given);
   /// Writes the record of @p object, and its name with it.
-  void Update(const Object& object);
+  virtual void Update(const Object& object);
   /// Removes all objects, the host's own too. Their ids are not used again either, but for that one.
   void Clear();
   /// Removes the object and all that is below it.
-  void Remove(std::int64_t id);
+  virtual void Remove(std::int64_t id);
 
   Store& GetStore() { return store_; }
 
