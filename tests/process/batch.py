@@ -1,6 +1,7 @@
 """Command lines of a file, in one process: what each answers, which of them fail, when the answer comes, and that what
 is answered is so, also where lines are made durable together. batch.py [KILLS]"""
 
+import contextlib
 import json
 import os
 import random
@@ -127,30 +128,36 @@ def locked():
 def killed(kills):
     """Wherever it is killed, the first lines are done, as many as were answered at least, and no others."""
     random.seed(20261123)
-    longest, ended, done_count, most_behind = 0.2, 0, 0, 0
     addresses = [f"10.0.{number // 250}.{number % 250 + 1}:3260" for number in range(600)]
-    for _ in range(kills):
+    lines = "".join(f"iscsi adapter discovery sendtarget add -A hba0 -a {address}\n" for address in addresses)
+
+    def batch(seconds):
+        """How many lines are answered, and done, where it is killed after so long; and how long it has run."""
         host = Host({"adapters": [{"name": "hba0", "capabilities": {"Sendtarget Discovery Settable": True}}]})
-        write(os.path.join(host.root, "lines"), "".join(f"iscsi adapter discovery sendtarget add -A hba0 -a {address}\n"
-                                                        for address in addresses))
+        write(os.path.join(host.root, "lines"), lines)
         with open(os.path.join(host.root, "answers"), "w+", encoding="utf-8") as answers:
             process = host.start(f"--batch {host.root}/lines", stdout=answers,
                                  env=host.environment(ASAN_OPTIONS="detect_leaks=0"))
-            time.sleep(random.uniform(0, longest))
+            begin = time.monotonic()
+            with contextlib.suppress(subprocess.TimeoutExpired):
+                process.wait(seconds)
+            ran = time.monotonic() - begin
             process.kill()
             done = finished(process)
             answers.seek(0)
-            count = answers.read().count("true")
+            answered = answers.read().count("true")
         check(done.returncode in (0, -9) and not done.stderr, done)
         there = [entry["host"] + ":3260" for entry in host.show()["adapters"][0]["sendTargets"]]
-        check(there == addresses[:len(there)] and len(there) >= count, f"answered: {count}, there:", there)
+        check(there == addresses[:len(there)] and len(there) >= answered, f"answered: {answered}, there:", there)
         check(is_sound(host.database), "the database is damaged")
-        ended += done.returncode == 0
-        done_count += len(there)
-        most_behind = max(most_behind, len(there) - count)
-        longest *= 0.8 if done.returncode == 0 else 1.1
-    check(0 < ended < kills, f"{ended} of {kills} were not killed in time")
-    print(f"{kills - ended} killed, {ended} not in time; {done_count} lines done, at most {most_behind} behind those answered")
+        return answered, len(there), ran
+
+    answered, done, longest = batch(60)
+    check(answered == done == len(addresses), "not all is done", answered, done)
+    runs = [batch(random.uniform(0, longest))[:2] for _ in range(kills)]
+    behind = [done - answered for answered, done in runs if 0 < done < len(addresses)]
+    check(behind, "none was killed in the middle", runs)
+    print(f"{len(behind)} of {kills} killed in the middle, at most {max(behind)} lines done and not answered")
 
 
 answered()
