@@ -103,7 +103,7 @@ PageSection OptionsSection(const std::string& heading, const std::vector<Paramet
 std::string SourceText(const Place& place, const Parameter& parameter,
                        const std::vector<std::string>& values) {
   const ValueSource* const source = place.OwnGuide().FindValues(place.path, parameter.name);
-  if (!source || source->from.empty() || parameter.sensitive) return "";
+  if (!source || source->from.empty() || source->from == place.path || parameter.sensitive) return "";
   std::string text = "One of what \"" + ProgramWith(source->from) + "\" shows as " + source->field;
   if (!values.empty()) text += ": " + Join(values, ", ");
   return text + (source->isListed ? ". \"hcli explain\" tells what each is." : ".");

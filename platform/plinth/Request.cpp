@@ -94,8 +94,9 @@ class RequestReader {
       request_.isLost = true;
       throw UsageError(UnknownWord(*request_.node, request_.path, word));
     }
-    if (request_.path.empty() && word == kHelpWord && !request_.global.For("help").given) {
-      return request_.global.Take(*request_.global.Find("help"), nullptr);
+    if (request_.path.empty() && word == kHelpWord && !request_.isHelp) {
+      request_.isHelp = true;
+      return;
     }
     request_.path += (request_.path.empty() ? "" : " ") + word;
     request_.node = child;

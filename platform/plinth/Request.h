@@ -16,6 +16,8 @@ struct Request {
 
   /// Where the words begin.
   AutoCli::NamespaceNode* start;
+  /// The word "help" stands in front of the others.
+  bool isHelp = false;
   /// Where the words lead; they may end at a namespace.
   AutoCli::NamespaceNode* node;
   /// The words that lead there, blanks between.

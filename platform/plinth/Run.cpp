@@ -93,7 +93,7 @@ bool PrepareParts(Run& run) {
     ShowText(run, "hcli " HCLI_VERSION "\n");
     return false;
   }
-  if (request.global.For("help").truth) {
+  if (request.isHelp || request.global.For("help").truth) {
     ShowHelp(run);
     return false;
   }

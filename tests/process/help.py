@@ -16,6 +16,7 @@ for node in demo.result("catalogue"):
         before, behind = demo.run(f"help {node['path']}"), demo.run(f"{node['path']} --help")
         check((before.stdout, before.returncode) == (behind.stdout, 0), before, behind)
 check(demo.succeed("help") == demo.succeed("--help") and demo.succeed("-V") == demo.succeed("--version"), "help, -V")
+check(demo.succeed("help iscsi -h") == demo.succeed("iscsi"), "help twice")
 
 
 def text(host, line=HELP):
