@@ -61,8 +61,9 @@ std::vector<std::string> AskForValues(const Place& place, const Parameter& param
 
 /// "0 this; 1 that."
 std::string Sentence(const std::vector<PageItem>& items) {
-  std::vector<std::string> parts;
-  for (const PageItem& item : items) parts.push_back(item.term + ' ' + item.text);
+  std::vector<std::string> parts(items.size());
+  std::transform(items.begin(), items.end(), parts.begin(),
+                 [](const PageItem& item) { return item.term + ' ' + item.text; });
   return Join(parts, "; ") + '.';
 }
 
