@@ -78,9 +78,10 @@ class Command : public virtual NamespaceNode {
   void SetDefaultOutputFormatter(const std::string& name);
   /// A setting of the formatter; a later call for @p key replaces an earlier one. "fields" or "fields:TYPE"
   /// is the fields to show, separated by commas, in order; "header:TYPE" the heading of each structure of the
-  /// type TYPE in "simple", with %NAME% for the value of its field NAME; "dense:TYPE", whatever its value,
-  /// has no lines there between structures of that type, for fields without a text and for those in the
-  /// heading. Other keys have no effect.
+  /// type TYPE in "simple", with %NAME% for the value of its field NAME. "dense:TYPE" has no lines there
+  /// between structures of the type, for fields without a text and for those in the heading, and breaks lines
+  /// to the width of a terminal, but for those of the fields that it names, separated by commas. Other keys
+  /// have no effect.
   void SetDefaultOutputParameter(const std::string& key, const std::string& value);
   /// A mark for tools, such as "type" = "fetcher" for a command that reads or "operation" for one that
   /// changes the host. A later call for @p key replaces an earlier one.

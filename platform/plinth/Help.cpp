@@ -10,29 +10,6 @@ namespace {
 
 using Form = PageSection::Form;
 
-/// @p text with its own lines, each broken at blanks to fit behind @p indent blanks within @p screen columns.
-/// The first line has no indent: something stands in front of it.
-std::string Wrap(const std::string& text, std::size_t indent, std::size_t screen) {
-  std::string wrapped;
-  for (const std::string& line : Split(Visible(text, Lines::Kept), '\n')) {
-    if (!wrapped.empty()) wrapped += '\n' + std::string(indent, ' ');
-    std::size_t column = indent;
-    for (const std::string& word : Split(line, ' ')) {
-      const std::size_t width = DisplayWidth(word);
-      if (column > indent && column + 1 + width > screen) {
-        wrapped += '\n' + std::string(indent, ' ');
-        column = indent;
-      } else if (column > indent) {
-        wrapped += ' ';
-        ++column;
-      }
-      wrapped += word;
-      column += width;
-    }
-  }
-  return wrapped;
-}
-
 /// The words of a line for a shell, each with its quotes.
 std::vector<std::string> ShellWords(const std::string& line) {
   std::vector<std::string> words{""};

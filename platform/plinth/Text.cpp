@@ -122,6 +122,27 @@ std::string Shortened(std::string_view visible, std::size_t width) {
   return shortened;
 }
 
+std::string Wrap(const std::string& text, std::size_t indent, std::size_t screen) {
+  std::string wrapped;
+  for (const std::string& line : Split(Visible(text, Lines::Kept), '\n')) {
+    if (!wrapped.empty()) wrapped += '\n' + std::string(indent, ' ');
+    std::size_t column = indent;
+    for (const std::string& word : Split(line, ' ')) {
+      const std::size_t width = DisplayWidth(word);
+      if (column > indent && column + 1 + width > screen) {
+        wrapped += '\n' + std::string(indent, ' ');
+        column = indent;
+      } else if (column > indent) {
+        wrapped += ' ';
+        ++column;
+      }
+      wrapped += word;
+      column += width;
+    }
+  }
+  return wrapped;
+}
+
 std::string Join(const std::vector<std::string>& parts, std::string_view separator) {
   std::string joined;
   for (std::size_t index = 0; index < parts.size(); ++index) {

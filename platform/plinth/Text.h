@@ -40,6 +40,10 @@ std::size_t DisplayWidth(std::string_view visible);
 /// are at least 1: of names, the end tells as much as the beginning.
 std::string Shortened(std::string_view visible, std::size_t width);
 
+/// @p text, made visible, with its own lines, each broken at blanks to fit behind @p indent blanks within @p
+/// screen columns. The first line has no indent: something stands in front of it.
+std::string Wrap(const std::string& text, std::size_t indent, std::size_t screen);
+
 std::string Join(const std::vector<std::string>& parts, std::string_view separator);
 std::vector<std::string> Split(std::string_view text, char separator);
 

@@ -82,7 +82,7 @@ class DoctorCommand final : public Plinth::AutoCli::Command {
     SetDefaultOutputFormatter("simple");
     SetDefaultOutputParameter("header:Finding", "%State%: %Check%: %Seen%");
     SetDefaultOutputParameter("fields:Finding", "State,Check,Seen,Mend");
-    SetDefaultOutputParameter("dense:Finding", "true");
+    SetDefaultOutputParameter("dense:Finding", "Mend");
   }
 
  private:

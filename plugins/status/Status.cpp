@@ -34,7 +34,7 @@ class StatusCommand final : public Plinth::AutoCli::Command {
     SetDefaultOutputFormatter("simple");
     SetDefaultOutputParameter("header:HostStatus", "%State%: %Where%: %Finding%");
     SetDefaultOutputParameter("fields:HostStatus", "State,Where,Finding,Detail,Targets,Look Closer");
-    SetDefaultOutputParameter("dense:HostStatus", "true");
+    SetDefaultOutputParameter("dense:HostStatus", "Look Closer");
   }
 
  private:

@@ -45,6 +45,9 @@ def healthy():
     check(not found["fault"] and not found["warning"], found)
     for text in "host.db is sound", "iqn.2026-11.org.example:host", "All of them make sense", "It brings: iscsi":
         has(found, "ok", text)
+    shown, status = host.on_terminal("status", rows=99)
+    long = [line for line in shown.decode().splitlines() if len(line) > 80]
+    check(status == 0 and not long and b"\n      iqn.2026-11.org.example:vault" in shown, shown)
     # Once each in a batch, in a dry run, and in a text form.
     done = host.run("--batch -", "doctor\nstatus\n")
     check(done.returncode == 0 and "host.db is sound" in done.stdout, done)
