@@ -180,9 +180,9 @@ Error Host::Located(const Error& error) {
                "The host database " + GetStore().GetPath() + " is damaged: " + error.what() + ".");
 }
 
-void Host::Administer(const char* call, Transaction::Access access,
-                      const std::function<void(Tree&)>& work) try {
-  GetStore().CheckStructure();
+void Host::Administer(const char* call, Transaction::Access access, const std::function<void(Tree&)>& work,
+                      void (Store::*check)()) try {
+  (GetStore().*check)();
   {
     Work running(*this, access);
     do work(running.GetTree());

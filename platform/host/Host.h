@@ -75,8 +75,10 @@ class Host {
   }
 
   /// Runs @p work in one transaction, neither traced nor answered, for what a platform does to the host as a
-  /// whole. @p call is what a rehearsal shows of a change.
-  void Administer(const char* call, Transaction::Access access, const std::function<void(Tree&)>& work);
+  /// whole. @p call is what a rehearsal shows of a change, and @p check finds out whether the store is fit
+  /// for it.
+  void Administer(const char* call, Transaction::Access access, const std::function<void(Tree&)>& work,
+                  void (Store::*check)() = &Store::CheckStructure);
 
   /// The file of the host under HCLI_ROOT. An Error where that is empty.
   static std::string DatabasePath();

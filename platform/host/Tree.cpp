@@ -106,6 +106,10 @@ Object Tree::Insert(std::int64_t parent, Kind kind, Record record) {
   return made_.back();
 }
 
+std::int64_t Tree::Add(std::int64_t parent, Kind kind, std::string_view name, const Record& record) {
+  return IsOfMachine(kind) ? Insert(parent, kind, record).id : store::Tree::Add(parent, kind, name, record);
+}
+
 void Tree::Update(const Object& object) {
   if (object.id < kFirstMachineId) store::Tree::Update(object);
 }

@@ -31,6 +31,7 @@ class Tree final : public store::Tree {
   void ForEachChild(std::int64_t parent, Kind kind,
                     const std::function<void(std::int64_t id, const Record& record)>& visit) override;
   Object Insert(std::int64_t parent, Kind kind, Record record) override;
+  std::int64_t Add(std::int64_t parent, Kind kind, std::string_view name, const Record& record) override;
   void Update(const Object& object) override;
   void Remove(std::int64_t id) override;
 

@@ -37,13 +37,13 @@ Json Show(host::Tree& tree, const Object& object, bool secrets) {
 
 }  // namespace
 
-void LoadDescription(host::Tree& tree, Description description) {
+void LoadDescription(host::Tree& tree, const Description& description) {
   tree.Clear();
   std::vector<std::int64_t> ids;
   ids.reserve(description.size());
-  for (DocumentObject& described : description) {
+  for (const DocumentObject& described : description) {
     const std::int64_t parent = ids.empty() ? 0 : ids[described.parent];
-    ids.push_back(tree.Insert(parent, described.kind, std::move(described.record)).id);
+    ids.push_back(tree.Add(parent, described.kind, described.name, described.record));
   }
 }
 

@@ -24,7 +24,7 @@ using Description = store::Document;
 Description ReadDescription(const std::string& text);
 
 /// Replaces all that is in @p tree by what @p description has.
-void LoadDescription(host::Tree& tree, Description description);
+void LoadDescription(host::Tree& tree, const Description& description);
 
 /// The description of @p tree, which LoadDescription reads into an equal one. Without @p secrets, they are
 /// masked, and LoadDescription refuses it.

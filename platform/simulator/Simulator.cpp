@@ -11,12 +11,12 @@ namespace simulator {
 namespace {
 
 std::unique_ptr<host::Store> DescribedStore(const std::string& text) {
-  Description description = ReadDescription(text);
+  const Description description = ReadDescription(text);
   auto store = std::make_unique<host::Store>();
   host::Transaction transaction(*store, host::Transaction::Access::Change);
   store::CreateTables(*store);
   host::Tree tree(*store);
-  LoadDescription(tree, std::move(description));
+  LoadDescription(tree, description);
   transaction.Commit();
   return store;
 }
@@ -37,11 +37,12 @@ std::unique_ptr<host::Host> HostOf(const std::string& description) {
 
 void Load(const std::string& text, host::Host& host) {
   // Nobody has to wait while a large one is read.
-  Description description = ReadDescription(text);
+  const Description description = ReadDescription(text);
   // A page written before its time would lock out readers for the whole of a long load.
   host.GetStore().Execute("PRAGMA cache_spill=off");
-  host.Administer("Load(...)", host::Transaction::Access::Change,
-                  [&](host::Tree& tree) { LoadDescription(tree, std::move(description)); });
+  host.Administer(
+      "Load(...)", host::Transaction::Access::Change,
+      [&](host::Tree& tree) { LoadDescription(tree, description); }, &host::Store::CheckPages);
 }
 
 std::string Show(bool secrets, host::Host& host) {

@@ -2,8 +2,9 @@
 #pragma once
 
 #include <cstddef>
+#include <deque>
+#include <string>
 #include <string_view>
-#include <vector>
 
 #include "store/Record.h"
 #include "store/Schema.h"
@@ -21,11 +22,13 @@ struct DocumentObject {
   std::size_t parent = 0;  // its number in the document; the root's is 0
   std::size_t place = 0;   // among the children of the parent that are of the same kind, from 0
   std::size_t offset = 0;  // in the text
+  std::string name = {};   // as NameOf gives it
   Record record;
 };
 
-/// The objects in the order in which they begin: the root, and each behind its parent.
-using Document = std::vector<DocumentObject>;
+/// The objects in the order in which they begin: the root, and each behind its parent. They stay where they
+/// are.
+using Document = std::deque<DocumentObject>;
 
 /// The record of an object of @p kind with all of @p given and the defaults of what is not in it, checked.
 Record Complete(Kind kind, const Record& given);

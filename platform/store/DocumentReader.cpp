@@ -1,5 +1,9 @@
 #include "store/DocumentReader.h"
 
+#include <algorithm>
+#include <functional>
+#include <map>
+
 #include "store/DocumentChecks.h"
 #include "store/Text.h"
 
@@ -188,17 +192,32 @@ void DocumentReader::Complete() {
   const Level& level = Top();
   const KindSpec& spec = *level.spec;
   const std::size_t number = level.object;
-  objects_[number].record = Record::Stored(std::string(level.document));
+  objects_[number].record = Record::Stored(level.document);
+  objects_[number].name = NameOf(spec.kind, objects_[number].record);
   RequireRight(objects_, number);
   Pop();
   if (depth_ == 0) return;
   Level& list = Top();
   if (!spec.nameKeys.empty()) {
-    std::string name = NameOf(spec.kind, objects_[number].record);
-    const auto [first, isNew] = list.names.emplace(std::move(name), list.count);
-    if (!isNew || first->first.empty()) RefuseName(objects_, number, first->first, first->second);
+    const std::string& name = objects_[number].name;
+    if (name.empty()) RefuseName(objects_, number, name, list.count);
+    list.names.push_back(std::hash<std::string_view>()(name));
   }
   ++list.count;
+}
+
+void DocumentReader::RequireOwnNames(Level& list) const {
+  std::sort(list.names.begin(), list.names.end());
+  const bool areOwn = std::adjacent_find(list.names.begin(), list.names.end()) == list.names.end();
+  list.names.clear();
+  if (areOwn) return;
+  std::map<std::string_view, std::size_t> places;
+  for (std::size_t number = list.object + 1; number < objects_.size(); ++number) {
+    const DocumentObject& object = objects_[number];
+    if (object.parent != list.object || object.kind != list.spec->kind) continue;
+    const auto [first, isNew] = places.emplace(object.name, object.place);
+    if (!isNew) RefuseName(objects_, number, object.name, first->second);
+  }
 }
 
 void DocumentReader::BeginList() {
@@ -218,7 +237,7 @@ void DocumentReader::BeginList() {
 void DocumentReader::EndList() {
   Level& list = Top();
   if (list.shape == Level::Shape::Objects) {
-    list.names = {};  // clearing would look through all the room that they had, whenever it is used again
+    RequireOwnNames(list);
     Pop();
   } else {
     bson::EndDocument(list.document);

@@ -68,13 +68,16 @@ const KindSpec& GetKindSpec(Kind kind) {
 }
 
 std::string NameOf(Kind kind, const Record& record) {
+  const KindSpec& spec = GetKindSpec(kind);
   std::string name;
-  for (const std::string_view key : GetKindSpec(kind).nameKeys) {
+  for (const std::string_view key : spec.nameKeys) {
     if (!name.empty()) name += ' ';
-    const Key& spec = *FindKey(GetKindSpec(kind).keys, key);
-    std::string part =
-        spec.type == Type::Integer ? std::to_string(record.GetInt64(key)) : record.GetString(key);
-    name += spec.folded ? LowerCase(part) : part;
+    const Key& part = *FindKey(spec.keys, key);
+    if (part.type == Type::Integer) {
+      name += std::to_string(record.GetInt64(key));
+    } else {
+      name += part.folded ? LowerCase(record.GetString(key)) : record.GetString(key);
+    }
   }
   return name;
 }

@@ -201,9 +201,8 @@ void Store::Close() {
   sqlite3_close(database_);
 }
 
-void Store::CheckStructure() {
-  if (checked_) return;
-  Statement statement(*this, "PRAGMA integrity_check(1)");
+void Store::RequireOk(const char* pragma) {
+  Statement statement(*this, pragma);
   const std::string found(statement.Step() ? statement.GetText(0) : "ok");
   if (found != "ok") {
     // A heading may stand on a line of its own in front.
@@ -211,7 +210,15 @@ void Store::CheckStructure() {
                 "The host database " + path_ +
                     Reason(SQLITE_CORRUPT, 0, Words(found.substr(found.rfind('\n') + 1), SQLITE_CORRUPT)));
   }
+}
+
+void Store::CheckStructure() {
+  if (!checked_) RequireOk("PRAGMA integrity_check(1)");
   checked_ = true;
+}
+
+void Store::CheckPages() {
+  if (!checked_) RequireOk("PRAGMA quick_check(1)");
 }
 
 bool Store::IsSmall() { return Number("PRAGMA page_count") <= kFewPages; }

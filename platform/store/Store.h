@@ -51,6 +51,8 @@ class Store {
   void EndReading();
   /// An Error where the file's structure is damaged. Looks once at the whole of it; later calls cost nothing.
   void CheckStructure();
+  /// The same for what is all to be replaced: that no page is in use twice, and none lost.
+  void CheckPages();
   /// True where looking at the whole file takes no more than a few tenths of a millisecond.
   bool IsSmall();
   /// How long a lock of another process is waited for; as store::Patience has it from the start.
@@ -83,6 +85,7 @@ class Store {
   int Step(sqlite3_stmt* statement);
   [[noreturn]] void Fail(int code);
   void Close();
+  void RequireOk(const char* pragma);
   /// True where the one transaction of a rehearsal or a group is open, around those of the calls. One failure
   /// or another may have ended it.
   bool IsWithin() const;

@@ -155,8 +155,12 @@ std::optional<Object> Tree::Above(std::int64_t id, Kind kind) {
 }
 
 Object Tree::Insert(std::int64_t parent, Kind kind, Record record) {
-  std::string name = NameOf(kind, record);
-  Object object{.parent = parent, .kind = kind, .name = std::move(name), .record = std::move(record)};
+  Object object{.parent = parent, .kind = kind, .name = NameOf(kind, record), .record = std::move(record)};
+  object.id = Add(parent, kind, object.name, object.record);
+  return object;
+}
+
+std::int64_t Tree::Add(std::int64_t parent, Kind kind, std::string_view name, const Record& record) {
   aheadCount_ = 0;
   Statement statement(store_, "INSERT INTO object(id, parent, kind, name, record) VALUES(?, ?, ?, ?, ?)");
   if (kind == RootKind()) {
@@ -165,13 +169,12 @@ Object Tree::Insert(std::int64_t parent, Kind kind, Record record) {
     statement.BindNull();  // gets the next one
   }
   statement.Bind(parent).Bind(Number(kind));
-  BindName(statement, object.name);
-  if (!statement.BindBytes(object.record.Bytes()).Insert()) {
-    throw Error(Error::Kind::Exists, "The " + std::string(GetKindSpec(kind).word) + " " +
-                                         Quoted(object.name) + " exists already.");
+  BindName(statement, name);
+  if (!statement.BindBytes(record.Bytes()).Insert()) {
+    throw Error(Error::Kind::Exists,
+                "The " + std::string(GetKindSpec(kind).word) + " " + Quoted(name) + " exists already.");
   }
-  object.id = store_.LastId();
-  return object;
+  return store_.LastId();
 }
 
 Object Tree::InsertNew(std::int64_t parent, Kind kind, const Record& given) {

@@ -57,6 +57,8 @@ class Tree {
   /// Adds an object behind its siblings. Its name follows from the record; one that is taken is an Error
   /// (Exists).
   virtual Object Insert(std::int64_t parent, Kind kind, Record record);
+  /// The same where the name is known; returns the id.
+  virtual std::int64_t Add(std::int64_t parent, Kind kind, std::string_view name, const Record& record);
   /// Adds an object with every key at its default, except for those in @p given.
   Object InsertNew(std::int64_t parent, Kind kind, const Record& given);
   /// Writes the record of @p object, and its name with it.
