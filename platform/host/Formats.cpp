@@ -19,15 +19,6 @@ bool IsDigit(char c) { return c >= '0' && c <= '9'; }
 bool IsHex(char c) { return IsDigit(c) || (c >= 'a' && c <= 'f') || (c >= 'A' && c <= 'F'); }
 bool IsLetterOrDigit(char c) { return IsDigit(c) || (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); }
 
-template <class Bytes>
-std::optional<Bytes> Parse(int family, std::string_view text) {
-  Bytes bytes;
-  // inet_pton stops at a zero, which must not hide what stands behind it.
-  if (text.find('\0') != text.npos || inet_pton(family, std::string(text).c_str(), bytes.data()) != 1)
-    return {};
-  return bytes;
-}
-
 /// The labels of a domain name: letters, digits and inner hyphens, at most 63 each.
 bool AreLabels(std::string_view text) {
   for (std::size_t begin = 0;;) {
@@ -75,8 +66,28 @@ bool IsNameCharacter(char c) {
 
 }  // namespace
 
-std::optional<Ipv4Bytes> ParseIpv4(std::string_view text) { return Parse<Ipv4Bytes>(AF_INET, text); }
-std::optional<Ipv6Bytes> ParseIpv6(std::string_view text) { return Parse<Ipv6Bytes>(AF_INET6, text); }
+std::optional<Ipv4Bytes> ParseIpv4(std::string_view text) {
+  // inet_pton is not used: it takes five times as long, and each of thousands of targets passes here.
+  Ipv4Bytes bytes;
+  const char* at = text.data();
+  const char* const end = at + text.size();
+  for (std::uint8_t& byte : bytes) {
+    if (&byte != bytes.data() && (at == end || *at++ != '.')) return {};
+    const auto [next, error] = std::from_chars(at, end, byte);
+    if (error != std::errc() || (next - at > 1 && *at == '0')) return {};
+    at = next;
+  }
+  if (at != end) return {};
+  return bytes;
+}
+
+std::optional<Ipv6Bytes> ParseIpv6(std::string_view text) {
+  Ipv6Bytes bytes;
+  // inet_pton stops at a zero, which must not hide what stands behind it.
+  if (text.find('\0') != text.npos || inet_pton(AF_INET6, std::string(text).c_str(), bytes.data()) != 1)
+    return {};
+  return bytes;
+}
 
 std::string FormatIpv4(const Ipv4Bytes& bytes) {
   char text[16];

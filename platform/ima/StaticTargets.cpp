@@ -10,7 +10,7 @@ using host::Tree;
 namespace {
 
 /// @p id is all zeros.
-void SetHost(IMA_HOST_ID& id, const std::string& host) {
+void SetHost(IMA_HOST_ID& id, std::string_view host) {
   const IMA_IP_ADDRESS address = ima::Address(host);
   if (address.ipv4Address || host::ParseIpv6(host)) {
     id.id.ipAddress = address;
@@ -42,8 +42,8 @@ extern "C" IMA_STATUS IMA_GetStaticDiscoveryTargetProperties(
   return ima::ReadProperties("IMA_GetStaticDiscoveryTargetProperties", staticTargetOid,
                              IMA_OBJECT_TYPE_STATIC_DISC_TARGET, properties,
                              [](Tree&, const Object& target, IMA_STATIC_DISCOVERY_TARGET_PROPERTIES& filled) {
-                               ima::SetWide(filled.targetName, target.record.GetString("name"));
-                               SetHost(filled.targetAddress, target.record.GetString("host"));
+                               ima::SetWide(filled.targetName, target.record.GetText("name"));
+                               SetHost(filled.targetAddress, target.record.GetText("host"));
                                filled.port = ima::Unsigned16(target.record, "port");
                                if (!target.record.Has("portalGroup")) return;
                                filled.tpgtPresent = 1;

@@ -38,8 +38,8 @@ extern "C" IMA_STATUS IMA_GetTargetProperties(IMA_OID targetOid, IMA_TARGET_PROP
     const host::KnownTarget target = ima::GetTarget(tree, targetOid);
     const Record& record = target.object.record;
     IMA_TARGET_PROPERTIES filled{};
-    ima::SetWide(filled.name, record.GetString("name"));
-    ima::SetWide(filled.alias, record.GetString("alias"));
+    ima::SetWide(filled.name, record.GetText("name"));
+    ima::SetWide(filled.alias, record.GetText("alias"));
     filled.discoveryMethodFlags = DiscoveryFlags(target);
     filled.sendTargetsDiscoverySettable = ima::Bool(record, "sendTargetsDiscoverySettable");
     filled.sendTargetsDiscoveryEnabled = ima::Bool(record, "sendTargetsDiscoveryEnabled");

@@ -48,31 +48,22 @@ std::size_t SizeAt(std::string_view bytes, std::size_t place, std::size_t end, s
   return static_cast<std::size_t>(size);
 }
 
-}  // namespace
-
-void Damaged() { throw Error(Error::Kind::Damaged, "a record is not a BSON document"); }
-
-Cursor::Cursor(std::string_view bytes, std::size_t document) : bytes_(bytes), next_(document + kLength) {
-  end_ = document + SizeAt(bytes, document, bytes.size(), document, kLeast) - 1;
-}
-
-bool Cursor::Next(Element& element) {
-  if (next_ == end_) return false;
-  element.begin = next_;
-  element.type = static_cast<Type>(bytes_[next_]);
-  const std::size_t key = next_ + 1;
-  const std::size_t value =
-      key + std::strlen(bytes_.data() + key) + 1;  // there is a zero behind the last one, too
-  if (value > end_) Damaged();
-  element.key = bytes_.substr(key, value - 1 - key);
+/// The element at @p begin of a document whose elements end at @p end.
+inline Element ElementAt(std::string_view bytes, std::size_t begin, std::size_t end) {
+  Element element{.type = static_cast<Type>(bytes[begin]), .key = {}, .begin = begin};
+  const char* const key = bytes.data() + begin + 1;
+  const std::size_t length = std::strlen(key);  // there is a zero behind the last element, too
+  element.key = {key, length};
+  element.value = begin + 1 + length + 1;
+  if (element.value > end) Damaged();
   std::size_t size = 0;
   switch (element.type) {
     case Type::Text:
-      size = kLength + SizeAt(bytes_, value, end_, value + kLength, 1);
+      size = kLength + SizeAt(bytes, element.value, end, element.value + kLength, 1);
       break;
     case Type::Document:
     case Type::Array:
-      size = SizeAt(bytes_, value, end_, value, kLeast);
+      size = SizeAt(bytes, element.value, end, element.value, kLeast);
       break;
     case Type::Boolean:
       size = 1;
@@ -89,10 +80,37 @@ bool Cursor::Next(Element& element) {
     default:
       Damaged();
   }
-  if (size > end_ - value) Damaged();
-  element.value = value;
-  element.end = next_ = value + size;
+  if (size > end - element.value) Damaged();
+  element.end = element.value + size;
+  return element;
+}
+
+}  // namespace
+
+void Damaged() { throw Error(Error::Kind::Damaged, "a record is not a BSON document"); }
+
+Cursor::Cursor(std::string_view bytes, std::size_t document) : bytes_(bytes), next_(document + kLength) {
+  end_ = document + SizeAt(bytes, document, bytes.size(), document, kLeast) - 1;
+}
+
+bool Cursor::Next(Element& element) {
+  if (next_ == end_) return false;
+  element = ElementAt(bytes_, next_, end_);
+  next_ = element.end;
   return true;
+}
+
+bool Cursor::Find(std::string_view key, std::size_t end, Element& element) {
+  while (next_ != end) {
+    const Element here = ElementAt(bytes_, next_, end_);
+    next_ = here.end;
+    // Without a call for those of another length, which most are.
+    if (here.key.size() == key.size() && here.key == key) {
+      element = here;
+      return true;
+    }
+  }
+  return false;
 }
 
 std::int32_t Int32At(std::string_view bytes, std::size_t place) {

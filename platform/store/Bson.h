@@ -36,6 +36,8 @@ class Cursor {
   Cursor(std::string_view bytes, std::size_t document);
   /// Goes on to the next element; false behind the last one.
   bool Next(Element& element);
+  /// Goes on behind the element of @p key, where it is one of those up to @p end; false where it is not.
+  bool Find(std::string_view key, std::size_t end, Element& element);
   /// The place of the element that comes next.
   std::size_t Place() const { return next_; }
   /// Goes to @p place, where an element of the document begins.

@@ -28,19 +28,10 @@ constexpr int kMostDepth = 16;  // twice that of any kind of object
 
 bool HoldsElements(Type type) { return type == Type::Document || type == Type::Array; }
 
-/// Sets @p element to that of @p key, where it is one of those from the cursor's up to @p end.
-bool FindKey(Cursor& cursor, std::size_t end, std::string_view key, Element& element) {
-  while (cursor.Place() != end && cursor.Next(element)) {
-    // Without a call for those of another length, which most are.
-    if (element.key.size() == key.size() && element.key == key) return true;
-  }
-  return false;
-}
-
-/// The same in the document at @p document.
+/// Sets @p element to that of @p key in the document at @p document; false where there is none.
 bool FindMember(std::string_view bytes, std::size_t document, std::string_view key, Element& element) {
   Cursor cursor(bytes, document);
-  return FindKey(cursor, cursor.End(), key, element);
+  return cursor.Find(key, cursor.End(), element);
 }
 
 /// The same of a whole record, from @p place on, which becomes that of the element: most keys are asked for
@@ -50,9 +41,9 @@ bool FindMemberFrom(std::size_t& place, std::string_view bytes, std::string_view
   const std::size_t begin = cursor.Place();
   const std::size_t middle = std::max(begin, place);
   cursor.GoTo(middle);
-  if (!FindKey(cursor, cursor.End(), key, element)) {
+  if (!cursor.Find(key, cursor.End(), element)) {
     cursor.GoTo(begin);
-    if (!FindKey(cursor, middle, key, element)) return false;
+    if (!cursor.Find(key, middle, element)) return false;
   }
   place = element.begin;
   return true;
@@ -201,12 +192,12 @@ bool Record::Has(std::string_view path) const {
   return Find(path, element);
 }
 
-std::string Record::GetString(std::string_view path) const {
+std::string_view Record::GetText(std::string_view path) const {
   const Element element = At(path);
   if (element.type != Type::Text) Damaged(path, "has no text");
   const std::string_view text = bson::TextOf(bytes_, element);
   if (!IsUtf8(text)) Damaged(path, "has no text");
-  return std::string(text);
+  return text;
 }
 
 std::int64_t Record::GetInt64(std::string_view path) const {
@@ -230,7 +221,7 @@ bool Record::GetBool(std::string_view path) const {
 }
 
 int Record::GetWord(std::string_view path, std::span<const std::string_view> words) const {
-  const auto found = std::find(words.begin(), words.end(), GetString(path));
+  const auto found = std::find(words.begin(), words.end(), GetText(path));
   if (found == words.end()) Damaged(path, "has an unknown word");
   return static_cast<int>(found - words.begin());
 }

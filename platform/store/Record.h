@@ -40,7 +40,9 @@ class Record {
   bool operator==(const Record& other) const { return bytes_ == other.bytes_; }
 
   bool Has(std::string_view path) const;
-  std::string GetString(std::string_view path) const;
+  std::string GetString(std::string_view path) const { return std::string(GetText(path)); }
+  /// The same for as long as the record stays as it is.
+  std::string_view GetText(std::string_view path) const;
   std::int64_t GetInt64(std::string_view path) const;
   int GetInt(std::string_view path) const;
   bool GetBool(std::string_view path) const;

@@ -32,8 +32,13 @@ std::string CutText(std::string text, std::size_t size) {
 
 std::string NarrowText(std::span<const IMA_WCHAR> wide, std::size_t size) {
   // Most are ASCII, which needs no conversion.
-  const auto end = std::find_if(wide.begin(), wide.end(), [](IMA_WCHAR c) { return c <= 0 || c >= 0x80; });
-  if (end != wide.end() && *end == 0) return CutText(std::string(wide.begin(), end), size);
+  char ascii[kDeviceNameSize];
+  std::size_t length = 0;
+  const std::size_t most = std::min(wide.size(), sizeof ascii);
+  for (; length < most && wide[length] > 0 && wide[length] < 0x80; ++length) {
+    ascii[length] = static_cast<char>(wide[length]);
+  }
+  if (length < most && wide[length] == 0) return CutText(std::string(ascii, length), size);
   std::wstring characters;  // as many as can fit
   for (const IMA_WCHAR character : wide) {
     if (character == 0 || characters.size() >= size) break;
