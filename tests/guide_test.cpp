@@ -133,6 +133,10 @@ TEST(Guide, SaysWhereItIsWrong) {
        R"(2: the kind "pipe" is none; there are file, folder and command)"},
       {"commands:\n  a:\n    examples:\n    - line: b", "4: an example has about and line"},
       {"values: {}", "1: a list has to stand here"},
+      {"fields: {}\n---\nterms: {}", "2: a second document begins here; a guide is a single one"},
+      {"fields: {}\n...\nterms: {}", "3: did not find expected <document start>"},
+      {"values:\n- {option: a, kind: file}\n- {option: a, kind: file}",
+       "3: the values of \"a\" stand here twice for the same place"},
       {"[]", "1: names with values have to stand here"},
   };
   for (const auto& [text, problem] : cases) {

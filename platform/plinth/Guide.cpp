@@ -1,14 +1,17 @@
 #include "plinth/Guide.h"
 
-#include <glob.h>
 #include <yaml.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <filesystem>
 #include <memory>
 #include <new>
 #include <string_view>
+#include <system_error>
+#include <utility>
 
 #include "plinth/Options.h"
 #include "plinth/OwnCommands.h"
@@ -27,10 +30,18 @@ class GuideReader {
     if (!yaml_parser_initialize(&parser)) throw std::bad_alloc();
     yaml_parser_set_input_file(&parser, stream.get());
     isLoaded_ = yaml_parser_load(&parser, &document_) == 1;
-    const std::string problem = isLoaded_ ? "" : parser.problem ? parser.problem : "it cannot be read";
-    const std::size_t line = parser.problem_mark.line;
+    yaml_document_t behind;
+    // Without a document that is left, the library gives an empty one.
+    const bool isRead = isLoaded_ && yaml_parser_load(&parser, &behind) == 1;
+    if (!isRead) {
+      fault_ = At(parser.problem_mark.line, parser.problem ? parser.problem : "it cannot be read");
+    } else {
+      if (yaml_document_get_root_node(&behind)) {
+        fault_ = At(behind.start_mark.line, "a second document begins here; a guide is a single one");
+      }
+      yaml_document_delete(&behind);
+    }
     yaml_parser_delete(&parser);
-    if (!isLoaded_) Fail(line, problem);
   }
   GuideReader(const GuideReader&) = delete;
   GuideReader& operator=(const GuideReader&) = delete;
@@ -39,12 +50,13 @@ class GuideReader {
   }
 
   Guide Read() {
+    if (!fault_.empty()) throw GuideError(fault_);
     Guide guide;
     const yaml_node_t* const top = yaml_document_get_root_node(&document_);
     if (!top) return guide;
     ForEachPair(*top, [&](const std::string& key, const yaml_node_t& value) {
       if (key == "values") {
-        ForEachItem(value, [&](const yaml_node_t& item) { guide.values.push_back(ReadSource(item)); });
+        ForEachItem(value, [&](const yaml_node_t& item) { AddSource(item, guide); });
       } else if (key == "commands") {
         ForEachPair(value, [&](const std::string& path, const yaml_node_t& command) {
           ReadCommand(command, path, guide);
@@ -74,11 +86,11 @@ class GuideReader {
                                   : nullptr;
   }
 
-  [[noreturn]] void Fail(std::size_t line, const std::string& text) const {
-    throw GuideError(file_ + ':' + std::to_string(line + 1) + ": " + text);
+  std::string At(std::size_t line, const std::string& text) const {
+    return file_ + ':' + std::to_string(line + 1) + ": " + text;
   }
   [[noreturn]] void Fail(const yaml_node_t& node, const std::string& text) const {
-    Fail(node.start_mark.line, text);
+    throw GuideError(At(node.start_mark.line, text));
   }
   [[noreturn]] void FailKey(const yaml_node_t& node, const std::string& key, const char* right) const {
     Fail(node, "there is no key " + Quoted(key) + " here; there are " + right);
@@ -108,6 +120,15 @@ class GuideReader {
       if (!seen.emplace(key, true).second) Fail(keyNode, Quoted(key) + " stands here twice");
       visit(key, *yaml_document_get_node(&document_, pair->value));
     }
+  }
+
+  void AddSource(const yaml_node_t& node, Guide& guide) {
+    ValueSource source = ReadSource(node);
+    for (const ValueSource& known : guide.values) {
+      if (known.option != source.option || known.of != source.of) continue;
+      Fail(node, "the values of " + Quoted(source.option) + " stand here twice for the same place");
+    }
+    guide.values.push_back(std::move(source));
   }
 
   ValueSource ReadSource(const yaml_node_t& node) {
@@ -173,6 +194,8 @@ class GuideReader {
   }
 
   std::string file_;
+  /// Why the file is not YAML, or not one document; empty where it is.
+  std::string fault_;
   yaml_document_t document_{};
   bool isLoaded_ = false;
 };
@@ -221,12 +244,25 @@ void SetGuideFolder(const std::string& folder) { GuideFolder() = folder; }
 
 std::vector<std::string> GuideFiles() {
   std::vector<std::string> files;
-  glob_t found{};
-  if (!GuideFolder().empty() && glob((GuideFolder() + "/*.yaml").c_str(), 0, nullptr, &found) == 0) {
-    files.assign(found.gl_pathv, found.gl_pathv + found.gl_pathc);
+  std::error_code error;  // of a folder that is not there, too
+  for (std::filesystem::directory_iterator at(GuideFolder(), error), end; !error && at != end;
+       at.increment(error)) {
+    if (at->path().extension() == ".yaml") files.push_back(at->path());
   }
-  globfree(&found);
+  std::sort(files.begin(), files.end());
   return files;
+}
+
+std::vector<std::string> GuideFaults() {
+  std::vector<std::string> faults;
+  for (const std::string& file : GuideFiles()) {
+    try {
+      ReadGuide(file);
+    } catch (const GuideError& error) {
+      faults.emplace_back(error.what());
+    }
+  }
+  return faults;
 }
 
 std::string GuideFile(const AutoCli::NamespaceNode& root, const std::string& path) {

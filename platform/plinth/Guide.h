@@ -81,6 +81,8 @@ Guide ReadGuide(const std::string& file);
 void SetGuideFolder(const std::string& folder);
 /// All guides that are there, whether or not their plug-ins are, by name.
 std::vector<std::string> GuideFiles();
+/// What is wrong with them: the text of a GuideError each.
+std::vector<std::string> GuideFaults();
 
 /// The file of the guide to what stands at @p path under @p root; it need not exist. Empty where no file that
 /// was loaded brings it.

@@ -1,11 +1,14 @@
 #include "plinth/Manual.h"
 
+#include <fcntl.h>
 #include <unistd.h>
 
 #include <cerrno>
+#include <cstdio>
 #include <cstring>
-#include <fstream>
+#include <utility>
 
+#include "plinth/Console.h"
 #include "plinth/GlobalOptions.h"
 #include "plinth/OwnCommands.h"
 #include "plinth/Text.h"
@@ -19,15 +22,35 @@ using MetaObj::MetaString;
 
 constexpr const char* kFolder = "folder";
 
-/// Reads every guide once more: one that is wrong is passed over by help, but must not become a page. Throws
-/// GuideError.
-void CheckGuides(const AutoCli::NamespaceNode& root) {
-  std::vector<std::string> paths{""};
-  for (const AutoCli::Child& child : AutoCli::NodeData::Of(root).children) paths.push_back(child.name);
-  for (const std::string& path : paths) {
-    const std::string file = GuideFile(root, path);
-    if (!file.empty() && access(file.c_str(), F_OK) == 0) ReadGuide(file);
+/// A guide that is wrong is passed over by help, but must not become a page. Throws GuideError.
+void CheckGuides() {
+  const std::vector<std::string> faults = GuideFaults();
+  if (!faults.empty()) throw GuideError(faults.front());
+}
+
+/// Returns errno, or 0.
+int WriteFile(const std::string& path, const std::string& text) {
+  const int descriptor = open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
+  if (descriptor == -1) return errno;
+  FileSink sink(descriptor);
+  sink.Write(text);
+  const int error = sink.Flush();
+  return close(descriptor) == 0 || error != 0 ? error : errno;
+}
+
+/// Every page is written before the first takes the place of an earlier one: a full disk costs none. Returns
+/// errno, or 0.
+int WritePages(const std::vector<std::pair<std::string, std::string>>& pages) {
+  const auto temporary = [](const std::string& path) { return path + ".new"; };
+  int error = 0;
+  for (const auto& [path, text] : pages) {
+    if (error == 0) error = WriteFile(temporary(path), text);
   }
+  for (const auto& [path, text] : pages) {
+    if (error == 0 && rename(temporary(path).c_str(), path.c_str()) != 0) error = errno;
+    if (error != 0) unlink(temporary(path).c_str());
+  }
+  return error;
 }
 
 /// The root and all commands.
@@ -41,7 +64,7 @@ class Manual final : public virtual AutoCli::Command {
  public:
   explicit Manual(AutoCli::Namespace& root) : root_(root) {
     SetDescription("Write the manual pages, one a command, for man to read.");
-    SetMetaDataField("type", "fetcher");
+    SetMetaDataField("type", "operation");
   }
 
  private:
@@ -62,16 +85,16 @@ class Manual final : public virtual AutoCli::Command {
 
   void ExecuteInternal(boost::shared_ptr<CallSpec::Input> input,
                        boost::shared_ptr<CallSpec::Output> output) override {
-    CheckGuides(root_);
+    CheckGuides();
+    const std::string folder = input->GetString(kFolder);
+    std::vector<std::pair<std::string, std::string>> pages;
     for (const Place& place : Places(root_)) {
-      if (IsRehearsing()) break;
-      const std::string file = input->GetString(kFolder) + '/' + PageName(place.path) + ".1";
-      errno = 0;
-      std::ofstream stream(file, std::ios::binary);
-      stream << RoffText(ManualPage(place));
-      stream.close();
-      if (stream) continue;
-      return output->ReportError("cannot write " + Quoted(file) + ": " + std::strerror(errno));
+      pages.emplace_back(folder + '/' + PageName(place.path) + ".1", RoffText(ManualPage(place)));
+    }
+    const int error = IsRehearsing() ? 0 : WritePages(pages);
+    if (error != 0) {
+      return output->ReportError("The manual pages cannot be written to " + Quoted(folder) + ": " +
+                                 std::strerror(error) + '.');
     }
     output->SetResult(MetaBool::New(true));
     output->Close();
@@ -100,7 +123,7 @@ class Reference final : public virtual AutoCli::Command {
 
   void ExecuteInternal(boost::shared_ptr<CallSpec::Input>,
                        boost::shared_ptr<CallSpec::Output> output) override {
-    CheckGuides(root_);
+    CheckGuides();
     std::string text = "# Reference\n\nAll commands, as `hcli reference` tells them.\n";
     for (const Place& place : Places(root_)) text += MarkdownText(ManualPage(place));
     output->SetResult(MetaString::New(text));

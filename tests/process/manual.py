@@ -5,7 +5,7 @@ import re
 import subprocess
 import sys
 
-from support.program import Host, check, run, succeeded
+from support.program import Host, check, refused, run, succeeded
 
 PAGES = os.path.join(os.environ["HCLI_BUILD_DIR"], "share/man/man1")
 
@@ -30,6 +30,9 @@ names = {name.removesuffix(".1") for name in os.listdir(PAGES)}
 check(names == {"hcli", *nodes}, "pages without commands, and the other way round", names ^ {"hcli", *nodes})
 host.succeed(f"--dry-run manual --folder {host.root}")
 check("hcli.1" not in os.listdir(host.root), "a dry run wrote pages")
+os.mkdir(os.path.join(host.root, "hcli.1"))  # no file takes its place
+refused("pages", host.run(f"manual --folder {host.root}"), "cannot be written")
+check(os.listdir(host.root) == ["hcli.1"], "some of the pages", os.listdir(host.root))
 faults = []
 for name, node in sorted(nodes.items()):
     page = os.path.join(PAGES, name + ".1")
