@@ -21,6 +21,9 @@ constexpr Key kHostKeys[] = {
     Nested("softwareIscsi",
            "The software initiator. Adapters of the kind software are on the host only while it works.",
            kSoftwareKeys),
+    Text("machine",
+         "\"linux\" where the host is this machine\'s own initiator, as hcli linux adopt makes it.")
+        .Optional(),
 };
 
 constexpr Collection kHostCollections[] = {

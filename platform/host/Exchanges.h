@@ -22,6 +22,7 @@ class Exchanges final : public Network {
   ~Exchanges() override;
 
   bool DoesWait() const override { return network_->DoesWait(); }
+  bool FindsWays() const override { return network_->FindsWays(); }
   SendTargetsAnswer SendTargets(const Request& request) override;
   LoginAnswer Login(const LoginRequest& request) override;
   void Logout(const LogoutRequest& request) override;

@@ -201,6 +201,7 @@ void Initiator::ReadWaysOut() {
     const bool isUp = nic && nic->record.GetBool("linkUp");
     ways_.push_back(isUp ? WayAt(portal.name, nic->record, "") : WayOut{.name = portal.name});
   }
+  if (ways_.empty() && tree_.GetNetwork().FindsWays()) ways_.push_back({.name = "", .ipv4 = "", .ipv6 = ""});
 }
 
 Request Initiator::RequestFor(const Inheritance& levels, const WayOut& way, const Portal& portal) const {

@@ -160,6 +160,8 @@ class Network {
   /// asks runs once to plan them, and once more with the answers (Exchanges.h). The answers of a network that
   /// does not wait are a part of the operation's one transaction.
   virtual bool DoesWait() const = 0;
+  /// True where an adapter without bound NICs has a way out too.
+  virtual bool FindsWays() const { return false; }
 
   // Each ends within a time of its own; what is no answer of the other side, such as a program that is
   // missing, is an Error.

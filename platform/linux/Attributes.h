@@ -6,6 +6,8 @@
 #include <string_view>
 #include <vector>
 
+#pragma GCC visibility push(default)
+
 namespace linux {
 
 /// The text of a file of the host, without the newline at its end. Empty where there is none, where the
@@ -19,3 +21,5 @@ std::vector<std::string> Names(const std::string& folder, std::string_view prefi
 std::string LinkAt(const std::string& path);
 
 }  // namespace linux
+
+#pragma GCC visibility pop

@@ -108,7 +108,7 @@ struct Part {
 
 constexpr Part kParts[] = {
     {"rights", Rights}, {"package", Package}, {"module", Module},
-    {"socket", Socket}, {"daemon", Daemon},   {"initiator name", NameFile},
+    {"socket", Socket}, {"daemon", Daemon},   {kNamePart, NameFile},
 };
 
 }  // namespace

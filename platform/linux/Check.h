@@ -4,6 +4,8 @@
 #include <string>
 #include <vector>
 
+#pragma GCC visibility push(default)
+
 namespace linux {
 
 struct Finding {
@@ -13,7 +15,12 @@ struct Finding {
   std::string mend;   // what to do; empty where it is there
 };
 
+/// The part whose finding is the machine's initiator name.
+inline constexpr const char* kNamePart = "initiator name";
+
 /// All parts, in the order in which they are mended.
 std::vector<Finding> CheckMachine();
 
 }  // namespace linux
+
+#pragma GCC visibility pop

@@ -6,6 +6,8 @@
 namespace linux {
 
 boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewCheck();
+boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewAdopt();
+boost::shared_ptr<Plinth::AutoCli::NamespaceNode> NewRelease();
 /// The namespace with its commands.
 boost::shared_ptr<Plinth::AutoCli::Namespace> NewNamespace();
 

@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+#pragma GCC visibility push(default)
+
 namespace linux {
 
 struct InterfaceAddress {
@@ -29,3 +31,5 @@ struct NetworkInterface {
 std::vector<NetworkInterface> ReadInterfaces();
 
 }  // namespace linux
+
+#pragma GCC visibility pop

@@ -10,6 +10,7 @@
 
 #include "host/Storage.h"
 #include "linux/Joined.h"
+#include "linux/Machine.h"
 #include "linux/Program.h"
 #include "linux/Sessions.h"
 
@@ -106,6 +107,7 @@ host::LoginAnswer AnswerOf(const Session& session) {
   answer.chap = !session.user.empty();
   answer.portalGroupTag = session.portalGroup;
   answer.tsih = session.number;
+  answer.session = IdOfSession(session.number);
   host::OperationalParameters& offer = answer.offer;
   offer.initialR2T = session.initialR2T ? 1 : 0;
   offer.immediateData = session.immediateData ? 1 : 0;
@@ -156,18 +158,29 @@ std::optional<host::ChapSettings> Chosen(const host::ChapSettings& chap, const F
   return host::ChapSettings();
 }
 
-/// The record of a login. All tries together take at most the time that there is: who gives up waiting must
-/// not leave the daemon trying.
-Record NodeRecord(const host::LoginRequest& request, const host::ChapSettings& chap, const Way& way,
-                  int tag) {
+std::string InterfaceOf(const host::Request& request) { return InterfaceName(request.adapter, request.way); }
+
+/// The interface record by which the request goes out is there, and says what it has to.
+void WriteInterface(const host::Request& request) {
+  Record record = {{"iface.iscsi_ifacename", InterfaceOf(request)},
+                   {"iface.transport_name", "tcp"},
+                   {"iface.initiatorname", request.initiator}};
+  if (!request.way.empty()) record.emplace_back("iface.net_ifacename", request.way);
+  const std::string path = InterfacePath(InterfaceOf(request));
+  if (ReadRecord(path) != record) WriteRecord(path, record);
+}
+
+/// The record of a login.
+Record NodeRecord(const host::LoginRequest& request, const host::ChapSettings& chap, int tag) {
   Record record = {{"node.name", request.target},   {"node.tpgt", std::to_string(tag)},
-                   {"node.startup", kManual},       {"iface.iscsi_ifacename", way.interface},
+                   {"node.startup", kManual},       {"iface.iscsi_ifacename", InterfaceOf(request)},
                    {"iface.transport_name", "tcp"}, {"iface.initiatorname", request.initiator}};
-  if (!way.device.empty()) record.emplace_back("iface.net_ifacename", way.device);
+  if (!request.way.empty()) record.emplace_back("iface.net_ifacename", request.way);
   record.emplace_back("node.conn[0].address", request.portal.host);
   record.emplace_back("node.conn[0].port", std::to_string(request.portal.port));
   AddChap(chap, "node.session.auth.", record);
-  for (const Record& lines : {ParameterLines(ValuesOf(request.offer)), ParameterLines(way.timing)})
+  for (const Record& lines :
+       {ParameterLines(ValuesOf(request.offer)), ParameterLines(ValuesOf(request.conduct))})
     record.insert(record.end(), lines.begin(), lines.end());
   return record;
 }
@@ -202,23 +215,15 @@ std::vector<Session> SessionsBy(const std::string& interface, const std::string&
 
 }  // namespace
 
-void OpenIscsi::WriteInterface(const host::Request& request) const {
-  Record record = {{"iface.iscsi_ifacename", way_.interface},
-                   {"iface.transport_name", "tcp"},
-                   {"iface.initiatorname", request.initiator}};
-  if (!way_.device.empty()) record.emplace_back("iface.net_ifacename", way_.device);
-  const std::string path = InterfacePath(way_.interface);
-  if (ReadRecord(path) != record) WriteRecord(path, record);
-}
-
 host::SendTargetsAnswer OpenIscsi::SendTargets(const host::Request& request) {
   host::SendTargetsAnswer answer;
-  const FirstAnswer first = AskFirst(request, {}, way_.limit);
+  const FirstAnswer first = AskFirst(request, {}, limit_);
   static_cast<host::Answer&>(answer) = first.answer;
   if (answer.status != host::kDone) return answer;
   const std::optional<host::ChapSettings> chap = Chosen(request.chap, first);
   if (!chap) answer.status = host::kTargetWithoutChap;
   if (!chap) return answer;
+  const std::string interface = InterfaceOf(request);
   WriteInterface(request);
   Record record = {{"discovery.startup", kManual},
                    {"discovery.type", "sendtargets"},
@@ -232,10 +237,9 @@ host::SendTargetsAnswer OpenIscsi::SendTargets(const host::Request& request) {
   const FolderLock lock(folder);
   const std::optional<Record> before = ReadRecord(path);
   WriteRecord(path, record);
-  const Ended ended =
-      RunProgram({kIscsiadm, "-m", "discoverydb", "-t", "sendtargets", "-p", Text(request.portal), "-I",
-                  way_.interface, "--discover", "-o", "nonpersistent"},
-                 way_.limit);
+  const Ended ended = RunProgram({kIscsiadm, "-m", "discoverydb", "-t", "sendtargets", "-p",
+                                  Text(request.portal), "-I", interface, "--discover", "-o", "nonpersistent"},
+                                 limit_);
   if (before) {
     WriteRecord(path, *before);
   } else {
@@ -257,22 +261,22 @@ host::SendTargetsAnswer OpenIscsi::SendTargets(const host::Request& request) {
 
 host::LoginAnswer OpenIscsi::Login(const host::LoginRequest& request) {
   host::LoginAnswer answer;
-  const FirstAnswer first = AskFirst(request, request.target, way_.limit);
+  const FirstAnswer first = AskFirst(request, request.target, limit_);
   static_cast<host::Answer&>(answer) = first.answer;
   if (answer.status != host::kDone) return answer;
   const std::optional<host::ChapSettings> chap = Chosen(request.chap, first);
   if (!chap) answer.status = host::kTargetWithoutChap;
   if (!chap) return answer;
+  const std::string interface = InterfaceOf(request);
   WriteInterface(request);
   const int tag = first.portalGroupTag.value_or(1);
-  const std::string path =
-      NodePath(request.target, request.portal.host, request.portal.port, tag, way_.interface);
+  const std::string path = NodePath(request.target, request.portal.host, request.portal.port, tag, interface);
   const std::optional<Record> before = ReadRecord(path);
-  const Record record = NodeRecord(request, *chap, way_, tag);
-  WriteRecord(path, Hurried(record, way_.limit));
-  const Ended ended = RunProgram({kIscsiadm, "-m", "node", "-T", request.target, "-p", Text(request.portal),
-                                  "-I", way_.interface, "--login"},
-                                 way_.limit + std::chrono::seconds(1));
+  const Record record = NodeRecord(request, *chap, tag);
+  WriteRecord(path, Hurried(record, limit_));
+  const Ended ended = RunProgram(
+      {kIscsiadm, "-m", "node", "-T", request.target, "-p", Text(request.portal), "-I", interface, "--login"},
+      limit_ + std::chrono::seconds(1));
   if (ended.status != 0) {
     if (before) {
       WriteRecord(path, *before);
@@ -281,14 +285,14 @@ host::LoginAnswer OpenIscsi::Login(const host::LoginRequest& request) {
     }
     if (ended.status == kSessionExists) {
       throw host::Error(host::Error::Kind::Exists, "There is a session with " + request.target + " at " +
-                                                       Text(request.portal) + " by " + way_.interface +
+                                                       Text(request.portal) + " by " + interface +
                                                        " already.");
     }
     answer.status = StatusOf(ended, request);
     return answer;
   }
   WriteRecord(path, With(record, "node.startup", kAutomatic));
-  const std::vector<Session> sessions = SessionsBy(way_.interface, request.target, request.portal);
+  const std::vector<Session> sessions = SessionsBy(interface, request.target, request.portal);
   if (sessions.empty()) {
     throw host::Error(host::Error::Kind::Failed,
                       "open-iscsi has logged in to " + request.target + ", but the kernel shows no session.");
@@ -298,10 +302,15 @@ host::LoginAnswer OpenIscsi::Login(const host::LoginRequest& request) {
 
 void OpenIscsi::Logout(const host::LogoutRequest& request) {
   const std::vector<Session> sessions = ReadSessions();
-  const auto session = std::ranges::find(sessions, request.tsih, &Session::number);
+  const auto session = std::ranges::find(sessions, NumberOfSession(request.session), &Session::number);
   if (session == sessions.end() || session->target != request.target) return;
+  if (!IsOurs(session->interface)) {
+    throw host::Error(host::Error::Kind::NotSettable, "Others began the session with " + request.target +
+                                                          ", by their interface " + session->interface +
+                                                          ": iscsiadm ends it.");
+  }
   const Ended ended =
-      RunProgram({kIscsiadm, "-m", "session", "-r", std::to_string(session->number), "--logout"}, way_.limit);
+      RunProgram({kIscsiadm, "-m", "session", "-r", std::to_string(session->number), "--logout"}, limit_);
   if (ended.status != 0 && ended.status != kNothingFound) FailProgram("log out", ended);
   if (session->connections.empty()) return;
   const Connection& connection = session->connections.front();

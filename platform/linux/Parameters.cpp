@@ -40,4 +40,11 @@ std::vector<ParameterValue> ValuesOf(const host::OperationalParameters& offer) {
           {"DataDigest", static_cast<std::int64_t>(offer.dataDigest)}};
 }
 
+std::vector<ParameterValue> ValuesOf(const host::Conduct& conduct) {
+  return {{"InitialLoginRetryMax", conduct.loginRetries}, {"MaxCmds", conduct.maxCommands},
+          {"LoginTimeout", conduct.loginTimeout},         {"LogoutTimeout", conduct.logoutTimeout},
+          {"NoopOutInterval", conduct.noopOutInterval},   {"NoopOutTimeout", conduct.noopOutTimeout},
+          {"RecoveryTimeout", conduct.recoveryTimeout}};
+}
+
 }  // namespace linux

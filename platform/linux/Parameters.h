@@ -8,6 +8,8 @@
 #include "host/Network.h"
 #include "linux/Records.h"
 
+#pragma GCC visibility push(default)
+
 namespace linux {
 
 /// How a record writes the value of a parameter.
@@ -53,5 +55,9 @@ Record ParameterLines(std::span<const ParameterValue> values);
 
 /// The parameters that the operational stage of a login is about.
 std::vector<ParameterValue> ValuesOf(const host::OperationalParameters& offer);
+/// And those that none is about.
+std::vector<ParameterValue> ValuesOf(const host::Conduct& conduct);
 
 }  // namespace linux
+
+#pragma GCC visibility pop

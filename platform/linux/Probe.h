@@ -8,6 +8,8 @@
 
 #include "host/Network.h"
 
+#pragma GCC visibility push(default)
+
 namespace linux {
 
 using Milliseconds = std::chrono::milliseconds;
@@ -24,3 +26,5 @@ struct FirstAnswer {
 FirstAnswer AskFirst(const host::Request& request, const std::string& target, Milliseconds limit);
 
 }  // namespace linux
+
+#pragma GCC visibility pop

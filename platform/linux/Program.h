@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+#pragma GCC visibility push(default)
+
 namespace linux {
 
 struct Ended {
@@ -20,3 +22,5 @@ struct Ended {
 Ended RunProgram(std::vector<std::string> words, std::chrono::milliseconds limit);
 
 }  // namespace linux
+
+#pragma GCC visibility pop

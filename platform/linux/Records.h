@@ -11,6 +11,8 @@
 #include <utility>
 #include <vector>
 
+#pragma GCC visibility push(default)
+
 namespace linux {
 
 /// Names and values in the order of the file.
@@ -45,3 +47,5 @@ inline constexpr std::string_view kNodes = "/etc/iscsi/nodes";
 inline constexpr std::string_view kSendTargets = "/etc/iscsi/send_targets";
 
 }  // namespace linux
+
+#pragma GCC visibility pop

@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+#pragma GCC visibility push(default)
+
 namespace linux {
 
 /// A connection; numbers are 0 where the kernel tells none.
@@ -48,3 +50,5 @@ struct Session {
 std::vector<Session> ReadSessions();
 
 }  // namespace linux
+
+#pragma GCC visibility pop

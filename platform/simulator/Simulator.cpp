@@ -27,9 +27,12 @@ class Simulator final : public host::Platform {
   std::unique_ptr<host::Store> NewStore() override { return DescribedStore(std::string(DemoDescription())); }
 };
 
-Simulator simulator;
-
 }  // namespace
+
+host::Platform& GetPlatform() {
+  static Simulator simulator;
+  return simulator;
+}
 
 std::unique_ptr<host::Host> HostOf(const std::string& description) {
   return host::Host::InMemory(DescribedStore(description));

@@ -7,10 +7,14 @@
 
 #include "host/Host.h"
 #include "host/Pending.h"
+#include "host/Platform.h"
 
 #pragma GCC visibility push(default)
 
 namespace simulator {
+
+/// The platform of all simulated hosts, made when it is first asked for.
+host::Platform& GetPlatform();
 
 /// A host in memory. @p description is a host description, as all of them here.
 std::unique_ptr<host::Host> HostOf(const std::string& description);

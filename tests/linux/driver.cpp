@@ -2,10 +2,10 @@
 /// which, and its answer is one on standard output.
 
 #include <iostream>
-#include <list>
 #include <nlohmann/json.hpp>
 
 #include "host/Storage.h"
+#include "linux/Machine.h"
 #include "linux/OpenIscsi.h"
 
 namespace {
@@ -20,6 +20,9 @@ host::ChapEntry Chap(const json& given, const char* direction) {
 template <class Request>
 Request Common(const json& given) {
   Request request;
+  request.adapter = "hba0";
+  request.way = given.value("way", "");
+  request.conduct = {3, 64, 9, 8, 7, 6, 45};
   request.initiator = "iqn.2026-11.org.example:hba0";
   request.from = given.value("from", "");
   request.portal = {given["host"], given["port"]};
@@ -55,16 +58,10 @@ json Login(linux::OpenIscsi& network, const json& given) {
 }
 
 json Run(const json& given) {
-  std::list<std::string> names;  // whose texts the values below refer to
-  linux::Way way{
-      "hcli.hba0", given.value("device", ""), {}, linux::Milliseconds(given.value("limit", 20000))};
-  const json timing = given.value("timing", json::object());
-  for (const auto& [parameter, value] : timing.items())
-    way.timing.push_back({names.emplace_back(parameter), value});
-  linux::OpenIscsi network(way);
+  linux::OpenIscsi network(linux::Milliseconds(given.value("limit", 20000)));
   if (given["operation"] == "login") return Login(network, given);
   if (given["operation"] == "logout")
-    network.Logout({"iqn.2026-11.org.example:hba0", given["target"], "", given["session"]});
+    network.Logout({{}, given["target"], {}, 0, linux::IdOfSession(given["session"])});
   return given["operation"] == "logout" ? json::object() : SendTargets(network, given);
 }
 
