@@ -3,6 +3,7 @@
 import fcntl
 import os
 import random
+import shutil
 import statistics
 import sys
 import time
@@ -16,6 +17,15 @@ def program(path):
     if not os.access(path, os.X_OK):
         sys.exit(f"{path}: no such program; cmake --preset bench && ninja -C build/bench makes one")
     return os.path.abspath(path)
+
+
+def installed(path, folder):
+    """The program as installing it would leave it, beside its libraries. What the linker has just written lies in the
+    page cache in small pieces, which costs each start; the peers are installed, too."""
+    tree = os.path.join(folder, "installed")
+    for part in "bin", "lib":
+        shutil.copytree(os.path.join(os.path.dirname(path), "..", part), os.path.join(tree, part), symlinks=True)
+    return os.path.join(tree, "bin", os.path.basename(path))
 
 
 def spawn(words, output, root=None):

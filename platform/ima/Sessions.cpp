@@ -15,12 +15,13 @@ using host::Tree;
 namespace {
 
 void SetIsid(IMA_INITIATOR_SESSION_ID& isid, const std::string& text) {
-  if (text.size() != 2 * sizeof isid) {
-    throw host::Error(host::Error::Kind::Damaged, "the ISID of a session is not twelve digits");
-  }
-  for (std::size_t i = 0; i < sizeof isid; ++i) {
+  bool isRight = text.size() == 2 * sizeof isid;
+  for (std::size_t i = 0; isRight && i < sizeof isid; ++i) {
     const char* const digits = text.data() + 2 * i;
-    std::from_chars(digits, digits + 2, isid[i], 16);
+    isRight = std::from_chars(digits, digits + 2, isid[i], 16).ptr == digits + 2;
+  }
+  if (!isRight) {
+    throw host::Error(host::Error::Kind::Damaged, "the ISID of a session is not twelve hexadecimal digits");
   }
 }
 

@@ -100,6 +100,15 @@ std::size_t Structure::Put(const std::string& name, const Cell& cell) {
 }
 
 void Structure::PutText(const std::string& name, std::string_view value) {
+  if (const std::size_t index = shape_->Next(name) == nullptr ? shape_->Find(name) : Shape::kNone;
+      index != Shape::kNone && cells_[index].type == MetaType::String &&
+      value.size() <= cells_[index].length) {
+    Cell& cell = cells_[index];
+    text_.replace(static_cast<std::size_t>(cell.number), value.size(), value);
+    cell.length = value.size();
+    if (index < objects_.size()) objects_[index] = nullptr;
+    return;
+  }
   constexpr std::size_t kLonger = 16;  // than that of the row before it
   if (text_.empty()) text_.reserve(shape_->type_->bytes + kLonger);
   const std::size_t begin = text_.size();

@@ -8,8 +8,10 @@ using Plinth::MetaObj::MetaList;
 using Plinth::MetaObj::MetaString;
 using Plinth::MetaObj::MetaStruct;
 
-Names::Names(const Structure& structure) : type(structure.name) {
-  for (const Field& field : structure.fields) fields.emplace_back(field.name);
+std::vector<std::string> NamesOf(std::span<const Field> fields) {
+  std::vector<std::string> names;
+  for (const Field& field : fields) names.emplace_back(field.name);
+  return names;
 }
 
 StructPtr NewPrototype(const Structure& structure) {

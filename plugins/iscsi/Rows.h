@@ -80,30 +80,24 @@ inline constexpr auto kFieldsOf = [] {
   return fields;
 }();
 
-/// The names of a structure and its fields, as rows take them: made once for all of them.
-struct Names {
-  explicit Names(const Structure& structure);
-
-  std::string type;
-  std::vector<std::string> fields;
-};
+/// The names of @p fields as rows take them, made once for all rows.
+std::vector<std::string> NamesOf(std::span<const Field> fields);
 
 /// A structure, and the columns that make rows of it from a Source.
 template <class Source>
 struct RowStructure : Structure {
   std::span<const Column<Source>> columns;
-  const Names& (*names)(const Structure& structure);
+  const std::vector<std::string>& (*names)();
 };
 
 /// The structure @p name with a field for each of the @p columns.
 template <const auto& columns>
 constexpr auto StructureOf(const char* name) {
   using Source = typename std::remove_cvref_t<decltype(columns[0])>::RowSource;
-  return RowStructure<Source>{
-      {name, kFieldsOf<columns>}, columns, [](const Structure& structure) -> const Names& {
-        static const Names names(structure);
-        return names;
-      }};
+  return RowStructure<Source>{{name, kFieldsOf<columns>}, columns, []() -> const std::vector<std::string>& {
+                                static const std::vector<std::string> names = NamesOf(kFieldsOf<columns>);
+                                return names;
+                              }};
 }
 
 /// A fresh structure with a field of each type and no values.
@@ -114,11 +108,9 @@ ListPtr NewList(const StructPtr& element);
 /// A row with all its fields set from @p source, in the order of the columns.
 template <class Source>
 StructPtr NewRow(const RowStructure<Source>& structure, const std::type_identity_t<Source>& source) {
-  const Names& names = structure.names(structure);
-  StructPtr row = Plinth::MetaObj::MetaStruct::New(names.type);
-  for (std::size_t i = 0; i < names.fields.size(); ++i) {
-    structure.columns[i].set(*row, names.fields[i], source);
-  }
+  const std::vector<std::string>& names = structure.names();
+  StructPtr row = Plinth::MetaObj::MetaStruct::New(structure.name);
+  for (std::size_t i = 0; i < names.size(); ++i) structure.columns[i].set(*row, names[i], source);
   return row;
 }
 

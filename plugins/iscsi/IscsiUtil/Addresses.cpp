@@ -69,7 +69,11 @@ std::string IscsiTools::GetStringFromTargetAddress(const TargetAddress& address)
   static std::ostringstream stream;
   stream.clear();
   stream.str({});
-  if (!(stream << address.host)) throw std::bad_alloc();  // there is no other reason
+  stream.flags(std::ios::dec | std::ios::skipws);  // another library's operator may leave others
+  stream.fill(' ');
+  stream.width(0);
+  stream << address.host;
+  if (stream.bad()) throw std::bad_alloc();
   const bool bracketed = address.host.GetFamily() == AddressFamily::Ipv6;
   std::string text(bracketed ? "[" : "");
   text.append(stream.view()).append(bracketed ? "]:" : ":").append(std::to_string(address.port));
