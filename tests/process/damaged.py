@@ -5,7 +5,7 @@ import resource
 import signal
 import subprocess
 
-from support.damages import DAMAGES
+from support.damages import DAMAGES, sql
 from support.program import (DAMAGED, DENIED, HCLI, NO_SPACE, NOT_SUPPORTED, READ, SET_NAME, WRITE, Host, check,
                              contents, refused, run, succeeded, write)
 
@@ -22,6 +22,14 @@ def damaged():
             status = NOT_SUPPORTED if case == "a newer version" else DAMAGED
             refused(f"{case}, {line}", host.run("--exit-codes " + line), host.database, text, status=status)
             check(contents(host.root) == before, f"{case}: {line} has changed the files")
+
+
+def isid():
+    host = Host()
+    host.show()
+    sql(host.database, "UPDATE object SET record = CAST(replace(CAST(record AS TEXT), '80107e02', '80107ezz') AS BLOB)")
+    shown = host.run("iscsi session list")
+    check("is not twelve hexadecimal digits" in shown.stderr and shown.returncode == 1, "a damaged ISID", shown)
 
 
 # Runs in a mount namespace of its own: what is mounted there is seen by nobody else, and goes with it. The file's
@@ -130,6 +138,7 @@ def without_proc(way):
 
 
 damaged()
+isid()
 limited()
 full_output()
 way = next(filter(can_mount, ["unshare --mount", "unshare --map-root-user --mount"]), None)
