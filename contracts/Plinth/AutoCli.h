@@ -84,7 +84,8 @@ class Command : public virtual NamespaceNode {
   /// have no effect.
   void SetDefaultOutputParameter(const std::string& key, const std::string& value);
   /// A mark for tools, such as "type" = "fetcher" for a command that reads or "operation" for one that
-  /// changes the host. A later call for @p key replaces an earlier one.
+  /// changes the host. "dry-run" = "heeded" is for a command that asks IsRehearsing() and changes nothing by
+  /// library calls. A later call for @p key replaces an earlier one.
   void SetMetaDataField(const std::string& key, const std::string& value);
 
   // What the operations of the same names do: made anew on each call, and never null. Both objects of a run

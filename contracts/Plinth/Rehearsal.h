@@ -33,6 +33,10 @@ class Rehearsal {
 /// platform has one, dry runs are refused.
 void AddRehearsal(Rehearsal& rehearsal);
 
+/// A dry run is under way: a command that does something by itself, rather than by library calls, leaves it
+/// out then.
+bool IsRehearsing();
+
 }  // namespace Plinth
 
 #pragma GCC visibility pop

@@ -143,14 +143,7 @@ Store& Host::GetStore() {
   if (path_.empty()) path_ = DatabasePath();
   struct stat status;
   if (!IsRegularFile("The host database", path_, status)) {
-    for (const std::string& journal : JournalsOf(path_)) {
-      // A new host would take the changes in it for its own. What another process has just made is no matter.
-      if (lstat(journal.c_str(), &status) != 0 || lstat(path_.c_str(), &status) == 0) continue;
-      throw Error(Error::Kind::DamagedFile,
-                  "The host database " + path_ + " is gone, and its journal " + journal +
-                      " is still there: put the database back, or remove the journal"
-                      " for a new host.");
-    }
+    RequireNoJournalAlone(path_);
     if (Rehearsal::Current() != nullptr) {
       isStoreRehearsed_ = true;
       store_ = Platform::Current().NewStore();

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <memory>
+#include <string>
 
 #include "host/Machine.h"
 #include "host/Network.h"
@@ -29,6 +30,8 @@ class Platform {
   virtual std::unique_ptr<Machine> MachineOf(Tree&) { return nullptr; }
   /// The host that is there before anybody has made one: a store in memory.
   virtual std::unique_ptr<Store> NewStore() = 0;
+  /// The command line that shows what waits for a reset or a reboot; empty where there is none.
+  virtual std::string WaitingCommand() const { return ""; }
 
  private:
   Platform* before_;

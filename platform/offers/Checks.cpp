@@ -8,6 +8,7 @@
 #include "host/Host.h"
 #include "host/InitiatorNameFile.h"
 #include "host/Pending.h"
+#include "host/Platform.h"
 #include "host/Storage.h"
 #include "offers/HostFiles.h"
 #include "store/Tables.h"
@@ -38,7 +39,8 @@ Findings WaitingFindings(const std::vector<host::WaitingChange>& changes) {
   std::map<std::string, std::size_t> counts;
   for (const host::WaitingChange& change : changes) {
     if (counts[change.adapter]++ == 0) {
-      findings.push_back({change.adapter, FindingState::Warning, "", "hcli simulator pending"});
+      findings.push_back(
+          {change.adapter, FindingState::Warning, "", host::Platform::Current().WaitingCommand()});
     }
   }
   for (Finding& finding : findings) {
@@ -96,7 +98,7 @@ std::optional<std::string> CheckContents(const std::string& path, Findings& find
 void CheckNameFile(const std::optional<std::string>& softwareName, Findings& findings) try {
   const std::string path = host::InitiatorNameFile();
   const std::optional<std::string> name = host::ConfiguredInitiatorName();
-  const std::string set = "hcli iscsi software set --enabled true --name NAME";
+  const std::string set = "Set the initiator's name anew, or mend the file.";
   if (!name) {
     findings.push_back(
         {kNameFile, FindingState::Ok, path + " has no name; the initiator keeps its own.", ""});
@@ -108,7 +110,7 @@ void CheckNameFile(const std::optional<std::string>& softwareName, Findings& fin
     findings.push_back({kNameFile, FindingState::Warning,
                         path + " has " + host::Quoted(*name) + ", and the software initiator is " +
                             host::Quoted(*softwareName) + ".",
-                        "hcli iscsi software set --enabled true --name " + *name});
+                        set});
   } else {
     findings.push_back({kNameFile, FindingState::Ok, path + " has " + host::Quoted(*name) + ".", ""});
   }

@@ -29,15 +29,6 @@ bool May(const std::string& path, int what) {
   return faccessat(AT_FDCWD, path.c_str(), what, AT_EACCESS) == 0;
 }
 
-/// The folder that @p path is in, or would be made in.
-std::string NearestFolder(std::string path) {
-  do {
-    path.erase(path.find_last_of('/') + 1);
-    while (path.size() > 1 && path.back() == '/') path.pop_back();
-  } while (!path.empty() && !May(path, F_OK) && errno == ENOENT);
-  return path.empty() ? "." : path;
-}
-
 std::string UserName(uid_t user) {
   passwd entry{};
   passwd* found = nullptr;
@@ -133,7 +124,7 @@ bool CheckJournal(const std::string& path, pid_t writer, Findings& findings) {
   if (writer != 0 || stat((path + "-journal").c_str(), &status) != 0 || status.st_size == 0) return true;
   findings.push_back({kJournal, FindingState::Warning,
                       "A change was cut off, and is still to be undone: " + path + "-journal is there.",
-                      "hcli iscsi adapter list"});
+                      "Run any command on the host: the first one undoes it."});
   return false;
 }
 
@@ -141,13 +132,7 @@ bool CheckJournal(const std::string& path, pid_t writer, Findings& findings) {
 bool IsThere(const std::string& path, Findings& findings) {
   struct stat status;
   if (host::IsRegularFile("The host database", path, status)) return true;
-  for (const std::string& journal : host::JournalsOf(path)) {
-    if (lstat(journal.c_str(), &status) != 0) continue;
-    findings.push_back({kDatabase, FindingState::Fault,
-                        path + " is gone, and its journal " + journal + " is still there.",
-                        "Put the database back; or, for a new host: rm " + journal});
-    return false;
-  }
+  host::RequireNoJournalAlone(path);
   findings.push_back(
       {kDatabase, FindingState::Ok, path + " is not there yet: the first command makes the host.", ""});
   return false;
@@ -156,7 +141,7 @@ bool IsThere(const std::string& path, Findings& findings) {
 }  // namespace
 
 void CheckFolder(const std::string& path, Findings& findings) {
-  const std::string folder = NearestFolder(path);
+  const std::string folder = host::NearestFolder(path);
   if (May(folder, W_OK | X_OK)) {
     findings.push_back({kFolder, FindingState::Ok, folder + " can be written to.", ""});
   } else {
@@ -192,10 +177,7 @@ bool CheckFile(const std::string& path, Findings& findings) try {
   }
   return CheckJournal(path, writer, findings);
 } catch (const host::Error& error) {
-  findings.push_back({kDatabase, FindingState::Fault, error.what(),
-                      error.GetKind() == host::Error::Kind::Denied
-                          ? "Put the database itself there: ls -l " + path
-                          : "ls -l " + path});
+  findings.push_back({kDatabase, FindingState::Fault, error.what(), "ls -l " + host::NearestFolder(path)});
   return false;
 }
 

@@ -66,11 +66,20 @@ bool IsRehearsing() { return Rehearsing::IsOn(); }
 
 bool CanRehearse() { return !Rehearsals().empty(); }
 
-void CheckDryRun(Run&, const Given& given) {
+namespace {
+
+bool LooksOutItself(const Run& run) {
+  const std::string* const what = FindValue(AutoCli::NodeData::Of(*run.request.node).metaData, "dry-run");
+  return what && *what == "heeded";
+}
+
+}  // namespace
+
+void CheckDryRun(Run& run, const Given& given) {
   if (!given.truth && Rehearsing::IsOn()) {
     throw UsageError("option --dry-run: the whole batch is a dry run, and a line of it cannot be for real");
   }
-  if (given.truth && !CanRehearse()) {
+  if (given.truth && !CanRehearse() && !LooksOutItself(run)) {
     throw UsageError(
         "option --dry-run: no plug-in that is loaded can undo what commands do; nothing was run");
   }

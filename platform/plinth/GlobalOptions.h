@@ -46,10 +46,8 @@ void CheckTyped(Run& run, const Given& given);
 /// --trace: shows the calls of the host's libraries for as long as the command runs.
 void Trace(Run& run, const Given& given, const Rest& rest);
 /// --dry-run: undoes what the command has done, and keeps what that was. Where no platform can undo, it is
-/// refused.
+/// refused, but for commands that look out for it themselves.
 bool CanRehearse();
-/// A dry run is under way: a command of the framework's own has to leave no trace then.
-bool IsRehearsing();
 void CheckDryRun(Run& run, const Given& given);
 void DryRun(Run& run, const Given& given, const Rest& rest);
 /// --timeout: how long library calls wait for other processes.

@@ -1,5 +1,6 @@
 #include "plinth/Manual.h"
 
+#include <Plinth/Rehearsal.h>
 #include <fcntl.h>
 #include <unistd.h>
 

@@ -25,6 +25,7 @@ class Simulator final : public host::Platform {
  public:
   std::unique_ptr<host::Network> NetworkOf(host::Tree& tree) override { return MakeNetwork(tree); }
   std::unique_ptr<host::Store> NewStore() override { return DescribedStore(std::string(DemoDescription())); }
+  std::string WaitingCommand() const override { return "hcli simulator pending"; }
 };
 
 }  // namespace

@@ -68,6 +68,14 @@ void FailFile(const std::string& path, const char* what, int error) {
               "The file " + path + " cannot be " + what + ": " + strerror(error) + ".");
 }
 
+std::string NearestFolder(std::string path) {
+  do {
+    path.erase(path.find_last_of('/') + 1);
+    while (path.size() > 1 && path.back() == '/') path.pop_back();
+  } while (!path.empty() && faccessat(AT_FDCWD, path.c_str(), F_OK, AT_EACCESS) != 0 && errno == ENOENT);
+  return path.empty() ? "." : path;
+}
+
 void MakeFoldersFor(const std::string& path) {
   const std::string folder = Folder(path);
   struct stat status;

@@ -30,6 +30,9 @@ int Patience();
 /// Host::SetPatience does this for what the host has open too. Returns what held before.
 int SetPatience(int milliseconds);
 
+/// The folder that @p path lies in, or the nearest one above that exists.
+std::string NearestFolder(std::string path);
+
 /// Makes the folder that @p path lies in, and those above it.
 void MakeFoldersFor(const std::string& path);
 

@@ -152,6 +152,18 @@ std::vector<std::string> JournalsOf(const std::string& path) {
   return {path + "-journal", path + "-wal", path + "-shm"};
 }
 
+void RequireNoJournalAlone(const std::string& path) {
+  struct stat status;
+  for (const std::string& journal : JournalsOf(path)) {
+    // What another process has just made is no matter.
+    if (lstat(journal.c_str(), &status) != 0 || lstat(path.c_str(), &status) == 0) continue;
+    throw Error(Error::Kind::DamagedFile, "The host database " + path + " is gone, and its journal " +
+                                              journal +
+                                              " is still there: put the database back, or remove the journal"
+                                              " for a new host.");
+  }
+}
+
 Store::Store() : path_("in memory"), checked_(true) {
   if (Open(":memory:", SQLITE_OPEN_READWRITE, &database_) != SQLITE_OK) {
     sqlite3_close(database_);

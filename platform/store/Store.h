@@ -19,6 +19,9 @@ namespace store {
 
 /// The files beside the database @p path that may hold a part of it.
 std::vector<std::string> JournalsOf(const std::string& path);
+/// An Error where one of them is there, and the database is not: a new one would take the changes in it for
+/// its own.
+void RequireNoJournalAlone(const std::string& path);
 
 class Store {
  public:

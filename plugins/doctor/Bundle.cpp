@@ -9,27 +9,10 @@
 #include <cerrno>
 #include <cstring>
 #include <string_view>
-#include <utility>
 
 namespace TessaroCli::Doctor {
 
 namespace {
-
-class BundleRehearsal final : public Plinth::Rehearsal {
- public:
-  BundleRehearsal() { Plinth::AddRehearsal(*this); }
-  void Begin() override { isOn = true; }
-  std::vector<std::string> TakeCalls() override { return std::exchange(calls, {}); }
-  void End() noexcept override {
-    isOn = false;
-    calls.clear();
-  }
-
-  bool isOn = false;
-  std::vector<std::string> calls;
-};
-
-BundleRehearsal rehearsal;
 
 std::string Failure(const std::string& path, int error) {
   return "The file " + path + " cannot be written: " + std::strerror(error) + '.';
@@ -93,10 +76,7 @@ std::string BundleText(const std::vector<Plinth::Finding>& findings,
 std::string WriteBundle(const std::string& path, const std::string& text) {
   if (path.empty()) return "The name of the report's file is empty.";
   if (IsThere(path)) return "The file " + path + " is there already, and stays as it is: give another name.";
-  if (rehearsal.isOn) {
-    rehearsal.calls.push_back("WriteReport(\"" + path + "\")");
-    return "";
-  }
+  if (Plinth::IsRehearsing()) return "";
   const std::size_t name = path.rfind('/') + 1;
   std::string temporary = path.substr(0, name) + '.' + path.substr(name) + ".XXXXXX";
   const int file = mkostemp(temporary.data(), O_CLOEXEC);  // of mode 0600

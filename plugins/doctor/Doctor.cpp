@@ -1,6 +1,7 @@
 #include "doctor/Doctor.h"
 
 #include <Plinth/MetaObj.h>
+#include <Plinth/Rehearsal.h>
 
 #include <algorithm>
 #include <string_view>
@@ -78,7 +79,8 @@ class DoctorCommand final : public Plinth::AutoCli::Command {
  public:
   DoctorCommand() {
     SetDescription("Look at all that hcli needs: what is wrong, and what mends it.");
-    SetMetaDataField("type", "fetcher");
+    SetMetaDataField("type", "operation");  // it can write a file
+    SetMetaDataField("dry-run", "heeded");
     SetDefaultOutputFormatter("simple");
     SetDefaultOutputParameter("header:Finding", "%State%: %Check%: %Seen%");
     SetDefaultOutputParameter("fields:Finding", "State,Check,Seen,Mend");
@@ -137,7 +139,7 @@ class DoctorCommand final : public Plinth::AutoCli::Command {
     enclosures.push_back({"variables", variables});
     const std::string failure = WriteBundle(path, BundleText(findings, enclosures));
     if (!failure.empty()) return output.ReportError(failure);
-    std::string seen = path + " has the findings";
+    std::string seen = path + (Plinth::IsRehearsing() ? " would have" : " has") + " the findings";
     for (const Plinth::Enclosure& enclosure : enclosures) seen += ", " + enclosure.name;
     findings.push_back({"report", FindingState::Ok, seen + "; no secrets.", ""});
   }
