@@ -14,6 +14,9 @@ DONE, NO_ANSWER, MOVED = 0, 0x10000, 0x50101
 TIMING = {"node.session.initial_login_retry_max": 3, "node.session.cmds_max": 64, "node.conn[0].timeo.login_timeout": 9,
           "node.conn[0].timeo.logout_timeout": 8, "node.conn[0].timeo.noop_out_interval": 7,
           "node.conn[0].timeo.noop_out_timeout": 6, "node.session.timeo.replacement_timeout": 45}
+NOT_AUTHENTICATED, NOT_ALLOWED, NOT_FOUND, UNAVAILABLE = 0x50201, 0x50202, 0x50203, 0x50301
+TARGET_UNPROVEN, TARGET_WITHOUT_CHAP, NO_COMMON_DIGEST = 0x60201, 0x60202, 0x60203
+DEMANDS = PROHIBITED, DISCOURAGED, PREFERRED, REQUIRED = range(4)
 
 
 def driver(machine, operation, port=3260, **given):
