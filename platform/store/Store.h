@@ -89,6 +89,7 @@ class Store {
   [[noreturn]] void Fail(int code);
   void Close();
   void RequireOk(const char* pragma);
+  void ForgetReading();
   /// True where the one transaction of a rehearsal or a group is open, around those of the calls. One failure
   /// or another may have ended it.
   bool IsWithin() const;
