@@ -19,6 +19,17 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using Texts = std::vector<std::string>;
 
+/// What another process does, which must not find the file locked.
+template <class Change>
+void Elsewhere(Change change) {
+  host::Store store(host::Host::DatabasePath());
+  store.SetPatience(0);
+  host::Transaction transaction(store, host::Transaction::Access::Change);
+  host::Tree tree(store);
+  change(tree, *tree.Find(host::kRoot, Kind::Adapter, "a"));
+  transaction.Commit();
+}
+
 /// While it lives, exchanges take time, and @p meanwhile happens in each of them.
 class SlowPlatform final : public host::Platform {
  public:
@@ -30,7 +41,7 @@ class SlowPlatform final : public host::Platform {
 
   void Exchange(const std::string& line) {
     exchanges.push_back(line);
-    EXPECT_FALSE(host::Host::Current().GetStore().IsInTransaction());
+    Elsewhere([](host::Tree&, const host::Object&) {});
     meanwhile();
   }
 
@@ -83,16 +94,6 @@ class Exchanges : public testing::Test {
     slow_.emplace();
   }
 
-  /// What another process does, which must not find the file locked.
-  template <class Change>
-  void Elsewhere(Change change) const {
-    host::Store store(root_.Path() + "/var/lib/tessaro/host.db");
-    store.SetPatience(0);
-    host::Transaction transaction(store, host::Transaction::Access::Change);
-    host::Tree tree(store);
-    change(tree, *tree.Find(host::kRoot, Kind::Adapter, "a"));
-    transaction.Commit();
-  }
   void RemoveTarget() const {
     Elsewhere([](host::Tree& tree, const host::Object& adapter) {
       for (const Kind kind : {Kind::StaticTarget, Kind::Target}) {
@@ -206,7 +207,6 @@ TEST_F(Exchanges, WhatHappensMeanwhileCounts) {
 }
 
 TEST_F(Exchanges, DiscoveryAsksAndThenLogsIn) {
-  slow_->meanwhile = [&] { Elsewhere([](host::Tree&, const host::Object&) {}); };
   host_("iscsi adapter discovery rediscover -A a");
   EXPECT_THAT(slow_->exchanges, ElementsAre("ask 192.0.2.9", "login t 1 65536", "login found 1 65536"));
   EXPECT_THAT(Sessions(), ElementsAre("t", "found"));
@@ -218,6 +218,18 @@ TEST_F(Exchanges, DiscoveryAsksAndThenLogsIn) {
   EXPECT_EQ(host_("iscsi session remove -A a").result, true);
   EXPECT_THAT(slow_->exchanges, ElementsAre("logout t 1", "logout found 1"));
   EXPECT_THAT(Sessions(), IsEmpty());
+}
+
+TEST_F(Exchanges, ADiscoveryThatIsDisturbedEachTimeEnds) {
+  int number = 0;
+  slow_->meanwhile = [&] {
+    Elsewhere([&](host::Tree& tree, host::Object adapter) {
+      adapter.record.Set("initiatorName", "iqn.2026-11.org.example:" + std::to_string(++number));
+      tree.Update(adapter);
+    });
+  };
+  EXPECT_EQ(host_("iscsi adapter discovery rediscover -A a").reasons.at(0).code, "busy");
+  EXPECT_THAT(slow_->exchanges, testing::Each("ask 192.0.2.9"));
 }
 
 TEST_F(Exchanges, ARefusalIsKept) {

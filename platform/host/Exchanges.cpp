@@ -71,7 +71,9 @@ bool Exchanges::EndUnused() noexcept {
   for (const auto& login : logins_) {
     if (isUnused(login)) End(login);
   }
-  return std::erase_if(logins_, isUnused) != 0;
+  const std::size_t count = std::erase_if(logins_, isUnused) + std::erase_if(discoveries_, isUnused) +
+                            std::erase_if(logouts_, isUnused);
+  return count != 0;
 }
 
 void Exchanges::Perform() {

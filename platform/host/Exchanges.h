@@ -47,6 +47,8 @@ class Exchanges final : public Network {
   template <class Question, class Reply>
   Reply ReplyTo(std::vector<Asked<Question, Reply>>& all, const Question& question);
   void End(const Asked<LoginRequest, LoginAnswer>& login) noexcept;
+  /// Forgets the answers that the work as it ran last had no use for, and ends the sessions among them. False
+  /// where there were none.
   bool EndUnused() noexcept;
 
   std::unique_ptr<Network> network_;

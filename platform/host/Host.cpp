@@ -177,9 +177,9 @@ void Host::Administer(const char* call, Transaction::Access access, const std::f
                       void (Store::*check)()) try {
   (GetStore().*check)();
   {
-    Work running(*this, access);
-    do work(running.GetTree());
-    while (!running.Commit());
+    Step step(*this, access);
+    do work(step.GetTree());
+    while (!step.Commit());
   }
   Rehearsal* const rehearsal = Rehearsal::Current();
   if (rehearsal != nullptr && access == Transaction::Access::Change) rehearsal->calls.emplace_back(call);
@@ -187,17 +187,17 @@ void Host::Administer(const char* call, Transaction::Access access, const std::f
   throw Located(error);
 }
 
-Host::Work::Work(Host& host, Transaction::Access access)
+Host::Step::Step(Host& host, Transaction::Access access)
     : host_(host), access_(access), transaction_(std::in_place, host.GetStore(), access), tree_(*host.tree_) {
   tree_.BeginOperation();
 }
 
-Host::Work::~Work() {
+Host::Step::~Step() {
   transaction_.reset();
   tree_.BeginOperation();  // which ends the sessions of one that has failed
 }
 
-bool Host::Work::Commit() {
+bool Host::Step::Commit() {
   Exchanges* const exchanges = tree_.GetExchanges();
   if (exchanges != nullptr && exchanges->ArePlanned()) {
     transaction_.reset();

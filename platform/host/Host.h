@@ -66,9 +66,9 @@ class Host {
   auto Outside(const Call& call, Body&& body) {
     return Traced(call, [&] {
       {
-        Work work(*this, Transaction::Access::Read);
-        HearAnswers(call, work.GetTree());
-        work.Commit();
+        Step step(*this, Transaction::Access::Read);
+        HearAnswers(call, step.GetTree());
+        step.Commit();
       }
       return body();
     });
@@ -90,12 +90,12 @@ class Host {
 
   /// The transactions of one operation. While it asks something of a network that makes it wait, none is
   /// open.
-  class Work {
+  class Step {
    public:
-    Work(Host& host, Transaction::Access access);
-    Work(const Work&) = delete;
-    Work& operator=(const Work&) = delete;
-    ~Work();
+    Step(Host& host, Transaction::Access access);
+    Step(const Step&) = delete;
+    Step& operator=(const Step&) = delete;
+    ~Step();
     Tree& GetTree() { return tree_; }
     /// Keeps what was done. False where that was a plan only, and is to be done anew: see Exchanges.
     bool Commit();
@@ -113,12 +113,12 @@ class Host {
     using Result = std::invoke_result_t<Body&, Tree&>;
     constexpr bool mayFailAfterAll = std::is_same_v<Result, std::optional<Error>>;
     return Traced(call, [&]() -> std::conditional_t<mayFailAfterAll, void, Result> {
-      Work work(*this, access);
-      Tree& tree = work.GetTree();
+      Step step(*this, access);
+      Tree& tree = step.GetTree();
       HearAnswers(call, tree);
       if constexpr (std::is_void_v<Result>) {
         do body(tree);
-        while (!work.Commit());
+        while (!step.Commit());
       } else {
         const std::optional<Status> answer = tree.Answer();
         if constexpr (std::is_same_v<Result, Status>) {
@@ -126,7 +126,7 @@ class Host {
         }
         for (;;) {
           Result result = body(tree);
-          if (!work.Commit()) continue;
+          if (!step.Commit()) continue;
           if constexpr (mayFailAfterAll) {
             if (result) throw Error(*result);
             return;

@@ -39,6 +39,7 @@ constexpr StatusText kTexts[] = {
     {kTargetUnproven, "The target did not prove who it is by mutual CHAP."},
     {kTargetWithoutChap, "CHAP is required here, and the target does none."},
     {kNoCommonDigest, "There is no digest that both sides take."},
+    {kSessionExists, "There is such a session already."},
 };
 
 }  // namespace

@@ -47,6 +47,8 @@ inline constexpr std::uint32_t kNoWayOut = 0x00020000u;
 inline constexpr std::uint32_t kTargetUnproven = 0x00060201u;
 inline constexpr std::uint32_t kTargetWithoutChap = 0x00060202u;
 inline constexpr std::uint32_t kNoCommonDigest = 0x00060203u;
+/// The initiator has such a session already, as somebody else was faster.
+inline constexpr std::uint32_t kSessionExists = 0x00060204u;
 
 struct ChapEntry {
   Demand demand = Demand::Prohibited;
@@ -163,8 +165,8 @@ class Network {
   /// True where an adapter without bound NICs has a way out too.
   virtual bool FindsWays() const { return false; }
 
-  // Each ends within a time of its own; what is no answer of the other side, such as a program that is
-  // missing, is an Error.
+  // Each ends within a time of its own; what comes of one login alone is told by its status, and what is no
+  // answer of the other side, such as a program that is missing, is an Error.
 
   /// A discovery session with one portal.
   virtual SendTargetsAnswer SendTargets(const Request& request) = 0;

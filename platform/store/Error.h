@@ -33,8 +33,8 @@ class Error : public std::runtime_error {
     DamagedFile,   ///< the same, with the file's name in the text; or a file that is none of its kind
     NoSpace,       ///< a disk, or a limit of one, is full
     NoMemory,      ///< as std::bad_alloc is told of
-    LoginRefused,  ///< a target, or the adapter, ended a login
-    NoAnswer,      ///< nobody answered, or no way leads there
+    LoginRefused,  ///< the other side of an exchange refused
+    NoAnswer,      ///< nobody answered
   };
 
   Error(Kind kind, const std::string& text) : std::runtime_error(text), kind_(kind) {}
