@@ -283,12 +283,7 @@ host::LoginAnswer OpenIscsi::Login(const host::LoginRequest& request) {
     } else {
       RemoveRecord(path, kNodes);
     }
-    if (ended.status == kSessionExists) {
-      throw host::Error(host::Error::Kind::Exists, "There is a session with " + request.target + " at " +
-                                                       Text(request.portal) + " by " + interface +
-                                                       " already.");
-    }
-    answer.status = StatusOf(ended, request);
+    answer.status = ended.status == kSessionExists ? host::kSessionExists : StatusOf(ended, request);
     return answer;
   }
   WriteRecord(path, With(record, "node.startup", kAutomatic));

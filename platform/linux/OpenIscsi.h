@@ -25,7 +25,7 @@ class OpenIscsi final : public host::Network {
   host::SendTargetsAnswer SendTargets(const host::Request& request) override;
   /// The session comes back when the machine has been started anew. The kernel tells no TSIH: the number of
   /// its session stands for it. The ISID is open-iscsi's own, too. Where open-iscsi has such a session
-  /// already, an Error.
+  /// already, the status is kSessionExists.
   host::LoginAnswer Login(const host::LoginRequest& request) override;
   /// Ends the kernel's session with the id @p request.session, which then does not come back; where it is
   /// another target's by now, nothing happens. An Error where the session stays, and where others began it.
