@@ -95,7 +95,8 @@ TEST(PlinthFormatters, FitTablesToTheTerminal) {
       {49, "iqn.2026-11.org.example:disk", kanji + kanji + kanji + kanji + kanji + std::string(18, ' ')},
       {37, "iqn.2026\xe2\x80\xa6le:disk", kanji + kanji + kanji + kanji + kanji + std::string(6, ' ')},
       {29, "iqn.\xe2\x80\xa6isk", kanji + kanji + "\xe2\x80\xa6" + kanji + ' '},
-      {28, "iqn.2026-11.org.example:disk", kanji + kanji + kanji + kanji + kanji + std::string(18, ' ')},
+      {24, "i\xe2\x80\xa6k", "\xe2\x80\xa6  "},
+      {22, "iqn.2026-11.org.example:disk", kanji + kanji + kanji + kanji + kanji + std::string(18, ' ')},
   };
   for (const auto& one : cases) {
     TextConsole console;
@@ -104,6 +105,12 @@ TEST(PlinthFormatters, FitTablesToTheTerminal) {
     EXPECT_EQ(console.out.text,
               one.first + "  1234567890123  true\n" + one.second + "              1  true\n");
   }
+  TextConsole console;
+  console.screen = {18, 0};
+  RunCommand(*NewProbe(Ports({Port("16777215", 1, true)})), {"--output=table", "--color=never"}, console);
+  EXPECT_EQ(console.out.text,
+            "Name      MTU  L\xe2\x80\xa6p\n--------  ---  ---\n16777215    1  t\xe2\x80\xa6"
+            "e\n");
 }
 
 const std::string kHelpEnd =

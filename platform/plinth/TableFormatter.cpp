@@ -13,24 +13,24 @@ struct Column {
   std::string title;
   bool right = false;
   std::size_t width = 0;
+  /// What it keeps however narrow the terminal is: numbers stay whole, of a text there is its first
+  /// character, the mark and its last one.
+  std::size_t least = 3;
 };
 
-/// What a column keeps however narrow the terminal is.
-constexpr std::size_t kNarrowest = 8;
-
-/// Takes columns from the widest texts until a row fits @p width; numbers keep theirs. Where that is not
-/// enough, the table stays whole: it would be cut and broken over lines both.
+/// Takes from the widest of those that can give until a row fits @p width. Where that is not enough, the
+/// table stays whole: it would be cut and broken over lines both.
 void Fit(std::vector<Column>& columns, std::size_t width) {
   if (width == 0 || columns.empty()) return;
   std::size_t whole = 2 * columns.size() - 2;
   std::size_t spare = 0;
   for (const Column& column : columns) {
     whole += column.width;
-    if (!column.right && column.width > kNarrowest) spare += column.width - kNarrowest;
+    if (column.width > column.least) spare += column.width - column.least;
   }
   if (whole > width + spare) return;
   const auto narrower = [](const Column& one, const Column& other) {
-    return (one.right ? 0 : one.width) < (other.right ? 0 : other.width);
+    return (one.width > one.least ? one.width : 0) < (other.width > other.least ? other.width : 0);
   };
   for (; whole > width; --whole) --std::max_element(columns.begin(), columns.end(), narrower)->width;
 }
@@ -47,6 +47,9 @@ struct Cell {
   std::string_view text;
   std::size_t width;
 };
+
+/// Many commands give numbers as texts.
+bool IsNumber(std::string_view text) { return text.find_first_not_of("0123456789") == text.npos; }
 
 /// Puts rows together, each in the room of the one before it.
 class RowWriter {
@@ -111,8 +114,10 @@ void WriteTable(const Report& report, Sink& sink) {
   // The widths are known only when every cell was seen. Most texts are shown as they are, so that making the
   // others twice costs less than keeping all.
   ForEachElement(*report.result, [&](const MetaObj::MetaObject& element) {
-    forEachCell(element,
-                [](Column& column, const Cell& cell) { column.width = std::max(column.width, cell.width); });
+    forEachCell(element, [](Column& column, const Cell& cell) {
+      column.width = std::max(column.width, cell.width);
+      if (column.right || IsNumber(cell.text)) column.least = std::max(column.least, cell.width);
+    });
   });
   Fit(columns, report.width);
   RowWriter rows(columns, sink);
