@@ -127,6 +127,9 @@ class Batch {
     line->place = file_.Name() + ':' + std::to_string(line->line);
     Request& request = line->request;
     try {
+      if (text.size() > LineFile::kLongest) {
+        throw UsageError("the line is longer than " + std::to_string(LineFile::kLongest) + " bytes");
+      }
       const std::vector<std::string> words = SplitWords(text);
       if (words.empty()) return false;
       request = ReadRequest(root, words);

@@ -59,15 +59,18 @@ def refused():
     host = Host()
     for line, text, status in [
         ("--batch /nowhere", 'option --batch: "/nowhere" cannot be read: No such file or directory', 2),
-        (f"--batch {host.root}", f"{host.root} cannot be read: Is a directory", 4),
+        (f"--batch {host.root}", f'option --batch: "{host.root}" cannot be read: Is a directory', 2),
         ("--batch - iscsi adapter list", "option --batch: give no command beside it; they stand in the file", 2),
         ("--keep-going iscsi adapter list", "option --keep-going: it goes with --batch alone", 2),
         ("--batch - --secret-file x", "option --secret-file: give it in the line of its command", 2),
     ]:
         done = host.run(line, "iscsi adapter list\n")
         check(done.returncode == status and text in done.stderr and not done.stdout, done)
-    done = host.run("--batch -", "#" * (1 << 21))
-    check(done.returncode == 4 and "standard input, line 1: it is longer than 1048576 bytes" in done.stderr, done)
+    lines = "\ufeff" + "\n".join("-V".ljust(size) for size in (1 << 20, (1 << 20) + 1, 3 << 20, 2))
+    for options, statuses in ("--keep-going", [0, 2, 2, 0]), ("", [0, 2]):
+        done = host.run(f"--batch - --output json {options}", lines)
+        check([json.loads(line)["status"] for line in done.stdout.splitlines()] == statuses, done)
+        check("the line is longer than 1048576 bytes" in done.stderr, done)
     done = host.run("--batch -", "simulator load -\n{}\n")
     check(done.returncode == 1 and "hba0" in host.succeed("iscsi adapter list"), "a command has read lines", done)
 
