@@ -15,6 +15,11 @@ namespace Plinth {
 
 namespace {
 
+/// Files and texts made on other systems end their lines in CR LF.
+void DropReturn(std::string& line) {
+  if (!line.empty() && line.back() == '\r') line.pop_back();
+}
+
 /// The file that --secret-file names, open.
 class SecretFile {
  public:
@@ -24,9 +29,10 @@ class SecretFile {
           "option --secret-file: \"-\" is no file; to read standard input, give \"-\" as the value of "
           "the secret's own option");
     }
-    // Without waiting for somebody to write, where it is a pipe.
+    // Without waiting for somebody to open a pipe that has a name; the one of a shell's <(command) is open.
     file_ = open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY);
     if (file_ < 0) Refuse(std::string("cannot be read: ") + std::strerror(errno));
+    fcntl(file_, F_SETFL, 0);  // what is read there is waited for
   }
   SecretFile(const SecretFile&) = delete;
   SecretFile& operator=(const SecretFile&) = delete;
@@ -38,7 +44,7 @@ class SecretFile {
   void RequirePrivate() const {
     struct stat status = {};
     if (fstat(file_, &status) != 0) Refuse(std::string("cannot be read: ") + std::strerror(errno));
-    if (!S_ISREG(status.st_mode)) Refuse("is not a regular file");
+    if (!S_ISREG(status.st_mode) && !S_ISFIFO(status.st_mode)) Refuse("is neither a regular file nor a pipe");
     char fault[160];
     if (status.st_uid != 0 && status.st_uid != geteuid()) {
       std::snprintf(fault, sizeof fault,
@@ -66,6 +72,7 @@ class SecretFile {
       const std::size_t end = line.find('\n');
       if (count > 0 && end == line.npos) continue;
       line.resize(std::min(end, line.size()));
+      DropReturn(line);
       if (line.empty()) Refuse("has nothing in its first line");
       return line;
     }
@@ -98,8 +105,13 @@ bool IsFetcher(const Run& run) {
 std::string Ask(Run& run, const Parameter& parameter) {
   const auto read = [&](const std::string& question) {
     std::string line;
-    if (run.console.ReadSecret(question, line)) return line;
-    throw UsageError("option " + OptionName(parameter) + ": standard input ended before the value");
+    if (!run.console.ReadSecret(question, line)) {
+      throw UsageError(
+          "option " + OptionName(parameter) + ": standard input ended before the value" +
+          (run.line == 0 ? "" : "; lines of a batch that comes from there have none: give --secret-file"));
+    }
+    DropReturn(line);
+    return line;
   };
   const std::string name = parameter.name + (run.line == 0 ? "" : " of line " + std::to_string(run.line));
   std::string value = read(name);

@@ -23,7 +23,8 @@ iscsi adapter set -A hba2 -a x\
 --batch other
 --plugins=/ iscsi software get
 --output simple iscsi adapter get -A hba2 --fields Alias
-iscsi softwar get"""
+iscsi softwar get
+iscsi adapter auth chap set -A hba2 -d uni -l required -N u -S -"""
 # line: status, message
 ANSWERS = {
     2: (0, ""), 4: (0, ""), 5: (1, "Invalid adapter specified or unable to get adapter."),
@@ -32,6 +33,8 @@ ANSWERS = {
     8: (2, "option --batch: a line of a batch cannot be one"),
     9: (2, "option --plugins: give it beside --batch; plug-ins are loaded ahead of the first line"),
     11: (2, 'unknown command "softwar" in "iscsi"; did you mean "software"?'),
+    12: (2, "option --secret (-S): standard input ended before the value; lines of a batch that comes from there have none: "
+            "give --secret-file"),
 }
 
 

@@ -23,7 +23,7 @@ def seen_of(process):
 def is_set(host, shown):
     check(SECRET not in shown, "the secret shows", shown)
     check("***" in shown and "true" in shown, "the trace has no mark of a secret", shown)
-    check(SECRET in host.succeed("simulator show --secrets"), "the host does not have the secret")
+    check(f'"{SECRET}"' in host.succeed("simulator show --secrets"), "the host does not have the secret")
     check(SECRET not in host.succeed("simulator show"), "simulator show shows the secret")
 
 
@@ -31,7 +31,7 @@ def from_pipe():
     host = Host()
     process = host.start(LINE, stdin=subprocess.PIPE)
     seen = seen_of(process)
-    done = finished(process, SECRET + "\nnot a part of it\n")
+    done = finished(process, SECRET + "\r\nnot a part of it\n")
     check(done.returncode == 0, done)
     is_set(host, done.stderr + done.stdout + seen)
 
@@ -98,6 +98,18 @@ def on_command_line():
     check(status == 0 and b"note" not in shown, shown)
 
 
+def from_open_pipe():
+    """As a shell has it for <(command), which may take its time."""
+    host = Host()
+    reader, writer = os.pipe()
+    process = host.start(LINE.replace("--secret -", f"--secret-file /dev/fd/{reader}"), pass_fds=[reader])
+    until_asleep(process)
+    os.write(writer, SECRET.encode())
+    os.close(writer)
+    done = finished(process)
+    is_set(host, done.stderr + done.stdout)
+
+
 def from_file():
     host = Host()
     path = os.path.join(host.root, "secret")
@@ -109,13 +121,15 @@ def from_file():
         (SECRET, 0o640, 0, "has mode 0640; it has to be its owner's alone, which mode 0600 makes it"),
         (SECRET, 0o602, 0, "has mode 0602"), (SECRET, 0o600, 4711, "belongs to user 4711; it has to belong to user 0"),
         ("\n" + SECRET, 0o600, 0, "has nothing in its first line"), ("", 0o600, 0, "has nothing"),
-        ("x" * 70000, 0o600, 0, "has more than 65536 bytes in its first line"), (None, 0o700, 0, "is not a regular file"),
+        ("x" * 70000, 0o600, 0, "has more than 65536 bytes in its first line"), ("\r\n", 0o600, 0, "has nothing"),
+        (SECRET + "\r\nmore", 0o600, 0, ""), (os.mkfifo, 0o700, 0, "has nothing in its first line"),
+        (os.mkdir, 0o700, 0, "is neither a regular file nor a pipe"),
     ]:
         if owner and os.geteuid():
             continue
-        if text is None:
+        if callable(text):
             os.remove(path)
-            os.mkfifo(path, mode)
+            text(path, mode)
         else:
             write(path, text)
         os.chmod(path, mode)
@@ -125,7 +139,7 @@ def from_file():
         check(done.returncode == (2 if refusal else 0) and refusal in done.stderr, text, mode, done)
         check(SECRET not in done.stderr + done.stdout, "the secret shows", done)
         if not refusal:
-            check(host.show()["adapters"][2]["chap"]["uni"]["secret"] == text.split("\n")[0], text)
+            check(host.show()["adapters"][2]["chap"]["uni"]["secret"] == text.splitlines()[0], text)
         if owner:
             os.chown(path, 0, -1)
 
@@ -135,4 +149,5 @@ from_terminal()
 when_ended()
 under_a_shell()
 on_command_line()
+from_open_pipe()
 from_file()
