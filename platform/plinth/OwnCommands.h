@@ -27,6 +27,8 @@ boost::shared_ptr<AutoCli::NamespaceNode> NewHelp(AutoCli::Namespace& root);
 
 /// In front of other words, what is read as --help.
 inline constexpr const char* kHelpWord = "help";
+/// Alone, the same as behind kHelpWord.
+inline constexpr const char* kExplainWord = "explain";
 
 /// Which plug-ins have to be loaded for one of them: all, none, or what the line needs that a
 /// shell is asking about.
@@ -42,7 +44,7 @@ struct OwnCommand {
 inline constexpr OwnCommand kOwnCommands[] = {{"catalogue", NewCatalogue},
                                               {"completion", NewCompletion, Needs::NoPlugins},
                                               {"propose", NewProposal, Needs::PluginsOfLineAtCursor},
-                                              {"explain", NewExplain},
+                                              {kExplainWord, NewExplain},
                                               {kHelpWord, NewHelp},
                                               {"manual", NewManual},
                                               {"reference", NewReference}};

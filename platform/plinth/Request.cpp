@@ -1,5 +1,7 @@
 #include "plinth/Request.h"
 
+#include <algorithm>
+
 #include "plinth/CommandLine.h"
 #include "plinth/Declarations.h"
 #include "plinth/Failure.h"
@@ -43,6 +45,7 @@ class RequestReader {
         Attempt([&] { TakeWord(arguments_[at_++]); });
       }
     }
+    if (request_.path == kExplainWord && IsEmpty()) request_.isHelp = true;
     return std::move(request_);
   }
 
@@ -66,6 +69,14 @@ class RequestReader {
     if (request_.status != kSuccess) return;
     request_.status = status;
     request_.fault = fault;
+  }
+
+  /// True where the command is given nothing.
+  bool IsEmpty() const {
+    const auto& parameters = request_.own.Parameters();
+    return request_.operands.empty() &&
+           std::none_of(parameters.begin(), parameters.end(),
+                        [&](const Parameter& parameter) { return request_.own.For(parameter).given; });
   }
 
   bool IsAtCommand() const { return NodeData::Of(*request_.node).isCommand; }

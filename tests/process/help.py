@@ -17,6 +17,7 @@ for node in demo.result("catalogue"):
         check((before.stdout, before.returncode) == (behind.stdout, 0), before, behind)
 check(demo.succeed("help") == demo.succeed("--help") and demo.succeed("-V") == demo.succeed("--version"), "help, -V")
 check(demo.succeed("help iscsi -h") == demo.succeed("iscsi"), "help twice")
+check(demo.succeed("explain") == demo.succeed("explain -h"), "explain alone")
 
 
 def text(host, line=HELP):
