@@ -257,7 +257,7 @@ TEST(Reasons, AreWhatFailedLastAheadOfEachReport) {
       {"operation": "Read", "adapter": null, "code": "busy", "text": "Told."}])"));
   EXPECT_EQ(document["messages"].size(), 4u);
   EXPECT_EQ(std::get<0>(run("--exit-codes")), 20);
-  setenv("HCLI_EXIT_CODES", "1", 1);
+  setenv("HCLI_EXIT_CODES", "yes", 1);
   EXPECT_EQ(std::get<0>(run("--trace=no")), 20);
   EXPECT_EQ(std::get<0>(run("--exit-codes=no")), Plinth::kResultAndReported);
   unsetenv("HCLI_EXIT_CODES");

@@ -25,7 +25,7 @@ std::string PagerCommand() {
   const char* named = getenv("HCLI_PAGER");
   if (!named) named = getenv("PAGER");
   const std::string command = named ? named : kUsualPager;
-  return command == "cat" ? "" : command;
+  return command == "cat" || command.find_first_not_of(" \t") == command.npos ? "" : command;
 }
 
 bool Fits(const std::string& text, const ScreenSize& screen) {

@@ -3,7 +3,6 @@
 #include <stdlib.h>
 
 #include <algorithm>
-#include <cstring>
 #include <new>
 #include <utility>
 
@@ -27,7 +26,8 @@ bool WantsExitCodes(const Run& run) {
   const Given& given = run.request.global.For("exit-codes");
   if (given.given) return given.truth;
   const char* variable = getenv("HCLI_EXIT_CODES");
-  return variable && std::strcmp(variable, "1") == 0;
+  bool isWanted = false;
+  return variable && ReadTruth(variable, isWanted) && isWanted;
 }
 
 }  // namespace

@@ -12,6 +12,7 @@ CASES = [
     (height + 1, LINE, {"HCLI_PAGER": "sed s/^/P:/"}, whole),
     (5, LINE, {"PAGER": "sed s/^/P:/"}, paged),
     (5, LINE, {"PAGER": "sed s/^/P:/", "HCLI_PAGER": ""}, whole),
+    (5, LINE, {"HCLI_PAGER": " "}, whole),
     (5, LINE, {"PAGER": "sed s/^/P:/", "TERM": "dumb"}, whole),
     (5, LINE + " --no-pager", {"PAGER": "sed s/^/P:/"}, whole),
     (5, LINE, {"PAGER": "exit 127"}, whole),
