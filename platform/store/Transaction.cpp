@@ -39,14 +39,13 @@ void Store::ForgetReading() {
   if (kept == this) kept = nullptr;
 }
 
-void Store::EndReading() {
+void Store::EndReading() noexcept {
   if (kept != this) return;
   kept = nullptr;
   try {
     Statement(*this, "COMMIT").Step();
-  } catch (...) {
-    RollBack(*this);
-    throw;
+  } catch (const std::exception&) {
+    RollBack(*this);  // what could not be read was told where it was read
   }
 }
 
@@ -121,12 +120,7 @@ Reading::Reading() {
 std::uint64_t Reading::Current() { return readings == 0 ? 0 : lastReading; }
 
 Reading::~Reading() {
-  if (--readings > 0 || kept == nullptr) return;
-  try {
-    kept->EndReading();
-  } catch (const std::exception&) {
-    // It has read what it was to read.
-  }
+  if (--readings == 0 && kept != nullptr) kept->EndReading();
 }
 
 Transaction::Transaction(Store& store, Access access) : store_(store), access_(access) {
