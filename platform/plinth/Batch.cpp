@@ -7,6 +7,7 @@
 
 #include "plinth/LineFile.h"
 #include "plinth/OpenGroup.h"
+#include "plinth/OwnCommands.h"
 #include "plinth/Run.h"
 #include "plinth/Words.h"
 
@@ -38,6 +39,15 @@ void RefuseOfTheWhole(const OptionTable& options) {
     const char* fault = options.For(parameter).given ? FaultInLine(parameter) : nullptr;
     if (fault) throw UsageError("option " + OptionName(parameter) + ": " + fault);
   }
+}
+
+/// A shell's question is answered by commands that run in a child of this process. In a batch the child would
+/// have the group's open transaction too, and end it.
+void RefuseQuestion(const Request& request) {
+  const OwnCommand* const own = FindOwnCommand(request.path);
+  if (!own || own->needs != Needs::PluginsOfLineAtCursor) return;
+  throw UsageError("command " + request.path +
+                   ": a shell asks it by itself; it is not for a line of a batch");
 }
 
 /// True for a line that is told by its options to show something while it runs, to ask for something, or to
@@ -134,6 +144,7 @@ class Batch {
       if (words.empty()) return false;
       request = ReadRequest(root, words);
       RefuseOfTheWhole(request.global);
+      RefuseQuestion(request);
     } catch (const UsageError& error) {
       request.status = kUsage;
       request.fault = error.what();

@@ -24,7 +24,8 @@ iscsi adapter set -A hba2 -a x\
 --plugins=/ iscsi software get
 --output simple iscsi adapter get -A hba2 --fields Alias
 iscsi softwar get
-iscsi adapter auth chap set -A hba2 -d uni -l required -N u -S -"""
+iscsi adapter auth chap set -A hba2 -d uni -l required -N u -S -
+propose bash"""
 # line: status, message
 ANSWERS = {
     2: (0, ""), 4: (0, ""), 5: (1, "Invalid adapter specified or unable to get adapter."),
@@ -35,6 +36,7 @@ ANSWERS = {
     11: (2, 'unknown command "softwar" in "iscsi"; did you mean "software"?'),
     12: (2, "option --secret (-S): standard input ended before the value; lines of a batch that comes from there have none: "
             "give --secret-file"),
+    13: (2, "command propose: a shell asks it by itself; it is not for a line of a batch"),
 }
 
 
