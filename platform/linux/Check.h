@@ -18,7 +18,7 @@ struct Finding {
 /// The part whose finding is the machine's initiator name.
 inline constexpr const char* kNamePart = "initiator name";
 
-/// All parts, in the order in which they are mended.
+/// All parts, in the order in which they are mended. Ends a group of changes: see Host::Settle.
 std::vector<Finding> CheckMachine();
 
 }  // namespace linux

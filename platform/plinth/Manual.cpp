@@ -1,5 +1,6 @@
 #include "plinth/Manual.h"
 
+#include <Plinth/ChangeGroup.h>
 #include <Plinth/Rehearsal.h>
 #include <fcntl.h>
 #include <unistd.h>
@@ -87,6 +88,7 @@ class Manual final : public virtual AutoCli::Command {
   void ExecuteInternal(boost::shared_ptr<CallSpec::Input> input,
                        boost::shared_ptr<CallSpec::Output> output) override {
     CheckGuides();
+    SettleChanges();  // pages are not undone with them
     const std::string folder = input->GetString(kFolder);
     std::vector<std::pair<std::string, std::string>> pages;
     for (const Place& place : Places(root_)) {

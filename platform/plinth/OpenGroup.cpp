@@ -1,5 +1,6 @@
 #include "plinth/OpenGroup.h"
 
+#include <stdexcept>
 #include <utility>
 #include <vector>
 
@@ -12,17 +13,32 @@ std::vector<ChangeGroup*>& ChangeGroups() {
   return groups;
 }
 
+OpenGroup* current = nullptr;
+
 }  // namespace
 
 void AddChangeGroup(ChangeGroup& group) { ChangeGroups().push_back(&group); }
 
+void SettleChanges() {
+  if (!current || current->Commit()) return;
+  throw std::runtime_error("what was changed ahead of this could not be kept");
+}
+
 bool OpenGroup::IsOffered() { return ChangeGroups().size() == 1; }
 
-OpenGroup::OpenGroup() : group_(ChangeGroups().front()) { group_->Begin(); }
+OpenGroup::OpenGroup() : group_(ChangeGroups().front()) {
+  group_->Begin();
+  current = this;
+}
+
+OpenGroup::~OpenGroup() {
+  Commit();
+  current = nullptr;
+}
 
 bool OpenGroup::Commit() {
-  ChangeGroup* const group = std::exchange(group_, nullptr);
-  return !group || group->Commit();
+  if (ChangeGroup* const group = std::exchange(group_, nullptr)) isKept_ = group->Commit();
+  return isKept_;
 }
 
 }  // namespace Plinth

@@ -11,17 +11,18 @@ class OpenGroup {
   OpenGroup();
   OpenGroup(const OpenGroup&) = delete;
   OpenGroup& operator=(const OpenGroup&) = delete;
-  ~OpenGroup() { Commit(); }
+  ~OpenGroup();
 
   /// Whether there is one to begin.
   static bool IsOffered();
 
   bool IsOpen() const { return group_ && group_->IsOpen(); }
-  /// False where nothing of what was changed has happened.
+  /// Does nothing where it is committed already. False where nothing of what was changed has happened.
   bool Commit();
 
  private:
-  ChangeGroup* group_;
+  ChangeGroup* group_;  // null once it is committed
+  bool isKept_ = true;
 };
 
 }  // namespace Plinth

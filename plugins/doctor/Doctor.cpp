@@ -1,5 +1,6 @@
 #include "doctor/Doctor.h"
 
+#include <Plinth/ChangeGroup.h>
 #include <Plinth/MetaObj.h>
 #include <Plinth/Rehearsal.h>
 
@@ -108,6 +109,7 @@ class DoctorCommand final : public Plinth::AutoCli::Command {
 
   void ExecuteInternal(boost::shared_ptr<CallSpec::Input> input,
                        boost::shared_ptr<CallSpec::Output> output) override {
+    Plinth::SettleChanges();  // the host's files are to be seen as they stand between changes
     std::vector<Finding> findings;
     ForEachSource([&](CheckSource& source) {
       for (Finding& finding : source.Check()) findings.push_back(std::move(finding));

@@ -133,6 +133,27 @@ def locked():
     check(aliases(host) == [before[0], "x", "y"], aliases(host))
 
 
+def settled():
+    """What writes elsewhere, or takes its time, is begun once the changes ahead of it are kept; else it is not."""
+    for line, made in (("doctor --bundle {0}/report", "report"), ("manual --folder {0}", "hcli.1"),
+                       ("linux check", "asked")):
+        host = Host()
+        before = aliases(host)
+        os.mkdir(os.path.join(host.root, "sbin"))
+        write(program := os.path.join(host.root, "sbin/iscsiadm"), f"#!/bin/sh\n: > {host.root}/asked\n")
+        os.chmod(program, 0o755)
+        lines = f"iscsi adapter set -A hba1 -a x\n{line.format(host.root)}\n"
+        reader = sqlite3.connect(host.database, isolation_level=None)
+        reader.execute("BEGIN")
+        reader.execute("SELECT * FROM object").fetchone()
+        done = host.run("--batch - --timeout 0 --exit-codes", lines)
+        check(done.returncode == BUSY and made not in os.listdir(host.root), line, done)
+        reader.close()
+        done = host.run("--batch -", lines)
+        check(made in os.listdir(host.root) and aliases(host) == [before[0], "x", before[2]], line, done)
+        check("cut off" not in done.stdout, "a change of its own batch counts as one that was cut off", done)
+
+
 def killed(kills):
     """Wherever it is killed, the first lines are done, as many as were answered at least, and no others."""
     random.seed(20261123)
@@ -173,4 +194,5 @@ refused()
 while_it_is_written()
 unread()
 locked()
+settled()
 killed(int(sys.argv[1]) if len(sys.argv) > 1 else 20)
