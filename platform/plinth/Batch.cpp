@@ -75,6 +75,7 @@ class Batch {
   /// What came of the lines is shown before more of them are waited for.
   void RunLines() {
     while (Fetch()) {
+      if (!whole_.console.HasReader()) return EndUnread();
       for (std::size_t count = PerformSome(); count > 0; --count) {
         const Line line = std::move(lines_.front());
         lines_.pop_front();
@@ -213,6 +214,12 @@ class Batch {
   void Heed(const Run& line) {
     if (whole_.record.status == kSuccess) whole_.record.status = line.record.status;
     whole_.record.isUnread = line.record.isUnread;
+  }
+
+  /// Nothing is done any more that nobody would be told of.
+  void EndUnread() {
+    if (whole_.record.status == kSuccess) whole_.record.status = kFailure;
+    whole_.record.isUnread = true;
   }
 
   bool Ends(const Run& line) const {

@@ -1,5 +1,6 @@
 #include "plinth/Console.h"
 
+#include <poll.h>
 #include <sys/ioctl.h>
 #include <unistd.h>
 
@@ -33,6 +34,11 @@ int FileSink::Flush() {
   }
   used_ = 0;
   return error_;
+}
+
+bool ProcessConsole::HasReader() const {
+  pollfd out{STDOUT_FILENO, 0, 0};
+  return poll(&out, 1, 0) <= 0 || (out.revents & (POLLERR | POLLHUP)) == 0;
 }
 
 bool ProcessConsole::IsAsking() const { return isatty(STDIN_FILENO) == 1; }

@@ -63,6 +63,8 @@ class Console {
 
   virtual Sink& Out() = 0;
   virtual Sink& Error() = 0;
+  /// False where whoever was to read standard output has gone.
+  virtual bool HasReader() const = 0;
   /// Reads one line, without its newline, that must not be shown. @p name tells the user what is asked for.
   /// False where the input ended before a line began.
   virtual bool ReadSecret(const std::string& name, std::string& line) = 0;
@@ -79,6 +81,7 @@ class ProcessConsole final : public Console {
  public:
   Sink& Out() override { return out_; }
   Sink& Error() override { return error_; }
+  bool HasReader() const override;
   bool ReadSecret(const std::string& name, std::string& line) override;
   bool IsAsking() const override;
   bool IsErrorTerminal() const override;
@@ -94,6 +97,7 @@ class TextConsole final : public Console {
  public:
   Sink& Out() override { return out; }
   Sink& Error() override { return error; }
+  bool HasReader() const override { return true; }
   bool ReadSecret(const std::string& name, std::string& line) override;
   bool IsAsking() const override { return isTerminal; }
   bool IsErrorTerminal() const override { return isTerminal; }
