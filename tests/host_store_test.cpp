@@ -78,6 +78,17 @@ TEST_F(HostStore, ALockThatStaysIsTold) {
   EXPECT_EQ(Host::SetPatience(before), 10);
 }
 
+/// Which failures end the transaction: see https://www.sqlite.org/lang_transaction.html.
+const struct {
+  void (host::Store::*fail)(int number, int code);
+  int code;
+} kFaults[] = {
+    {&host::Store::FailStatement, SQLITE_IOERR},   {&host::Store::FailStatement, SQLITE_FULL},
+    {&host::Store::FailStatement, SQLITE_CORRUPT}, {&host::Store::FailStatement, SQLITE_BUSY},
+    {&host::Store::FailStatement, SQLITE_NOMEM},   {&host::Store::FailTransaction, SQLITE_IOERR},
+    {&host::Store::FailTransaction, SQLITE_FULL},  {&host::Store::FailTransaction, SQLITE_NOMEM},
+};
+
 TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
   const struct {
     const char* name;
@@ -88,14 +99,14 @@ TEST_F(HostStore, EachFailingStatementLeavesTheHostAsItWas) {
       {"load", [] { simulator::Load(R"({"adapters": [{"name": "x"}, {"name": "y"}]})"); }},
   };
   for (const auto& [name, change] : cases) {
-    for (const int code : {SQLITE_IOERR, SQLITE_FULL, SQLITE_CORRUPT, SQLITE_NOMEM}) {
+    for (const auto& [fail, code] : kFaults) {
       int number = 0;
       bool failed = true;
       while (failed) {
         simulator::Load(std::string(simulator::DemoDescription()));
         const std::string before = simulator::Show(true);
         host::Store& store = Host::Current().GetStore();
-        store.FailStatement(++number, code);
+        (store.*fail)(++number, code);
         try {
           change();
           failed = false;
@@ -115,12 +126,12 @@ TEST_F(HostStore, WhicheverStatementOfABatchFailsItsAnswersAreTrue) {
   const std::string path = root_.Path() + "/lines";
   std::ofstream(path) << "iscsi adapter set -A hba0 -a new0\niscsi adapter set -A hba1 -a new1\n"
                          "iscsi adapter set -A hba2 -a new2\n";
-  for (const int code : {SQLITE_IOERR, SQLITE_FULL, SQLITE_BUSY, SQLITE_NOMEM}) {
+  for (const auto& [fail, code] : kFaults) {
     int refused = 0;
     for (int number = 1;; ++number) {
       Host::Use(simulator::HostOf(std::string(simulator::DemoDescription())));
       host::Store& store = Host::Current().GetStore();
-      store.FailStatement(number, code);
+      (store.*fail)(number, code);
       Plinth::TextConsole console;
       Plinth::RunCommandLine(CommandTree(), {"--batch", path, "--keep-going", "--output", "json"}, console);
       if (!store.HasFailed()) break;

@@ -176,9 +176,14 @@ void Store::SetPatience(int milliseconds) {
 
 void Store::FailStatement(int number, int code) { fault_ = {.countdown = number, .code = code}; }
 
+void Store::FailTransaction(int number, int code) {
+  fault_ = {.countdown = number, .code = code, .ofTransaction = true};
+}
+
 int Store::Step(sqlite3_stmt* statement) {
   if (fault_.countdown > 0 && --fault_.countdown == 0) {
     fault_.happened = true;
+    if (fault_.ofTransaction) sqlite3_exec(database_, "ROLLBACK", nullptr, nullptr, nullptr);
     return fault_.code;
   }
   return sqlite3_step(statement);

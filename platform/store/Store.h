@@ -78,6 +78,9 @@ class Store {
   /// Tests only: statement @p number from now (1 is the next) fails with the SQLite code @p code without
   /// having run. 0 ends it.
   void FailStatement(int number, int code);
+  /// Tests only: the same, and SQLite ends the transaction by itself, as it may where the disk or the memory
+  /// does not suffice.
+  void FailTransaction(int number, int code);
   /// True when the fault asked for has happened.
   bool HasFailed() const { return fault_.happened; }
 
@@ -101,6 +104,7 @@ class Store {
   struct Fault {
     int countdown = 0;
     int code = 0;
+    bool ofTransaction = false;
     bool happened = false;
   };
   std::string path_;
