@@ -7,9 +7,11 @@ import re
 import select
 import shutil
 import sqlite3
+import statistics
 import subprocess
 import tempfile
 import termios
+import time
 
 from support.program import HCLI, Host, check, contents, run, succeeded, write
 
@@ -108,6 +110,15 @@ check(not contents(host.root), "looking for values has made", contents(host.root
 host.succeed("iscsi adapter list")
 expect(host, f"{GET} -A ", ADAPTERS)
 check(propose(host, f"{GET} -A ", HCLI_TRACE="1", HCLI_OUTPUT="json")[1] == ADAPTERS, "a trace stands in the way")
+# A key that is pressed is answered at once. Builds that look at themselves are slow: there, as fast as a few commands.
+took = {"propose fish": [], "iscsi adapter list": []}
+for _ in range(15):
+    for line, seconds in took.items():
+        begin = time.monotonic()
+        host.succeed(line, env=host.environment(COMP_LINE=f"hcli {GET} -A "))
+        seconds.append(time.monotonic() - begin)
+answer, command = map(statistics.median, took.values())
+check(answer < max(0.05, 3 * command), f"an answer takes {answer:.3f} s, a command {command:.3f} s")
 lock = sqlite3.connect(host.database, isolation_level=None)
 lock.execute("BEGIN EXCLUSIVE")
 expect(host, f"{GET} -A ", [])
