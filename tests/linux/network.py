@@ -16,6 +16,7 @@ TIMING = {"node.session.initial_login_retry_max": 3, "node.session.cmds_max": 64
           "node.conn[0].timeo.noop_out_timeout": 6, "node.session.timeo.replacement_timeout": 45}
 NOT_AUTHENTICATED, NOT_ALLOWED, NOT_FOUND, UNAVAILABLE = 0x50201, 0x50202, 0x50203, 0x50301
 TARGET_UNPROVEN, TARGET_WITHOUT_CHAP, NO_COMMON_DIGEST = 0x60201, 0x60202, 0x60203
+SESSION_EXISTS = 0x60204
 DEMANDS = PROHIBITED, DISCOURAGED, PREFERRED, REQUIRED = range(4)
 
 
@@ -73,7 +74,7 @@ def logged_in(machine):
         missing -= set(shown)
         check(not missing, "not what open-iscsi reads:", missing, *shown)
         again = driver(machine, "login", **given)
-        check(again.get("code") == "exists" and sessions(machine) == [f"session{session}"], again)
+        check(again.get("status") == SESSION_EXISTS and sessions(machine) == [f"session{session}"], again)
         machine.succeed(f"grep -qx 'node.startup = automatic' /etc/iscsi/{node}")
         # A number that is another target's by now ends nothing.
         driver(machine, "logout", target=CLOSED, session=session)
@@ -114,7 +115,7 @@ def ipv6(machine):
         given = {"target": TGT, "uni": ["user", SECRET], "host": address}
         answer = driver(machine, "login", **given)
         check(answer["status"] == DONE, address, answer)
-        check(driver(machine, "login", **given).get("code") == "exists", "no session was found at", address)
+        check(driver(machine, "login", **given).get("status") == SESSION_EXISTS, "no session was found at", address)
         driver(machine, "logout", target=TGT, session=answer["tsih"])
         check(sessions(machine) == [] and set(records(machine)) == {"ifaces/hcli.hba0"}, address, records(machine))
 
@@ -130,7 +131,7 @@ def killed(machine):
         left = sessions(machine)
         outcomes["a session" if left else "none"] += 1
         answer = driver(machine, "login", **given)
-        check(answer.get("code") == "exists" if left else answer.get("status") == DONE, kill, left, answer)
+        check(answer.get("status") == SESSION_EXISTS if left else answer.get("status") == DONE, kill, left, answer)
         now = sessions(machine)
         check(len(now) == 1 and (not left or left == now), kill, left, now)
         driver(machine, "logout", target=TGT, session=int(now[0].removeprefix("session")))
