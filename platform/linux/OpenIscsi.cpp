@@ -7,8 +7,10 @@
 #include <algorithm>
 #include <cerrno>
 #include <charconv>
+#include <thread>
 
 #include "host/Storage.h"
+#include "linux/Attributes.h"
 #include "linux/Joined.h"
 #include "linux/Machine.h"
 #include "linux/Program.h"
@@ -24,7 +26,8 @@ constexpr int kLoginFailed = 5;
 constexpr int kTimedOut = 8;
 constexpr int kPduTimedOut = 11;
 constexpr int kSessionExists = 15;
-constexpr int kNoDaemon[] = {13, 18, 20};
+constexpr int kNotRoot = 13;
+constexpr int kNoDaemon[] = {18, 20};
 constexpr int kFatalLogin = 19;
 constexpr int kNothingFound = 21;
 constexpr int kNotAuthorized = 24;
@@ -47,6 +50,9 @@ std::string Complaint(const Ended& ended) {
 }
 
 [[noreturn]] void FailProgram(const std::string& what, const Ended& ended) {
+  if (ended.status == kNotRoot) {
+    throw host::Error(host::Error::Kind::Denied, "Only root may ask open-iscsi to " + what + ".");
+  }
   if (std::ranges::find(kNoDaemon, ended.status) != std::end(kNoDaemon)) {
     throw host::Error(host::Error::Kind::Failed,
                       "The daemon of open-iscsi does not answer: hcli linux check tells what mends it.");
@@ -70,16 +76,64 @@ void AddChap(const host::ChapSettings& chap, const std::string& prefix, Record& 
 /// Keeps other processes of ours from a folder while the object lives.
 class FolderLock {
  public:
-  explicit FolderLock(const std::string& path)
+  FolderLock(const std::string& path, Milliseconds limit)
       : file_(open(path.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC)) {
-    if (file_ < 0 || flock(file_, LOCK_EX) != 0) host::FailFile(path, "locked", errno);
+    if (file_ < 0) host::FailFile(path, "locked", errno);
+    const auto end = std::chrono::steady_clock::now() + limit;
+    while (flock(file_, LOCK_EX | LOCK_NB) != 0) {
+      if (std::chrono::steady_clock::now() < end) {
+        std::this_thread::sleep_for(kNextTry);
+        continue;
+      }
+      close(file_);
+      throw host::Error(host::Error::Kind::Busy,
+                        "Another process asks the same portal for its targets: " + path + " stays locked.");
+    }
   }
   FolderLock(const FolderLock&) = delete;
   FolderLock& operator=(const FolderLock&) = delete;
   ~FolderLock() { close(file_); }
 
  private:
+  static constexpr Milliseconds kNextTry{5};
+
   int file_;
+};
+
+/// A record that stands in its place while the object lives; then the one that was there before is back, or
+/// none.
+class RecordInPlace {
+ public:
+  /// Folders that are empty behind it go up to @p top.
+  RecordInPlace(std::string path, std::string top, const Record& record)
+      : path_(std::move(path)), top_(std::move(top)), before_(ReadRecord(path_)) {
+    WriteRecord(path_, record);
+  }
+  RecordInPlace(const RecordInPlace&) = delete;
+  RecordInPlace& operator=(const RecordInPlace&) = delete;
+  ~RecordInPlace() {
+    if (isKept_) return;
+    try {
+      if (before_) {
+        WriteRecord(path_, *before_);
+      } else {
+        RemoveRecord(path_, top_);
+      }
+    } catch (const std::exception&) {
+      // What brought us here is told already, and a record in the wrong place brings no session by itself.
+    }
+  }
+
+  void Keep(const Record& record) {
+    WriteRecord(path_, record);
+    isKept_ = true;
+  }
+
+ private:
+  std::string path_;
+  std::string top_;
+  std::optional<Record> before_;
+  bool isKept_ = false;
 };
 
 /// "127.0.0.1:3260,1 iqn...", an IPv6 address in brackets.
@@ -142,7 +196,8 @@ std::uint32_t StatusOf(const Ended& ended) {
 /// The same of a session. What open-iscsi calls a failure for good, and is no refusal, is its own doing: the
 /// target did not prove who it is, or has no digest in common.
 std::uint32_t StatusOf(const Ended& ended, const host::LoginRequest& request) {
-  if (ended.status != kLoginFailed && ended.status != kFatalLogin) return StatusOf(ended);
+  if (ended.status == kLoginFailed) return host::LoginResponse(0x0200);
+  if (ended.status != kFatalLogin) return StatusOf(ended);
   if (request.chap.mutual.demand != host::Demand::Prohibited) return host::kTargetUnproven;
   const host::OperationalParameters& offer = request.offer;
   if (offer.headerDigest == host::Demand::Required || offer.dataDigest == host::Demand::Required)
@@ -202,15 +257,45 @@ Record Hurried(const Record& record, Milliseconds limit) {
               std::to_string(std::clamp<std::int64_t>(seconds, 1, std::max<std::int64_t>(1, most))));
 }
 
-std::vector<Session> SessionsBy(const std::string& interface, const std::string& target,
-                                const host::Portal& portal) {
+/// The sessions that have come by the interface to the target since @p before was read.
+std::vector<Session> NewSessions(const std::vector<Session>& before, const std::string& interface,
+                                 const std::string& target) {
   std::vector<Session> sessions = ReadSessions();
   std::erase_if(sessions, [&](const Session& session) {
-    return session.target != target || session.interface != interface || session.connections.empty() ||
-           session.connections.front().persistentAddress != portal.host ||
-           session.connections.front().persistentPort != portal.port;
+    return session.target != target || session.interface != interface ||
+           std::ranges::find(before, session.number, &Session::number) != before.end();
   });
   return sessions;
+}
+
+Ended EndSession(int number, Milliseconds limit) {
+  return RunProgram({kIscsiadm, "-m", "session", "-r", std::to_string(number), "--logout"}, limit);
+}
+
+/// Ends what a login has left that is told as failed.
+void EndSessions(const std::vector<Session>& sessions, Milliseconds limit) noexcept try {
+  for (const Session& session : sessions) EndSession(session.number, limit);
+} catch (const std::exception&) {
+  // It is seen at the next look, and can be ended then.
+}
+
+/// Removes our records of nodes with the target that no session stands behind: it would come back.
+void RemoveIdle(const host::LogoutRequest& request, const std::vector<Session>& sessions) {
+  const std::string folder = Joined({kNodes, "/", request.target});
+  for (const std::string& portal : Names(folder)) {
+    for (const std::string& interface : Names(folder + "/" + portal)) {
+      const std::string path = Joined({folder, "/", portal, "/", interface});
+      const Record record = IsOurs(interface) ? ReadRecord(path).value_or(Record()) : Record();
+      const bool isUsed = std::ranges::any_of(sessions, [&](const Session& session) {
+        return session.target == request.target && session.interface == interface &&
+               !session.connections.empty() &&
+               session.connections.front().persistentAddress == ValueOf(record, "node.conn[0].address") &&
+               std::to_string(session.connections.front().persistentPort) ==
+                   ValueOf(record, "node.conn[0].port");
+      });
+      if (!isUsed && ValueOf(record, "iface.initiatorname") == request.initiator) RemoveRecord(path, kNodes);
+    }
+  }
 }
 
 }  // namespace
@@ -234,17 +319,18 @@ host::SendTargetsAnswer OpenIscsi::SendTargets(const host::Request& request) {
   const std::string path = SendTargetsPath(request.portal.host, request.portal.port);
   const std::string folder = host::HostPath(path.substr(0, path.rfind('/')));
   host::MakeFoldersFor(folder + "/x");
-  const FolderLock lock(folder);
-  const std::optional<Record> before = ReadRecord(path);
-  WriteRecord(path, record);
+  const FolderLock lock(folder, limit_);
+  // An administrator's own record is put back even where a process was killed meanwhile: by the next one.
+  const std::string kept = path + ".kept";
+  if (const auto before = ReadRecord(kept)) WriteRecord(path, *before);
+  if (const auto before = ReadRecord(path)) WriteRecord(kept, *before);
+  std::optional<RecordInPlace> inPlace;
+  inPlace.emplace(path, path.substr(0, path.rfind('/')), record);
   const Ended ended = RunProgram({kIscsiadm, "-m", "discoverydb", "-t", "sendtargets", "-p",
                                   Text(request.portal), "-I", interface, "--discover", "-o", "nonpersistent"},
                                  limit_);
-  if (before) {
-    WriteRecord(path, *before);
-  } else {
-    RemoveRecord(path, path.substr(0, path.rfind('/')));
-  }
+  inPlace.reset();
+  RemoveRecord(kept, path.substr(0, path.rfind('/')));
   if (ended.status == kNothingFound) return answer;
   if (ended.status != 0) {
     answer.status = StatusOf(ended);
@@ -271,26 +357,35 @@ host::LoginAnswer OpenIscsi::Login(const host::LoginRequest& request) {
   WriteInterface(request);
   const int tag = first.portalGroupTag.value_or(1);
   const std::string path = NodePath(request.target, request.portal.host, request.portal.port, tag, interface);
-  const std::optional<Record> before = ReadRecord(path);
   const Record record = NodeRecord(request, *chap, tag);
-  WriteRecord(path, Hurried(record, limit_));
+  const std::vector<Session> before = ReadSessions();
+  // Whoever kills this process leaves a session that came back before to come back again.
+  const std::optional<Record> old = ReadRecord(path);
+  const bool cameBack = old && ValueOf(*old, "node.startup") == kAutomatic;
+  RecordInPlace inPlace(path, std::string(kNodes),
+                        With(Hurried(record, limit_), "node.startup", cameBack ? kAutomatic : kManual));
   const Ended ended = RunProgram(
       {kIscsiadm, "-m", "node", "-T", request.target, "-p", Text(request.portal), "-I", interface, "--login"},
       limit_ + std::chrono::seconds(1));
-  if (ended.status != 0) {
-    if (before) {
-      WriteRecord(path, *before);
-    } else {
-      RemoveRecord(path, kNodes);
-    }
-    answer.status = ended.status == kSessionExists ? host::kSessionExists : StatusOf(ended, request);
+  if (ended.status == kSessionExists) {
+    answer.status = host::kSessionExists;
     return answer;
   }
-  WriteRecord(path, With(record, "node.startup", kAutomatic));
-  const std::vector<Session> sessions = SessionsBy(interface, request.target, request.portal);
+  const std::vector<Session> sessions = NewSessions(before, interface, request.target);
+  if (ended.status != 0) {
+    EndSessions(sessions, limit_);
+    answer.status = StatusOf(ended, request);
+    return answer;
+  }
   if (sessions.empty()) {
     throw host::Error(host::Error::Kind::Failed,
                       "open-iscsi has logged in to " + request.target + ", but the kernel shows no session.");
+  }
+  try {
+    inPlace.Keep(With(record, "node.startup", kAutomatic));
+  } catch (const std::exception&) {
+    EndSessions(sessions, limit_);
+    throw;
   }
   return AnswerOf(sessions.back());
 }
@@ -298,20 +393,17 @@ host::LoginAnswer OpenIscsi::Login(const host::LoginRequest& request) {
 void OpenIscsi::Logout(const host::LogoutRequest& request) {
   const std::vector<Session> sessions = ReadSessions();
   const auto session = std::ranges::find(sessions, NumberOfSession(request.session), &Session::number);
-  if (session == sessions.end() || session->target != request.target) return;
-  if (!IsOurs(session->interface)) {
+  const bool isThere = session != sessions.end() && session->target == request.target;
+  if (isThere && !IsOurs(session->interface)) {
     throw host::Error(host::Error::Kind::NotSettable, "Others began the session with " + request.target +
                                                           ", by their interface " + session->interface +
                                                           ": iscsiadm ends it.");
   }
-  const Ended ended =
-      RunProgram({kIscsiadm, "-m", "session", "-r", std::to_string(session->number), "--logout"}, limit_);
+  // After a start of the machine the number may be another initiator's session.
+  if (!isThere || session->initiator != request.initiator) return RemoveIdle(request, sessions);
+  const Ended ended = EndSession(session->number, limit_);
   if (ended.status != 0 && ended.status != kNothingFound) FailProgram("log out", ended);
-  if (session->connections.empty()) return;
-  const Connection& connection = session->connections.front();
-  RemoveRecord(NodePath(session->target, connection.persistentAddress, connection.persistentPort,
-                        session->portalGroup, session->interface),
-               kNodes);
+  RemoveIdle(request, ReadSessions());
 }
 
 }  // namespace linux

@@ -3,6 +3,7 @@
 #include <fcntl.h>
 #include <netdb.h>
 #include <poll.h>
+#include <sys/random.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
@@ -46,6 +47,7 @@ class Connection {
     const auto to = Addresses(request.portal.host, std::to_string(request.portal.port), 0);
     const auto from = request.from.empty() ? AddressList(nullptr, freeaddrinfo)
                                            : Addresses(request.from, "0", AI_NUMERICHOST);
+    if (!request.from.empty() && from == nullptr) return false;
     for (const addrinfo* address = to.get(); address != nullptr; address = address->ai_next) {
       if (Open(*address, from.get())) return true;
       Close();
@@ -56,6 +58,7 @@ class Connection {
   bool Send(std::span<const std::uint8_t> bytes) {
     while (!bytes.empty() && Wait(POLLOUT)) {
       const ssize_t sent = send(socket_, bytes.data(), bytes.size(), MSG_NOSIGNAL);
+      if (sent < 0 && errno == EINTR) continue;
       if (sent < 0) return false;
       bytes = bytes.subspan(static_cast<std::size_t>(sent));
     }
@@ -65,6 +68,7 @@ class Connection {
   bool Receive(std::span<std::uint8_t> bytes) {
     while (!bytes.empty() && Wait(POLLIN)) {
       const ssize_t received = recv(socket_, bytes.data(), bytes.size(), 0);
+      if (received < 0 && errno == EINTR) continue;
       if (received <= 0) return false;
       bytes = bytes.subspan(static_cast<std::size_t>(received));
     }
@@ -95,9 +99,13 @@ class Connection {
   }
 
   bool Wait(short event) const {
-    const auto left = std::chrono::duration_cast<Milliseconds>(end_ - Clock::now());
-    pollfd waited{socket_, event, 0};
-    return left.count() > 0 && poll(&waited, 1, static_cast<int>(left.count())) == 1;
+    for (;;) {
+      const auto left = std::chrono::duration_cast<Milliseconds>(end_ - Clock::now());
+      pollfd waited{socket_, event, 0};
+      if (left.count() <= 0) return false;
+      const int ready = poll(&waited, 1, static_cast<int>(left.count()));
+      if (ready >= 0 || errno != EINTR) return ready == 1;
+    }
   }
 
   void Close() {
@@ -123,7 +131,8 @@ std::vector<std::uint8_t> FirstRequest(const host::Request& request, const std::
   bytes[kDataLength + 2] = static_cast<std::uint8_t>(text.size());
   // An ISID of the random format that open-iscsi has none of: no session of its own is to be taken for this
   // one.
-  const std::uint8_t isid[] = {0x80, 'h', 'c', 'l', 0, static_cast<std::uint8_t>(getpid())};
+  std::array<std::uint8_t, 6> isid = {0x80, 'h', 'c'};
+  getrandom(isid.data() + 3, 3, 0);
   std::copy(std::begin(isid), std::end(isid), bytes.begin() + kIsid);
   bytes.insert(bytes.end(), text.begin(), text.end());
   bytes.resize((bytes.size() + 3) / 4 * 4);

@@ -23,6 +23,7 @@ struct FirstAnswer {
 
 /// Asks the portal for a session with @p target, or for a discovery session where that is empty, and waits
 /// for at most @p limit. The connection is given up at once: no session comes of it, and no secret is sent.
+/// To find the address of a name takes the resolver's own time besides.
 FirstAnswer AskFirst(const host::Request& request, const std::string& target, Milliseconds limit);
 
 }  // namespace linux

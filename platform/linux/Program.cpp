@@ -4,6 +4,7 @@
 #include <poll.h>
 #include <signal.h>
 #include <spawn.h>
+#include <sys/syscall.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -59,8 +60,17 @@ pid_t Start(const std::string& path, std::vector<std::string>& words, const Pipe
   posix_spawn_file_actions_addopen(&files, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
   posix_spawn_file_actions_adddup2(&files, output.Writer(), STDOUT_FILENO);
   posix_spawn_file_actions_adddup2(&files, complaints.Writer(), STDERR_FILENO);
+  // What this process ignores is no business of the other.
+  posix_spawnattr_t attributes;
+  posix_spawnattr_init(&attributes);
+  sigset_t usual;
+  sigemptyset(&usual);
+  for (const int signal : {SIGPIPE, SIGXFSZ}) sigaddset(&usual, signal);
+  posix_spawnattr_setsigdefault(&attributes, &usual);
+  posix_spawnattr_setflags(&attributes, POSIX_SPAWN_SETSIGDEF);
   pid_t process = 0;
-  const int error = posix_spawn(&process, path.c_str(), &files, nullptr, arguments.data(), environment);
+  const int error = posix_spawn(&process, path.c_str(), &files, &attributes, arguments.data(), environment);
+  posix_spawnattr_destroy(&attributes);
   posix_spawn_file_actions_destroy(&files);
   if (error != 0) {
     throw host::Error(host::Error::KindOfSystem(error),
@@ -88,20 +98,28 @@ Ended RunProgram(std::vector<std::string> words, std::chrono::milliseconds limit
   output.CloseWriter();
   complaints.CloseWriter();
   Ended ended;
-  pollfd pipes[] = {{output.Reader(), POLLIN, 0}, {complaints.Reader(), POLLIN, 0}};
+  const int ending = static_cast<int>(
+      syscall(SYS_pidfd_open, process, 0));  // readable once the process has ended; what it started may go on
+  pollfd waited[] = {{output.Reader(), POLLIN, 0}, {complaints.Reader(), POLLIN, 0}, {ending, POLLIN, 0}};
   std::string* texts[] = {&ended.output, &ended.complaints};
-  while (pipes[0].fd >= 0 || pipes[1].fd >= 0) {
+  for (bool hasEnded = false; !hasEnded;) {
     const auto left = std::chrono::duration_cast<std::chrono::milliseconds>(end - Clock::now());
-    if (left.count() <= 0) {
+    if (left.count() <= 0 || ending < 0) {
       ended.timedOut = true;
       kill(process, SIGKILL);
       break;
     }
-    if (poll(pipes, 2, static_cast<int>(left.count())) <= 0) continue;
+    if (poll(waited, 3, static_cast<int>(left.count())) <= 0) continue;
+    // What an ended process has written is in the pipes in full: one more look takes it.
+    hasEnded = waited[2].revents != 0;
     for (std::size_t i = 0; i < 2; ++i) {
-      if (pipes[i].revents != 0 && !Take(pipes[i].fd, *texts[i])) pipes[i].fd = -1;
+      pollfd& pipe = waited[i];
+      while (pipe.fd >= 0 && poll(&pipe, 1, 0) > 0) {
+        if (!Take(pipe.fd, *texts[i])) pipe.fd = -1;
+      }
     }
   }
+  if (ending >= 0) close(ending);
   int status = 0;
   while (waitpid(process, &status, 0) < 0 && errno == EINTR) {
   }

@@ -2,7 +2,8 @@
 /// has them.
 ///
 /// A record is a text file of lines "name = value". What a record does not name has the value that
-/// iscsid.conf gives it, or else open-iscsi's own.
+/// iscsid.conf gives it, or else open-iscsi's own. Each file is whole at any time; open-iscsi's lock is not
+/// taken, so of what two write at once one is lost.
 #pragma once
 
 #include <optional>

@@ -61,7 +61,8 @@ json Run(const json& given) {
   linux::OpenIscsi network(linux::Milliseconds(given.value("limit", 20000)));
   if (given["operation"] == "login") return Login(network, given);
   if (given["operation"] == "logout")
-    network.Logout({{}, given["target"], {}, 0, linux::IdOfSession(given["session"])});
+    network.Logout(
+        {"iqn.2026-11.org.example:hba0", given["target"], {}, 0, linux::IdOfSession(given["session"])});
   return given["operation"] == "logout" ? json::object() : SendTargets(network, given);
 }
 
