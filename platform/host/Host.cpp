@@ -288,8 +288,11 @@ std::string Host::AdapterOf(const Call& call, const Error& error) {
 }
 
 void Host::Fail(const Call& call) {
-  if (store_ != nullptr)
-    store_->EndReading();  // what was read is of no more use, and a report may have to wait
+  try {
+    if (store_ != nullptr) store_->EndReading();  // what was read is of no more use
+  } catch (const Error&) {
+    // What is told is why the call failed.
+  }
   const auto tell = [&](const Error& error, const char* exception) {
     CallLog::Current().Failed(call, AdapterOf(call, error), error);
     if (!call.traced) return;

@@ -51,7 +51,7 @@ class Store {
   /// A number that is another one in each transaction: what was read under the same one is as it was.
   std::uint64_t GetState() const { return state_; }
   /// Ends what a Reading keeps open.
-  void EndReading() noexcept;
+  void EndReading();
   /// An Error where the file's structure is damaged. Looks once at the whole of it; later calls cost nothing.
   void CheckStructure();
   /// The same for what is all to be replaced: that no page is in use twice, and none lost.

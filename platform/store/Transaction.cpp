@@ -39,13 +39,14 @@ void Store::ForgetReading() {
   if (kept == this) kept = nullptr;
 }
 
-void Store::EndReading() noexcept {
+void Store::EndReading() {
   if (kept != this) return;
   kept = nullptr;
   try {
     Statement(*this, "COMMIT").Step();
-  } catch (const std::exception&) {
-    RollBack(*this);  // what could not be read was told where it was read
+  } catch (...) {
+    RollBack(*this);
+    throw;
   }
 }
 
@@ -120,7 +121,12 @@ Reading::Reading() {
 std::uint64_t Reading::Current() { return readings == 0 ? 0 : lastReading; }
 
 Reading::~Reading() {
-  if (--readings == 0 && kept != nullptr) kept->EndReading();
+  if (--readings > 0 || kept == nullptr) return;
+  try {
+    kept->EndReading();
+  } catch (const std::exception&) {
+    // It has read what it was to read.
+  }
 }
 
 Transaction::Transaction(Store& store, Access access) : store_(store), access_(access) {
