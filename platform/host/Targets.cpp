@@ -26,6 +26,7 @@ std::vector<Record> PortalsTo(Tree& tree, std::int64_t adapter, const std::strin
     if (portal.GetString("name") == name) inOrder.emplace(statement.GetInt(0), std::move(portal));
   }
   std::vector<Record> portals;
+  portals.reserve(inOrder.size());
   for (auto& [id, portal] : inOrder) portals.push_back(std::move(portal));
   return portals;
 }

@@ -83,7 +83,7 @@ std::optional<std::string> CheckContents(const std::string& path, Findings& find
     return {};
   }
   store.CheckStructure();
-  const auto name = Read(store, SoftwareName);
+  auto name = Read(store, SoftwareName);
   findings.push_back({kContents, FindingState::Ok, path + " is sound.", ""});
   return name;
 } catch (const host::Error& error) {
