@@ -59,7 +59,9 @@ bool HasLog(const std::string& path) {
   if (workers > 0) return false;
   char begin[kForms + 2] = "";
   std::ifstream(path, std::ios::binary).read(begin, sizeof begin);
-  return std::strcmp(begin, "SQLite format 3") == 0 && (begin[kForms] == 2 || begin[kForms + 1] == 2);
+  using namespace std::string_view_literals;
+  return std::string_view(begin, 16) == "SQLite format 3\0"sv &&
+         (begin[kForms] == 2 || begin[kForms + 1] == 2);
 }
 
 /// SQLite's own way to wait is to sleep for up to 100 ms between two looks, which would miss most of the

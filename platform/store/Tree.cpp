@@ -155,7 +155,8 @@ std::optional<Object> Tree::Above(std::int64_t id, Kind kind) {
 }
 
 Object Tree::Insert(std::int64_t parent, Kind kind, Record record) {
-  Object object{.parent = parent, .kind = kind, .name = NameOf(kind, record), .record = std::move(record)};
+  std::string name = NameOf(kind, record);
+  Object object{.parent = parent, .kind = kind, .name = std::move(name), .record = std::move(record)};
   object.id = Add(parent, kind, object.name, object.record);
   return object;
 }
